@@ -1,0 +1,254 @@
+#include "array/element_array.h"
+
+#include <algorithm>
+
+#include "array/int32.h"
+#include "array/text.h"
+
+namespace quorrel {
+
+ElementArray::ElementArray() = default;
+
+// --- Capacity policy ---------------------------------------------------------------
+
+// Grow to 150 % while the size passes half the capacity; shrink to 75 % while it is
+// under a quarter (only once more than 25 elements were in use). The products are
+// taken in 64 bits so that capacities past 14 million do not wrap.
+int32_t ElementArray::rebalancedCapacity(int32_t capacity, int32_t sizeBefore,
+                                         int64_t newSize) const {
+  int64_t cap = capacity;
+  for (;;) {
+    if (newSize > cap * 50 / 100) {
+      cap = cap * 150 / 100;
+    } else if (newSize < cap * 25 / 100 && sizeBefore > 25) {
+      cap = cap * 75 / 100;
+    } else {
+      break;
+    }
+  }
+  return static_cast<int32_t>(std::min<int64_t>(cap, INT32_MAX));
+}
+
+// --- Reading ---------------------------------------------------------------------------
+
+const char* ElementArray::getString(int32_t index) {
+  return inRange(index) ? at(index).asString(scratch_) : nullptr;
+}
+
+int32_t ElementArray::getValue(int32_t index) const {
+  return inRange(index) ? at(index).asValue() : 0;
+}
+
+bool ElementArray::getBytes(ByteBlock& out, int32_t index) const {
+  if (!inRange(index)) return false;
+  const Element& e = at(index);
+  out.bytes = e.bytes();
+  out.length = e.size();
+  return true;
+}
+
+const char* ElementArray::getKeyString(int32_t index) {
+  if (!inRange(index) || !at(index).hasKey()) return nullptr;
+  return at(index).key()->asString(scratch_);
+}
+
+int32_t ElementArray::getKeyValue(int32_t index) const {
+  if (!inRange(index) || !at(index).hasKey()) return 0;
+  return at(index).key()->asValue();
+}
+
+// --- Edits -------------------------------------------------------------------------------
+
+void ElementArray::setAt(const ElementValue& value, int32_t index) {
+  if (index < 0 || index == INT32_MAX) return;
+  if (index < size()) {
+    at(index).assign(value);
+    capacity_ = rebalancedCapacity(capacity_, size(), size());
+  } else {
+    if (index >= kMaxSize) return;
+    // Build the value before growing so that a failed allocation changes nothing.
+    Element fresh;
+    fresh.assign(value);
+    int32_t newCapacity = rebalancedCapacity(capacity_, size(), int64_t{index} + 1);
+    elements_.resize(static_cast<std::size_t>(index) + 1);
+    elements_.back() = std::move(fresh);
+    capacity_ = newCapacity;
+  }
+  syncRowStates();
+}
+
+void ElementArray::insertAt(const ElementValue& value, int32_t index) {
+  if (index < 0) return;
+  if (index >= size()) {
+    setAt(value, index);
+    return;
+  }
+  if (size() >= kMaxSize) return;
+  Element fresh;
+  fresh.assign(value);
+  int32_t newCapacity = rebalancedCapacity(capacity_, size(), size());
+  elements_.insert(elements_.begin() + index, std::move(fresh));
+  capacity_ = newCapacity;
+  syncRowStates();
+}
+
+void ElementArray::setKeyString(const char* text, int32_t index) {
+  setKey(ElementValue::ofText(text), index);
+}
+
+void ElementArray::setKeyValue(int32_t value, int32_t index) {
+  setKey(ElementValue::ofValue(value), index);
+}
+
+void ElementArray::setKeyFile(ByteBlock block, int32_t index) {
+  setKey(fileOperand(block), index);
+}
+
+void ElementArray::setKey(const ElementValue& key, int32_t index) {
+  if (!inRange(index)) return;
+  at(index).setKey(key);
+}
+
+void ElementArray::deleteAt(int32_t index) {
+  if (!inRange(index)) return;
+  capacity_ = rebalancedCapacity(capacity_, size(), size());
+  elements_.erase(elements_.begin() + index);
+  syncRowStates();
+}
+
+void ElementArray::clear() {
+  std::vector<Element>().swap(elements_);
+  capacity_ = kInitialCapacity;
+  syncRowStates();
+}
+
+// --- Dimensions ----------------------------------------------------------------------
+
+void ElementArray::setDimensions(int32_t n) {
+  if (n >= kBoundaryCount) return;
+  dimensions_ = n;
+  syncRowStates();
+}
+
+int32_t ElementArray::boundary(int32_t d) const {
+  if (d < 0 || d >= dimensions_) return 0;
+  return boundaries_[d];
+}
+
+void ElementArray::setBoundary(int32_t d, int32_t n) {
+  if (n < 1 || d < 0 || d >= dimensions_) return;
+  boundaries_[d] = n;
+  syncRowStates();
+}
+
+int32_t ElementArray::stride(int32_t d) const {
+  int32_t product = 1;
+  for (int32_t i = 1; i <= std::min(d, kBoundaryCount - 1); ++i) {
+    product = mulWrap(product, boundaries_[i]);
+  }
+  return product;
+}
+
+// Resizing keeps every element of every complete old block at its coordinates: each
+// complete block of dimension d gains or loses `count` empty positions at its end. The
+// result is built in one pass; the capacity is replayed insert by insert (or delete by
+// delete) because the growth policy makes it depend on the whole sequence.
+void ElementArray::resizeBoundary(int32_t d, int32_t n) {
+  if (n < 1 || d < 0 || d >= dimensions_) return;
+  const int32_t old = boundaries_[d];
+  const int32_t block = stride(d);
+  const int32_t unit = stride(d - 1);
+  const int32_t sizeBefore = size();
+  if (n == old || block <= 0 || block >= sizeBefore) {
+    boundaries_[d] = n;
+    syncRowStates();
+    return;
+  }
+  const int32_t blocks = sizeBefore / block;
+  const bool growing = n > old;
+  const int64_t count = std::max<int64_t>(
+      0, growing ? int64_t{unit} * (int64_t{n} - old) : int64_t{unit} * (int64_t{old} - n));
+  const int64_t change = int64_t{blocks} * std::min<int64_t>(count, growing ? count : block);
+  const int64_t finalSize = growing ? sizeBefore + change : sizeBefore - change;
+  if (finalSize > kMaxSize) return;
+
+  std::vector<Element> result;
+  result.reserve(static_cast<std::size_t>(finalSize));
+  int64_t cap = capacity_;
+  int64_t current = sizeBefore;
+  const int64_t kept = growing ? block : block - std::min<int64_t>(count, block);
+  for (int32_t k = 0; k < blocks; ++k) {
+    auto first = elements_.begin() + int64_t{k} * block;
+    std::move(first, first + kept, std::back_inserter(result));
+    if (growing) {
+      result.resize(result.size() + static_cast<std::size_t>(count));
+      // Insert positions: the end of the (k+1)-th old block after the earlier inserts.
+      const int64_t position = int64_t{k + 1} * block + int64_t{k} * count;
+      for (int64_t i = 0; i < count; ++i) {
+        const int64_t newSize = position >= current ? position + 1 : current;
+        cap = rebalancedCapacity(static_cast<int32_t>(cap), static_cast<int32_t>(current), newSize);
+        current = std::max(current + 1, position + 1);
+      }
+    } else {
+      for (int64_t i = 0; i < block - kept; ++i) {
+        cap = rebalancedCapacity(static_cast<int32_t>(cap), static_cast<int32_t>(current), current);
+        --current;
+      }
+    }
+  }
+  std::move(elements_.begin() + int64_t{blocks} * block, elements_.end(),
+            std::back_inserter(result));
+  // Rows stay selected where the table never lost them during the edits; positions the
+  // edits dropped come back with the starting state.
+  const int32_t lowestRows = tableRowCount() == 0
+                                 ? 0
+                                 : static_cast<int32_t>(std::min<int64_t>(sizeBefore, finalSize) /
+                                                        boundaries_[1]);
+  elements_ = std::move(result);
+  capacity_ = static_cast<int32_t>(cap);
+  boundaries_[d] = n;
+  resizeRowStates(lowestRows);
+}
+
+int32_t ElementArray::dimIndexOfIndex(int32_t d, int32_t index) const {
+  if (d < 1 || d > dimensions_) return 0;
+  if (d == dimensions_) return divTrunc(index, stride(dimensions_ - 1));
+  return modTrunc(divTrunc(index, stride(d - 1)), boundaries_[d]);
+}
+
+int32_t ElementArray::indexOfDimIndex(const char* list) const {
+  if (list == nullptr) return 0;
+  TokenSplitter tokens(list, delimiterText_);
+  int32_t sum = 0;
+  for (int32_t k = 0; k < kBoundaryCount; ++k) {
+    auto token = tokens.next();
+    if (!token) break;
+    sum = addWrap(sum, mulWrap(readDecimal(*token), stride(k)));
+  }
+  return sum;
+}
+
+int32_t ElementArray::indexOfXY(int32_t x, int32_t y) const {
+  return addWrap(x, mulWrap(y, boundaries_[1]));
+}
+
+// --- Row states ----------------------------------------------------------------------
+
+int32_t ElementArray::tableRowCount() const {
+  if (dimensions_ != 2 || boundaries_[1] <= 0) return 0;
+  return size() / boundaries_[1];
+}
+
+void ElementArray::syncRowStates() {
+  const auto target = static_cast<std::size_t>(tableRowCount());
+  rowStates.resize(target, autoSelectNewRows == 1 ? RowSelected : RowUnselected);
+}
+
+void ElementArray::resizeRowStates(int32_t keep) {
+  if (static_cast<std::size_t>(keep) < rowStates.size()) {
+    rowStates.resize(static_cast<std::size_t>(keep));
+  }
+  syncRowStates();
+}
+
+}  // namespace quorrel

@@ -1,0 +1,131 @@
+// The per-instance container: a growable row of elements that reads as a 1-, 2- or
+// 3-dimensional array and doubles as a small table (the recordset fields live here
+// too, their operations in recordset/).
+#pragma once
+
+#include <cstdint>
+#include <span>
+#include <string>
+#include <vector>
+
+#include "array/element.h"
+
+namespace quorrel {
+
+// File contents entering or leaving the array; owns nothing.
+struct ByteBlock {
+  const char* bytes = nullptr;
+  int32_t length = 0;
+};
+
+enum RowState : uint8_t { RowUnset = 0, RowSelected = 1, RowUnselected = 2 };
+
+class ElementArray {
+ public:
+  static constexpr int32_t kInitialCapacity = 25;
+  static constexpr int32_t kBoundaryCount = 10;
+  // Growth past this many elements is refused (the array stays as it was): it keeps a
+  // single bad index from asking for gigabytes.
+  static constexpr int32_t kMaxSize = 1 << 26;
+
+  ElementArray();
+
+  // --- Store -------------------------------------------------------------------------
+  int32_t size() const { return static_cast<int32_t>(elements_.size()); }
+  // The slot count of the growth policy (25, 37, 55, 82, ...). Only the elements in
+  // use are materialised; spare slots are a number.
+  int32_t capacity() const { return capacity_; }
+  bool inRange(int32_t index) const { return index >= 0 && index < size(); }
+
+  // Unchecked access to the elements in use, for the query, recordset and file code.
+  std::span<Element> slots() { return elements_; }
+  std::span<const Element> slots() const { return elements_; }
+  Element& at(int32_t index) { return elements_[static_cast<std::size_t>(index)]; }
+  const Element& at(int32_t index) const { return elements_[static_cast<std::size_t>(index)]; }
+
+  // The element's text, valid until the next text read from this array; null outside.
+  const char* getString(int32_t index);
+  int32_t getValue(int32_t index) const;
+  // Raw view of an element: a String's bytes with terminator, a File's bytes; for a
+  // Value `bytes` is null and `length` 4 (use getValue). False outside.
+  bool getBytes(ByteBlock& out, int32_t index) const;
+  const char* getKeyString(int32_t index);
+  int32_t getKeyValue(int32_t index) const;
+
+  void setString(const char* text, int32_t index) { setAt(ElementValue::ofText(text), index); }
+  void setValue(int32_t value, int32_t index) { setAt(ElementValue::ofValue(value), index); }
+  void setFile(ByteBlock block, int32_t index) { setAt(fileOperand(block), index); }
+  void setElement(const ElementValue& value, int32_t index) { setAt(value, index); }
+
+  void insertString(const char* text, int32_t index) {
+    insertAt(ElementValue::ofText(text), index);
+  }
+  void insertValue(int32_t value, int32_t index) {
+    insertAt(ElementValue::ofValue(value), index);
+  }
+  void insertFile(ByteBlock block, int32_t index) { insertAt(fileOperand(block), index); }
+  void insertElement(const ElementValue& value, int32_t index) { insertAt(value, index); }
+
+  void appendString(const char* text) { insertString(text, size()); }
+  void appendValue(int32_t value) { insertValue(value, size()); }
+  void appendFile(ByteBlock block) { insertFile(block, size()); }
+
+  void setKeyString(const char* text, int32_t index);
+  void setKeyValue(int32_t value, int32_t index);
+  void setKeyFile(ByteBlock block, int32_t index);
+  void setKey(const ElementValue& key, int32_t index);
+
+  void deleteAt(int32_t index);
+  void clear();
+
+  // --- Settings ----------------------------------------------------------------------
+  void setListDelimiter(const char* text) { delimiterText_ = text == nullptr ? "" : text; }
+  const char* listDelimiter() const { return delimiterText_.c_str(); }
+  void setAutoSelect(int32_t flag) { autoSelectNewRows = flag != 0 ? 1 : 0; }
+
+  // --- Dimensions --------------------------------------------------------------------
+  int32_t dimensions() const { return dimensions_; }
+  void setDimensions(int32_t n);
+  int32_t boundary(int32_t d) const;
+  // The stored entry, whether or not d is a bounded dimension today (file savers
+  // write all ten).
+  int32_t boundaryEntry(int32_t d) const { return boundaries_[d]; }
+  void setBoundary(int32_t d, int32_t n);
+  void resizeBoundary(int32_t d, int32_t n);
+  int32_t stride(int32_t d) const;
+  int32_t dimIndexOfIndex(int32_t d, int32_t index) const;
+  int32_t indexOfDimIndex(const char* list) const;
+  int32_t indexOfXY(int32_t x, int32_t y) const;
+
+  // --- Row states --------------------------------------------------------------------
+  int32_t tableRowCount() const;
+  void syncRowStates();
+
+  // --- Settings read and written directly by the routines ---------------------------
+  int16_t caseMode = 0;      // 0 case insensitive, 1 case sensitive
+  int16_t searchMode = 0;    // 0 literal, 1 wildcard
+  int16_t fileMode = 0;      // 0 create or truncate, 1 append
+  int32_t selectionMode = 1; // 0 AND, 1 OR
+  int32_t autoSelectNewRows = 0;
+  std::vector<std::string> labels;  // one per column, set through recordset/
+  std::vector<uint8_t> rowStates;   // one RowState per table row, always tableRowCount()
+
+ private:
+  static ElementValue fileOperand(ByteBlock block) {
+    return ElementValue::ofBytes(block.bytes, block.length);
+  }
+  void setAt(const ElementValue& value, int32_t index);
+  void insertAt(const ElementValue& value, int32_t index);
+  // The capacity that the growth policy reaches for newSize from the current state.
+  int32_t rebalancedCapacity(int32_t capacity, int32_t sizeBefore, int64_t newSize) const;
+  void resizeRowStates(int32_t keep);
+
+  std::vector<Element> elements_;
+  int32_t capacity_ = kInitialCapacity;
+  int32_t dimensions_ = 1;
+  int32_t boundaries_[kBoundaryCount] = {-1, 0, 0, 0, 0, 0, 0, 0, 0, 0};
+  std::string delimiterText_ = ",";
+  NumberText scratch_;
+};
+
+}  // namespace quorrel

@@ -1,0 +1,61 @@
+#include "array/text.h"
+
+#include <cstring>
+
+namespace quorrel {
+
+namespace {
+
+bool isCSpace(char c) {
+  return c == ' ' || c == '\t' || c == '\n' || c == '\v' || c == '\f' || c == '\r';
+}
+
+}  // namespace
+
+int32_t readDecimal(std::string_view text) {
+  std::size_t i = 0;
+  while (i < text.size() && isCSpace(text[i])) ++i;
+  bool negative = false;
+  if (i < text.size() && (text[i] == '+' || text[i] == '-')) {
+    negative = text[i] == '-';
+    ++i;
+  }
+  // Accumulate the magnitude, stopping once it is past any 32-bit value.
+  constexpr int64_t kLimit = int64_t{INT32_MAX} + 1;
+  int64_t magnitude = 0;
+  for (; i < text.size() && text[i] >= '0' && text[i] <= '9'; ++i) {
+    if (magnitude <= kLimit) magnitude = magnitude * 10 + (text[i] - '0');
+  }
+  if (negative) return magnitude >= kLimit ? INT32_MIN : static_cast<int32_t>(-magnitude);
+  return magnitude > INT32_MAX ? INT32_MAX : static_cast<int32_t>(magnitude);
+}
+
+int32_t readDecimal(const char* text) {
+  return text == nullptr ? 0 : readDecimal(std::string_view(text));
+}
+
+int writeDecimal(int32_t value, char* out) {
+  char digits[12];
+  int count = 0;
+  // Work on the unsigned magnitude so INT32_MIN needs no special case.
+  uint32_t magnitude = value < 0 ? 0u - static_cast<uint32_t>(value) : static_cast<uint32_t>(value);
+  do {
+    digits[count++] = static_cast<char>('0' + magnitude % 10);
+    magnitude /= 10;
+  } while (magnitude != 0);
+  int length = 0;
+  if (value < 0) out[length++] = '-';
+  while (count > 0) out[length++] = digits[--count];
+  out[length] = '\0';
+  return length;
+}
+
+std::optional<std::string_view> TokenSplitter::next() {
+  while (pos_ < text_.size() && isSeparator(text_[pos_])) ++pos_;
+  if (pos_ >= text_.size()) return std::nullopt;
+  std::size_t start = pos_;
+  while (pos_ < text_.size() && !isSeparator(text_[pos_])) ++pos_;
+  return text_.substr(start, pos_ - start);
+}
+
+}  // namespace quorrel
