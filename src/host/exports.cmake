@@ -1,0 +1,33 @@
+# Exports exactly the entry points listed in entry_points.txt. Included from
+# src/host/CMakeLists.txt with quorrel_module defined.
+set(QUORREL_ENTRY_POINTS_FILE ${CMAKE_CURRENT_LIST_DIR}/entry_points.txt)
+set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${QUORREL_ENTRY_POINTS_FILE})
+
+# QUORREL_ENTRY_POINT_NAMES, _ORDINALS, _ARG_BYTES, _SIDES: parallel lists.
+file(STRINGS ${QUORREL_ENTRY_POINTS_FILE} quorrel_entry_lines REGEX "^[A-Za-z]")
+set(QUORREL_ENTRY_POINT_NAMES "")
+set(QUORREL_ENTRY_POINT_ORDINALS "")
+set(QUORREL_ENTRY_POINT_ARG_BYTES "")
+set(QUORREL_ENTRY_POINT_SIDES "")
+foreach(line IN LISTS quorrel_entry_lines)
+  string(REGEX MATCH "^([A-Za-z]+)[ \t]+([0-9]+)[ \t]+([0-9]+)[ \t]+([a-z]+)" matched "${line}")
+  if(NOT matched)
+    message(FATAL_ERROR "entry_points.txt: cannot read line '${line}'")
+  endif()
+  list(APPEND QUORREL_ENTRY_POINT_NAMES ${CMAKE_MATCH_1})
+  list(APPEND QUORREL_ENTRY_POINT_ORDINALS ${CMAKE_MATCH_2})
+  list(APPEND QUORREL_ENTRY_POINT_ARG_BYTES ${CMAKE_MATCH_3})
+  list(APPEND QUORREL_ENTRY_POINT_SIDES ${CMAKE_MATCH_4})
+endforeach()
+
+if(NOT WIN32 AND NOT APPLE)
+  set(quorrel_version_script ${CMAKE_CURRENT_BINARY_DIR}/quorrel.map)
+  set(quorrel_map_text "{\n  global:\n")
+  foreach(name IN LISTS QUORREL_ENTRY_POINT_NAMES)
+    string(APPEND quorrel_map_text "    ${name};\n")
+  endforeach()
+  string(APPEND quorrel_map_text "  local:\n    *;\n};\n")
+  file(CONFIGURE OUTPUT ${quorrel_version_script} CONTENT "${quorrel_map_text}" @ONLY)
+  target_link_options(quorrel_module PRIVATE "LINKER:--version-script=${quorrel_version_script}")
+  set_property(TARGET quorrel_module APPEND PROPERTY LINK_DEPENDS ${quorrel_version_script})
+endif()
