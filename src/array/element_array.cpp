@@ -159,16 +159,18 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
   const int32_t block = stride(d);
   const int32_t unit = stride(d - 1);
   const int32_t sizeBefore = size();
-  if (n == old || block <= 0 || block >= sizeBefore) {
+  const bool growing = n > old;
+  // Counts are 32-bit like every other product here; one that wraps to 0 or below
+  // inserts or deletes nothing. Removing more than a block (only entry 0, whose block
+  // is one element, can ask for it) would delete at negative indexes: nothing moves.
+  const int32_t count = mulWrap(unit, growing ? subWrap(n, old) : subWrap(old, n));
+  if (n == old || block <= 0 || block >= sizeBefore || count <= 0 || (!growing && count > block)) {
     boundaries_[d] = n;
     syncRowStates();
     return;
   }
   const int32_t blocks = sizeBefore / block;
-  const bool growing = n > old;
-  const int64_t count = std::max<int64_t>(
-      0, growing ? int64_t{unit} * (int64_t{n} - old) : int64_t{unit} * (int64_t{old} - n));
-  const int64_t change = int64_t{blocks} * std::min<int64_t>(count, growing ? count : block);
+  const int64_t change = int64_t{blocks} * count;
   const int64_t finalSize = growing ? sizeBefore + change : sizeBefore - change;
   if (finalSize > kMaxSize) return;
 
@@ -176,7 +178,7 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
   result.reserve(static_cast<std::size_t>(finalSize));
   int64_t cap = capacity_;
   int64_t current = sizeBefore;
-  const int64_t kept = growing ? block : block - std::min<int64_t>(count, block);
+  const int64_t kept = growing ? block : block - count;
   for (int32_t k = 0; k < blocks; ++k) {
     auto first = elements_.begin() + int64_t{k} * block;
     std::move(first, first + kept, std::back_inserter(result));
@@ -200,10 +202,10 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
             std::back_inserter(result));
   // Rows stay selected where the table never lost them during the edits; positions the
   // edits dropped come back with the starting state.
-  const int32_t lowestRows = tableRowCount() == 0
-                                 ? 0
-                                 : static_cast<int32_t>(std::min<int64_t>(sizeBefore, finalSize) /
-                                                        boundaries_[1]);
+  const int32_t lowestRows =
+      tableRowCount() == 0
+          ? 0
+          : static_cast<int32_t>(std::min<int64_t>(sizeBefore, finalSize) / boundaries_[1]);
   elements_ = std::move(result);
   capacity_ = static_cast<int32_t>(cap);
   boundaries_[d] = n;

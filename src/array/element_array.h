@@ -60,9 +60,7 @@ class ElementArray {
   void insertString(const char* text, int32_t index) {
     insertAt(ElementValue::ofText(text), index);
   }
-  void insertValue(int32_t value, int32_t index) {
-    insertAt(ElementValue::ofValue(value), index);
-  }
+  void insertValue(int32_t value, int32_t index) { insertAt(ElementValue::ofValue(value), index); }
   void insertFile(ByteBlock block, int32_t index) { insertAt(fileOperand(block), index); }
   void insertElement(const ElementValue& value, int32_t index) { insertAt(value, index); }
 
@@ -102,10 +100,10 @@ class ElementArray {
   void syncRowStates();
 
   // --- Settings read and written directly by the routines ---------------------------
-  int16_t caseMode = 0;      // 0 case insensitive, 1 case sensitive
-  int16_t searchMode = 0;    // 0 literal, 1 wildcard
-  int16_t fileMode = 0;      // 0 create or truncate, 1 append
-  int32_t selectionMode = 1; // 0 AND, 1 OR
+  int16_t caseMode = 0;       // 0 case insensitive, 1 case sensitive
+  int16_t searchMode = 0;     // 0 literal, 1 wildcard
+  int16_t fileMode = 0;       // 0 create or truncate, 1 append
+  int32_t selectionMode = 1;  // 0 AND, 1 OR
   int32_t autoSelectNewRows = 0;
   std::vector<std::string> labels;  // one per column, set through recordset/
   std::vector<uint8_t> rowStates;   // one RowState per table row, always tableRowCount()

@@ -1,0 +1,163 @@
+#include <gtest/gtest.h>
+
+#include <climits>
+#include <cstring>
+
+#include "array/element.h"
+#include "array/text.h"
+
+namespace quorrel {
+namespace {
+
+TEST(Element, ZeroAndEmptyOperandsAreStoredAsNone) {
+  NumberText scratch;
+  Element e;
+  e.assign(ElementValue::ofValue(0));
+  EXPECT_EQ(e.type(), ElementType::None);
+  EXPECT_EQ(e.size(), 0);
+  EXPECT_EQ(e.asValue(), 0);
+  EXPECT_STREQ(e.asString(scratch), "");
+  EXPECT_EQ(e.textLength(), 0);
+
+  e.assign(ElementValue::ofBytes("abc", 0));
+  EXPECT_EQ(e.type(), ElementType::None);
+  e.assign(ElementValue::ofBytes("abc", -3));
+  EXPECT_EQ(e.type(), ElementType::None);
+  e.assign(ElementValue::ofBytes(nullptr, 5));
+  EXPECT_EQ(e.type(), ElementType::None);
+  e.assign(ElementValue::ofText(nullptr));
+  EXPECT_EQ(e.type(), ElementType::None);
+  e.assign({ElementType::Value, 9, nullptr, -1});
+  EXPECT_EQ(e.type(), ElementType::None);
+
+  // The empty text is a real String of size 1, not None.
+  e.assign(ElementValue::ofText(""));
+  EXPECT_EQ(e.type(), ElementType::String);
+  EXPECT_EQ(e.size(), 1);
+  EXPECT_STREQ(e.asString(scratch), "");
+  EXPECT_EQ(e.asValue(), 0);
+  EXPECT_EQ(e.textLength(), 0);
+}
+
+TEST(Element, NumbersReadAsDecimalText) {
+  NumberText scratch;
+  Element e;
+  const struct {
+    int32_t value;
+    const char* text;
+  } cases[] = {
+      {5, "5"}, {-12, "-12"}, {10, "10"}, {INT32_MAX, "2147483647"}, {INT32_MIN, "-2147483648"}};
+  for (const auto& c : cases) {
+    e.assign(ElementValue::ofValue(c.value));
+    EXPECT_EQ(e.type(), ElementType::Value);
+    EXPECT_EQ(e.size(), 4);
+    EXPECT_EQ(e.asValue(), c.value);
+    EXPECT_STREQ(e.asString(scratch), c.text);
+    EXPECT_EQ(e.textLength(), static_cast<int32_t>(std::strlen(c.text)));
+  }
+}
+
+TEST(Element, FileBytesReadAsNothing) {
+  NumberText scratch;
+  Element e;
+  e.assign(ElementValue::ofBytes("7\0z", 3));
+  EXPECT_EQ(e.type(), ElementType::File);
+  EXPECT_EQ(e.size(), 3);
+  EXPECT_EQ(std::memcmp(e.bytes(), "7\0z", 3), 0);
+  EXPECT_STREQ(e.asString(scratch), "");
+  EXPECT_EQ(e.asValue(), 0);
+  EXPECT_EQ(e.textLength(), 0);
+}
+
+TEST(Element, TextReadsAsNumberLikeAtol) {
+  const struct {
+    const char* text;
+    int32_t value;
+  } cases[] = {
+      {"0042", 42},
+      {"  9 apples", 9},
+      {"-", 0},
+      {" -7", -7},
+      {"12abc", 12},
+      {"abc", 0},
+      {"+5", 5},
+      {"\t\n\v\f\r8", 8},
+      {"+-3", 0},
+      {"- 3", 0},
+      {"3 4", 3},
+      {"\xa0"
+       "5",
+       0},  // not white space in the C locale
+      {"2147483647", INT32_MAX},
+      {"2147483648", INT32_MAX},
+      {"99999999999999999999999", INT32_MAX},
+      {"-2147483648", INT32_MIN},
+      {"-2147483649", INT32_MIN},
+      {"-99999999999999999999999", INT32_MIN},
+      {"000000000000000000000000012", 12},
+  };
+  for (const auto& c : cases) {
+    Element e;
+    e.assign(ElementValue::ofText(c.text));
+    EXPECT_EQ(e.asValue(), c.value) << "text «" << c.text << "»";
+    EXPECT_EQ(readDecimal(std::string_view(c.text)), c.value) << "text «" << c.text << "»";
+  }
+  // A token cut out of a longer text reads only its own characters.
+  EXPECT_EQ(readDecimal(std::string_view("123456", 3)), 123);
+}
+
+TEST(Element, KeysFollowTheValueRulesAndSurviveNewValues) {
+  NumberText scratch;
+  Element e;
+  e.deleteKey();  // no key yet: nothing happens
+  EXPECT_EQ(e.key(), nullptr);
+
+  // The key takes the whole text, whatever size the operand claims.
+  e.setKey({ElementType::String, 0, "hello", 2});
+  ASSERT_NE(e.key(), nullptr);
+  EXPECT_EQ(e.key()->type(), ElementType::String);
+  EXPECT_EQ(e.key()->size(), 6);
+  EXPECT_STREQ(e.key()->asString(scratch), "hello");
+
+  // A key of 0 exists but is None.
+  e.setKey(ElementValue::ofValue(0));
+  ASSERT_NE(e.key(), nullptr);
+  EXPECT_EQ(e.key()->type(), ElementType::None);
+  EXPECT_EQ(e.key()->asValue(), 0);
+
+  // A Value key always has size 4, whatever the operand says.
+  e.setKey({ElementType::Value, -3, nullptr, 9});
+  EXPECT_EQ(e.key()->size(), 4);
+  EXPECT_EQ(e.key()->asValue(), -3);
+
+  e.assign(ElementValue::ofText("value"));
+  e.assign(ElementValue::ofValue(0));
+  ASSERT_NE(e.key(), nullptr);
+  EXPECT_EQ(e.key()->asValue(), -3);
+
+  e.setKey(ElementValue::ofBytes("ab", 2));
+  EXPECT_EQ(e.key()->type(), ElementType::File);
+  EXPECT_EQ(e.key()->size(), 2);
+
+  e.deleteKey();
+  EXPECT_EQ(e.key(), nullptr);
+
+  e.assign(ElementValue::ofText("x"));
+  e.setKey(ElementValue::ofValue(1));
+  e.reset();
+  EXPECT_EQ(e.type(), ElementType::None);
+  EXPECT_EQ(e.key(), nullptr);
+}
+
+TEST(Text, WritesEveryNumberWithoutPadding) {
+  char out[12];
+  EXPECT_EQ(writeDecimal(0, out), 1);
+  EXPECT_STREQ(out, "0");
+  EXPECT_EQ(writeDecimal(INT32_MIN, out), 11);
+  EXPECT_STREQ(out, "-2147483648");
+  EXPECT_EQ(writeDecimal(-1, out), 2);
+  EXPECT_STREQ(out, "-1");
+}
+
+}  // namespace
+}  // namespace quorrel
