@@ -1,0 +1,69 @@
+// Internal helpers of the loaders: putting texts that are views into a file (not
+// zero-terminated) into the array with the same result as the zero-terminated forms.
+#pragma once
+
+#include <algorithm>
+#include <cstdint>
+#include <cstring>
+#include <string>
+#include <string_view>
+
+#include "array/element_array.h"
+
+namespace quorrel::io_detail {
+
+// The text a zero-terminated copy of the view would hold: up to its first zero byte.
+inline std::string_view textOf(std::string_view bytes) {
+  const void* zero = std::memchr(bytes.data(), '\0', bytes.size());
+  return zero == nullptr
+             ? bytes
+             : bytes.substr(
+                   0, static_cast<std::size_t>(static_cast<const char*>(zero) - bytes.data()));
+}
+
+// insertString of the view's text; a null view inserts no text (a None element).
+inline void insertTextAt(ElementArray& array, const char* data, int32_t held, int32_t index) {
+  if (data == nullptr) {
+    array.insertString(nullptr, index);
+    return;
+  }
+  const std::string_view text = textOf({data, static_cast<std::size_t>(held)});
+  if (text.size() < static_cast<std::size_t>(held)) {
+    // The view carries the text's zero byte: no copy needed.
+    const auto size = static_cast<int32_t>(text.size() + 1);
+    array.insertElement(ElementValue{ElementType::String, 0, data, size}, index);
+    return;
+  }
+  const std::string copy(text);
+  array.insertString(copy.c_str(), index);
+}
+
+inline void setKeyTextAt(ElementArray& array, const char* data, int32_t held, int32_t index) {
+  if (data == nullptr) {
+    array.setKeyString(nullptr, index);
+    return;
+  }
+  const std::string_view text = textOf({data, static_cast<std::size_t>(held)});
+  if (text.size() < static_cast<std::size_t>(held)) {
+    array.setKeyString(data, index);  // the view carries the text's zero byte
+    return;
+  }
+  const std::string copy(text);
+  array.setKeyString(copy.c_str(), index);
+}
+
+// A column label as the recordset stores it: only in a two-dimensional array, the
+// list following the current column count, an empty entry meaning no label. A column
+// count past kMaxLabelColumns (only a damaged file sets one) leaves the labels alone
+// rather than allocating a list of that length.
+inline constexpr int32_t kMaxLabelColumns = 1 << 20;
+
+inline void applyLabel(ElementArray& array, const std::string& text, int32_t column) {
+  if (array.dimensions() != 2) return;
+  const int32_t columns = std::max(array.boundary(1), 0);
+  if (columns > kMaxLabelColumns) return;
+  array.labels.resize(static_cast<std::size_t>(columns));
+  if (column >= 0 && column < columns) array.labels[static_cast<std::size_t>(column)] = text;
+}
+
+}  // namespace quorrel::io_detail

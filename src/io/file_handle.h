@@ -1,0 +1,107 @@
+// Low-level file access for the file formats: an owned descriptor opened by path,
+// a growable byte buffer, buffered writing and whole-file reading. Files are opened
+// and closed within one operation; nothing here reports errors beyond "not opened".
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdlib>
+#include <memory>
+#include <optional>
+#include <string_view>
+
+namespace quorrel {
+
+// How a writer opens its file: 0 creates or truncates, 1 creates or appends. Every
+// other mode opens like 0.
+enum : uint16_t { FileModeTruncate = 0, FileModeAppend = 1 };
+
+class FileHandle {
+ public:
+  FileHandle() = default;
+  ~FileHandle() { close(); }
+  FileHandle(FileHandle&& other) noexcept : fd_(other.fd_) { other.fd_ = -1; }
+  FileHandle& operator=(FileHandle&& other) noexcept;
+  FileHandle(const FileHandle&) = delete;
+  FileHandle& operator=(const FileHandle&) = delete;
+
+  // Read only, binary. A directory is not a file and does not open.
+  static FileHandle openForReading(const char* path);
+  // Write only, binary, created with owner read and write permission when missing;
+  // truncated (mode 0) or with every write at the end (mode 1).
+  static FileHandle openForWriting(const char* path, uint16_t mode);
+
+  bool isOpen() const { return fd_ >= 0; }
+  // Bytes delivered (0 at the end of the file) or -1 on an error; retries interrupts.
+  std::ptrdiff_t read(char* into, std::size_t count);
+  // Writes all bytes unless the system refuses; false when it did.
+  bool writeAll(const char* bytes, std::size_t count);
+  // The size of a regular file, for sizing buffers; 0 when unknown.
+  std::size_t sizeHint() const;
+  void close();
+
+ private:
+  explicit FileHandle(int fd) : fd_(fd) {}
+  int fd_ = -1;
+};
+
+// A malloc-owned byte buffer that grows without zero-filling, so reading a big file
+// touches each byte once.
+class ByteBuffer {
+ public:
+  char* data() { return data_.get(); }
+  const char* data() const { return data_.get(); }
+  std::size_t size() const { return size_; }
+  std::size_t capacity() const { return capacity_; }
+  std::string_view view() const { return {data_.get(), size_}; }
+  // False (and no change) when the memory cannot be had.
+  bool reserve(std::size_t capacity);
+  // Count must not exceed the capacity.
+  void setSize(std::size_t count) { size_ = count; }
+
+ private:
+  struct Free {
+    void operator()(char* p) const { std::free(p); }
+  };
+  std::unique_ptr<char, Free> data_;
+  std::size_t size_ = 0;
+  std::size_t capacity_ = 0;
+};
+
+// Reads from the handle's position to the end of the file (or a read error, or
+// `limit` bytes) into the buffer, keeping `spare` writable bytes past the data.
+// Growth is geometric. What was read before an error or a failed allocation stays.
+void readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare);
+
+// The largest file a reader takes in: what a block length can count.
+inline constexpr std::size_t kMaxFileBytes = INT32_MAX;
+
+// Opens the file read only, reads all of it (up to kMaxFileBytes) and closes it;
+// `spare` writable bytes stay past the data. Nothing when the file cannot be opened.
+std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare);
+
+// Collects output in large blocks so a file is written in few system calls; flushes
+// when destroyed. Numbers are written little-endian. After a refused write the rest
+// of the output is dropped.
+class BufferedWriter {
+ public:
+  explicit BufferedWriter(FileHandle& file);
+  ~BufferedWriter() { flush(); }
+  BufferedWriter(const BufferedWriter&) = delete;
+  BufferedWriter& operator=(const BufferedWriter&) = delete;
+
+  void bytes(const char* data, std::size_t count);
+  void text(std::string_view s) { bytes(s.data(), s.size()); }
+  void u16(uint16_t v);
+  void i32(int32_t v);
+  void flush();
+
+ private:
+  static constexpr std::size_t kCapacity = 1 << 16;
+  FileHandle& file_;
+  std::unique_ptr<char[]> buffer_;
+  std::size_t used_ = 0;
+  bool failed_ = false;
+};
+
+}  // namespace quorrel

@@ -1,0 +1,269 @@
+#include "io/native_file.h"
+
+#include <algorithm>
+#include <new>
+#include <string>
+#include <string_view>
+
+#include "io/apply.h"
+#include "io/parsing.h"
+
+namespace quorrel {
+
+namespace {
+
+using io_detail::Cursor;
+
+constexpr std::string_view kMagic{"ZUBARRAY", 8};
+constexpr uint16_t kTypeValue = static_cast<uint16_t>(ElementType::Value);
+constexpr uint16_t kTypeString = static_cast<uint16_t>(ElementType::String);
+constexpr int32_t kMaxDimensions = ArrayImage::kBoundarySlots;
+
+// --- Writing -------------------------------------------------------------------------
+
+void writeHeader(BufferedWriter& out, int32_t dimensions, const int32_t* boundaries) {
+  out.text(kMagic);
+  out.u16(1);
+  out.i32(dimensions);
+  for (int32_t d = 0; d < std::min(dimensions, kMaxDimensions); ++d) out.i32(boundaries[d]);
+}
+
+void writeLabel(BufferedWriter& out, int32_t length, const char* text) {
+  out.i32(length);
+  if (length > 0 && text != nullptr) out.bytes(text, static_cast<std::size_t>(length));
+}
+
+// A Value's data is its 4-byte number whatever the size says; other data is `size` bytes.
+void writeHalf(BufferedWriter& out, uint16_t type, int32_t size, int32_t number, const char* data) {
+  out.u16(type);
+  out.i32(size);
+  if (type == kTypeValue) {
+    out.i32(number);
+  } else if (size > 0 && data != nullptr) {
+    out.bytes(data, static_cast<std::size_t>(size));
+  }
+}
+
+void writeRecord(BufferedWriter& out, const ElementRecord& r) {
+  writeHalf(out, r.type, r.size, r.number, r.data);
+  writeHalf(out, r.keyType, r.keySize, r.keyNumber, r.keyData);
+}
+
+// The record of an element as views into the element itself: saving streams the
+// array without copying its bytes.
+ElementRecord recordOf(const Element& e) {
+  ElementRecord r;
+  r.type = static_cast<uint16_t>(e.type());
+  r.size = e.size();
+  r.number = e.number();
+  r.data = e.bytes();
+  if (const Element* key = e.key()) {
+    r.keyType = static_cast<uint16_t>(key->type());
+    r.keySize = key->size();
+    r.keyNumber = key->number();
+    r.keyData = key->bytes();
+  }
+  return r;
+}
+
+// --- Reading -------------------------------------------------------------------------
+
+// Reads one half of an element record. A block that the end of the file cuts short
+// is completed with zero bytes, except when its size is beyond the file's own size
+// (only a damaged file claims that): then it keeps the bytes the file holds, so no
+// file makes the reader allocate more than twice its length. A text keeps only the
+// bytes held either way: the zeros would end it there.
+template <class Sink>
+void readHalf(Cursor& in, Sink& sink, uint16_t& type, int32_t& size, int32_t& number,
+              const char*& data) {
+  type = in.u16();
+  size = in.i32();
+  if (size <= 0) return;
+  if (type == kTypeValue) {
+    number = in.i32();
+    return;
+  }
+  const std::string_view held = in.take(size);
+  data = held.data();
+  if (held.size() == static_cast<std::size_t>(size)) return;
+  if (type != kTypeString && static_cast<std::size_t>(size) <= in.fileSize()) {
+    data = sink.zeroFilled(held, size);
+  } else {
+    size = static_cast<int32_t>(held.size());
+  }
+}
+
+// Walks a native file held in memory and hands its parts to the sink in file order.
+// False when the file is not usable (wrong magic, version above 1, more than 10
+// dimensions). Labels and records that would start at or past the end of the file
+// are not produced, which also bounds what a crafted count can ask for.
+template <class Sink>
+bool parseNative(std::string_view file, Sink& sink) {
+  Cursor in(file);
+  if (!in.matches(kMagic)) return false;
+  const uint16_t version = in.u16();
+  sink.version(version);
+  if (static_cast<int16_t>(version) > 1) return false;
+  const int32_t dimensions = in.i32();
+  if (dimensions > kMaxDimensions) return false;
+  int32_t boundaries[kMaxDimensions] = {};
+  for (int32_t d = 0; d < dimensions; ++d) boundaries[d] = in.i32();
+  sink.header(dimensions, boundaries);
+
+  const int32_t labelCount = in.i32();
+  for (int32_t j = 0; j < labelCount && !in.atEnd(); ++j) {
+    LabelRecord label;
+    label.length = in.i32();
+    if (label.length > 0) {
+      const std::string_view text = in.take(label.length);
+      label.text = text.data();
+      label.length = static_cast<int32_t>(text.size());
+    }
+    sink.label(label);
+  }
+
+  const int32_t elementCount = in.i32();
+  for (int32_t i = 0; i < elementCount && !in.atEnd(); ++i) {
+    ElementRecord r;
+    readHalf(in, sink, r.type, r.size, r.number, r.data);
+    readHalf(in, sink, r.keyType, r.keySize, r.keyNumber, r.keyData);
+    sink.element(r);
+  }
+  return true;
+}
+
+// Fills an image; its views point into the image's own storage.
+struct ImageSink {
+  ArrayImage& image;
+
+  void version(uint16_t v) { image.version = v; }
+  void header(int32_t dimensions, const int32_t* boundaries) {
+    image.dimensions = dimensions;
+    std::copy(boundaries, boundaries + kMaxDimensions, image.boundaries);
+  }
+  void label(const LabelRecord& label) { image.labels.push_back(label); }
+  void element(const ElementRecord& r) { image.elements.push_back(r); }
+  const char* zeroFilled(std::string_view held, int32_t size) {
+    auto block = std::make_unique<char[]>(static_cast<std::size_t>(size));
+    std::copy(held.begin(), held.end(), block.get());
+    image.filled.push_back(std::move(block));
+    return image.filled.back().get();
+  }
+};
+
+// Applies the file to the array as it is read, so a load needs no second copy of the
+// file's records; labels wait until every element is in place.
+struct LoadSink {
+  LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing) {}
+
+  ElementArray& array;
+  bool replace;
+  bool headerSeen = false;
+  int32_t labelIndex = 0;
+  std::vector<std::pair<int32_t, std::string>> pendingLabels;
+  std::vector<std::unique_ptr<char[]>> filled;
+
+  void version(uint16_t) {}
+  void header(int32_t dimensions, const int32_t* boundaries) {
+    headerSeen = true;
+    if (!replace) return;
+    array.setDimensions(dimensions);
+    for (int32_t d = 1; d < kMaxDimensions; ++d) array.setBoundary(d, boundaries[d - 1]);
+  }
+  void label(const LabelRecord& label) {
+    const int32_t column = labelIndex++;
+    if (label.text == nullptr) return;
+    pendingLabels.emplace_back(
+        column, std::string(io_detail::textOf({label.text, static_cast<size_t>(label.length)})));
+  }
+  void element(const ElementRecord& r) {
+    const int32_t index = array.size();
+    if (r.type == kTypeString) {
+      io_detail::insertTextAt(array, r.data, r.size, index);
+    } else if (r.type == kTypeValue) {
+      array.insertValue(r.number, index);
+    } else {
+      array.insertFile({r.data, r.size}, index);
+    }
+    if (r.keyType == kTypeString) {
+      io_detail::setKeyTextAt(array, r.keyData, r.keySize, index);
+    } else if (r.keyType == kTypeValue) {
+      array.setKeyValue(r.keyNumber, index);
+    } else {
+      array.setKeyFile({r.keyData, r.keySize}, index);
+    }
+  }
+  const char* zeroFilled(std::string_view held, int32_t size) {
+    filled.clear();  // the previous block is in the array by now
+    auto block = std::make_unique<char[]>(static_cast<std::size_t>(size));
+    std::copy(held.begin(), held.end(), block.get());
+    filled.push_back(std::move(block));
+    return filled.back().get();
+  }
+};
+
+}  // namespace
+
+void saveNativeFile(ElementArray& array, const char* path, uint16_t mode) {
+  array.fileMode = static_cast<int16_t>(mode);
+  try {
+    FileHandle file = FileHandle::openForWriting(path, mode);
+    if (!file.isOpen()) return;
+    BufferedWriter out(file);
+    int32_t boundaries[kMaxDimensions];
+    for (int32_t d = 0; d < kMaxDimensions; ++d) boundaries[d] = array.boundary(d + 1);
+    writeHeader(out, array.dimensions(), boundaries);
+    out.i32(static_cast<int32_t>(array.labels.size()));
+    for (const std::string& label : array.labels) {
+      writeLabel(out, static_cast<int32_t>(label.size()), label.data());
+    }
+    out.i32(array.size());
+    for (const Element& e : array.slots()) writeRecord(out, recordOf(e));
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+void writeNativeFile(const char* path, const ArrayImage& image, uint16_t fileMode) {
+  try {
+    FileHandle file = FileHandle::openForWriting(path, fileMode);
+    if (!file.isOpen()) return;
+    BufferedWriter out(file);
+    writeHeader(out, image.dimensions, image.boundaries);
+    out.i32(image.labelCount());
+    for (const LabelRecord& label : image.labels) writeLabel(out, label.length, label.text);
+    out.i32(image.elementCount());
+    for (const ElementRecord& r : image.elements) writeRecord(out, r);
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+std::optional<ArrayImage> readNativeFile(const char* path) {
+  try {
+    std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
+    if (!bytes) return std::nullopt;
+    ArrayImage image;
+    image.storage = std::move(*bytes);
+    ImageSink sink{image};
+    if (!parseNative(image.storage.view(), sink)) return std::nullopt;
+    return image;
+  } catch (const std::bad_alloc&) {
+    return std::nullopt;
+  }
+}
+
+void loadNativeFile(ElementArray& array, const char* path, int32_t append) {
+  const bool replace = append == 0;
+  try {
+    const std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
+    if (replace) array.clear();
+    LoadSink sink{array, replace};
+    if (bytes) parseNative(bytes->view(), sink);
+    if (replace && !sink.headerSeen) array.setDimensions(0);
+    for (const auto& [column, text] : sink.pendingLabels) {
+      io_detail::applyLabel(array, text, column);
+    }
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+}  // namespace quorrel

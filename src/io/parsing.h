@@ -1,0 +1,75 @@
+// Internal helpers of the file readers: a bounds-checked little-endian cursor over a
+// file held in memory, and the line splitting of the text formats.
+#pragma once
+
+#include <algorithm>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <string_view>
+
+namespace quorrel::io_detail {
+
+// Reads fields from a file image. Bytes past the end read as zero, so a short file
+// leaves the fields it does not hold at 0.
+class Cursor {
+ public:
+  explicit Cursor(std::string_view file) : file_(file) {}
+
+  bool atEnd() const { return pos_ >= file_.size(); }
+  std::size_t fileSize() const { return file_.size(); }
+  std::size_t remaining() const { return file_.size() - std::min(pos_, file_.size()); }
+
+  uint32_t unsignedLE(int byteCount) {
+    uint32_t v = 0;
+    for (int i = 0; i < byteCount; ++i, ++pos_) {
+      if (pos_ < file_.size()) v |= uint32_t{static_cast<unsigned char>(file_[pos_])} << (8 * i);
+    }
+    return v;
+  }
+  uint16_t u16() { return static_cast<uint16_t>(unsignedLE(2)); }
+  int32_t i32() { return static_cast<int32_t>(unsignedLE(4)); }
+
+  bool matches(std::string_view magic) {
+    const bool same = pos_ <= file_.size() && file_.substr(pos_).starts_with(magic);
+    pos_ += magic.size();
+    return same;
+  }
+
+  // The next `count` bytes as far as the file holds them; the cursor moves past all
+  // of them (a block cut short by the end leaves the cursor at the end).
+  std::string_view take(int32_t count) {
+    const std::size_t wanted = count > 0 ? static_cast<std::size_t>(count) : 0;
+    const std::size_t held = std::min(wanted, remaining());
+    std::string_view block = atEnd() ? std::string_view(kEmpty, 0) : file_.substr(pos_, held);
+    pos_ = std::min(pos_ + wanted, file_.size());
+    return block;
+  }
+
+ private:
+  static constexpr char kEmpty[1] = {'\0'};
+  std::string_view file_;
+  std::size_t pos_ = 0;
+};
+
+inline bool isLineBreak(char c) {
+  return c == '\r' || c == '\n';
+}
+
+// Calls visit(begin, length) for every line of text[0, size): lines end at CR or LF,
+// and a run of them is one break, so no line is empty. text[size] must be writable
+// (the terminator); a visitor may overwrite begin[length] to cut the line in place.
+template <class Visit>
+void forEachLine(char* text, std::size_t size, Visit&& visit) {
+  std::size_t i = 0;
+  while (i < size) {
+    while (i < size && isLineBreak(text[i])) ++i;
+    if (i >= size) break;
+    const std::size_t start = i;
+    while (i < size && !isLineBreak(text[i])) ++i;
+    visit(text + start, i - start);
+    ++i;
+  }
+}
+
+}  // namespace quorrel::io_detail
