@@ -1,0 +1,49 @@
+#!/usr/bin/env bash
+# Runs one case of the quorrel command in a fresh directory and compares its output
+# with the golden files beside it.
+#   NAME.qs: `quorrel run NAME.qs`; stdout against NAME.out, stderr against NAME.err
+#            (no NAME.err: nothing on stderr, exit status 0; else exit status 2).
+#   NAME.sh: run with $QUORREL set; stdout and stderr together against NAME.out,
+#            exit status 0 (the session prints the statuses it wants to check).
+# Files in data/ are copied into the directory first.
+set -u
+quorrel=$1 case=$2 work=$3
+dir=$(dirname "$case")
+name=$(basename "$case")
+stem=${name%.*}
+rm -rf "$work" && mkdir -p "$work"
+cp "$dir"/../data/* "$work"/ 2>/dev/null || true
+cp "$case" "$work"/
+cd "$work" || exit 1
+
+fail=0
+compare() {  # golden actual label
+  if ! diff -u "$1" "$2" >diff.txt 2>&1; then
+    echo "== $3 differs from $(basename "$1"):"
+    cat diff.txt
+    fail=1
+  fi
+}
+
+if [[ $name == *.qs ]]; then
+  "$quorrel" run "$name" >stdout.txt 2>stderr.txt
+  status=$?
+  expected_status=0
+  err_golden=/dev/null
+  if [[ -f $dir/$stem.err ]]; then
+    expected_status=2
+    err_golden=$dir/$stem.err
+  fi
+  compare "$dir/$stem.out" stdout.txt stdout
+  compare "$err_golden" stderr.txt stderr
+else
+  QUORREL=$quorrel bash "$name" >stdout.txt 2>&1
+  status=$?
+  expected_status=0
+  compare "$dir/$stem.out" stdout.txt output
+fi
+if [[ $status != "$expected_status" ]]; then
+  echo "== exit status $status, expected $expected_status"
+  fail=1
+fi
+exit $fail

@@ -1,0 +1,258 @@
+#include "module.h"
+
+#include <dlfcn.h>
+#include <unistd.h>
+
+#include <climits>
+#include <cstring>
+#include <filesystem>
+#include <map>
+
+namespace quorrel::tool {
+namespace {
+
+template <typename T>
+T readField(const void* record, size_t offset) {
+  T value;
+  std::memcpy(&value, static_cast<const char*>(record) + offset, sizeof value);
+  return value;
+}
+
+template <typename T>
+void writeField(void* record, size_t offset, T value) {
+  std::memcpy(static_cast<char*>(record) + offset, &value, sizeof value);
+}
+
+template <typename Fn>
+Fn required(const Module& module, const char* name) {
+  void* address = module.symbol(name);
+  if (!address) throw ModuleError(module.path() + " does not export " + name);
+  return reinterpret_cast<Fn>(address);
+}
+
+template <typename Fn>
+Fn optional(const Module& module, const char* name) {
+  return reinterpret_cast<Fn>(module.symbol(name));
+}
+
+Signature signatureOf(const abi::InfoEntry* entry) {
+  Signature signature;
+  if (!entry) return signature;
+  for (int i = 0; i < 2 && entry->paramTypes[i] != 0; ++i) {
+    signature.paramTypes[i] = entry->paramTypes[i];
+    signature.paramCount = i + 1;
+  }
+  return signature;
+}
+
+std::string loadText(abi::GetStringFn get, int32_t code) {
+  if (!get) return {};
+  char buffer[1024] = {};
+  get(nullptr, code, buffer, sizeof buffer);
+  return buffer;
+}
+
+// The routine tables that GetRunObjectInfos announces, checked against the counts.
+struct RoutineTables {
+  const abi::ActionRoutine* actions = nullptr;
+  const abi::ExpressionRoutine* expressions = nullptr;
+};
+
+RoutineTables routineTables(const Module& module) {
+  alignas(8) unsigned char info[abi::kRunInfoWrittenSize + 64] = {};
+  required<abi::GetRunObjectInfosFn>(module, "GetRunObjectInfos")(0, info);
+  const auto actionCount = readField<uint16_t>(info, abi::kInfoActionCount);
+  const auto expressionCount = readField<uint16_t>(info, abi::kInfoExpressionCount);
+  if (actionCount != abi::kActionCount || expressionCount != abi::kExpressionCount) {
+    throw ModuleError(module.path() + " announces " + std::to_string(actionCount) +
+                      " actions and " + std::to_string(expressionCount) + " expressions");
+  }
+  return {readField<const abi::ActionRoutine*>(info, abi::kInfoActionRoutines),
+          readField<const abi::ExpressionRoutine*>(info, abi::kInfoExpressionRoutines)};
+}
+
+std::vector<unsigned char> setupRecord(const SetupFields& fields) {
+  std::vector<unsigned char> record(abi::kSetupRecordSize, 0);
+  writeField(record.data(), abi::kSetupObjectWidth, abi::kDefaultObjectWidth);
+  writeField(record.data(), abi::kSetupObjectHeight, abi::kDefaultObjectHeight);
+  writeField(record.data(), abi::kSetupDimensionCount, fields.dims);
+  writeField(record.data(), abi::kSetupXBoundary, fields.x);
+  writeField(record.data(), abi::kSetupYBoundary, fields.y);
+  writeField(record.data(), abi::kSetupCaseSensitive, fields.caseSensitive);
+  writeField(record.data(), abi::kSetupWildcardSearch, fields.wildcard);
+  writeField(record.data(), abi::kSetupAutoSelectRows, fields.autoSelect);
+  const size_t length = std::min(fields.delimiter.size(), abi::kSetupListDelimiterSize - 1);
+  std::memcpy(record.data() + abi::kSetupListDelimiter, fields.delimiter.data(), length);
+  return record;
+}
+
+}  // namespace
+
+// ---------------------------------------------------------------------------------
+Module::Module(std::string path, void* handle) : path_(std::move(path)), handle_(handle) {}
+
+Module::~Module() {
+  dlclose(handle_);
+}
+
+std::unique_ptr<Module> Module::open(const std::string& path) {
+  // A bare file name would make dlopen search the library path instead of using it.
+  const std::string usable = path.find('/') == std::string::npos ? "./" + path : path;
+  void* handle = dlopen(usable.c_str(), RTLD_NOW | RTLD_LOCAL);
+  if (!handle) throw ModuleError(std::string("cannot load module: ") + dlerror());
+  return std::unique_ptr<Module>(new Module(path, handle));
+}
+
+void* Module::symbol(const char* name) const {
+  return dlsym(handle_, name);
+}
+
+Signature Module::actionSignature(int32_t code) const {
+  return signatureOf(required<abi::GetInfoEntryFn>(*this, "GetActionInfos")(nullptr, code));
+}
+
+Signature Module::expressionSignature(int32_t code) const {
+  return signatureOf(required<abi::GetInfoEntryFn>(*this, "GetExpressionInfos")(nullptr, code));
+}
+
+std::optional<int32_t> Module::expressionCodeOfName(std::string_view name) const {
+  const auto get = optional<abi::GetStringFn>(*this, "GetExpressionString");
+  for (int32_t code = 0; get && code < abi::kExpressionCount; ++code) {
+    if (loadText(get, code) == name) return code;
+  }
+  return std::nullopt;
+}
+
+std::string Module::actionString(int32_t code) const {
+  return loadText(required<abi::GetStringFn>(*this, "GetActionString"), code);
+}
+
+std::string Module::expressionString(int32_t code) const {
+  return loadText(required<abi::GetStringFn>(*this, "GetExpressionString"), code);
+}
+
+std::string Module::actionTitle(int32_t code, int param) const {
+  char buffer[1024] = {};
+  required<abi::GetParamTitleFn>(*this, "GetActionTitle")(nullptr, code, param, buffer,
+                                                          sizeof buffer);
+  return buffer;
+}
+
+std::string Module::expressionTitle(int32_t code) const {
+  char buffer[1024] = {};
+  required<abi::GetExpressionTitleFn>(*this, "GetExpressionTitle")(nullptr, code, buffer,
+                                                                   sizeof buffer);
+  return buffer;
+}
+
+void Module::printMenu(std::string_view, std::string&) const {
+  throw ModuleError("menus are not available yet");
+}
+
+// ---------------------------------------------------------------------------------
+// The host side of one instance: its run record, the run-time header holding the
+// services, and the buffer of the last text result.
+struct Instance::State {
+  const Module& module;
+  RoutineTables tables;
+  std::vector<unsigned char> runRecord;
+  std::vector<unsigned char> runHeader;
+  std::vector<Argument> pending;  // parameters of the expression being called
+  size_t nextParameter = 0;
+  std::vector<char> result;
+
+  explicit State(const Module& m) : module(m), tables(routineTables(m)) {}
+
+  static State& of(void* runRecord) {
+    return *readField<State*>(runRecord, abi::kRunHostPartSize - sizeof(State*));
+  }
+
+  static abi::HostWord QUORREL_CALL fetch(void* runRecord, int32_t typeFlag, abi::HostWord) {
+    State& state = of(runRecord);
+    if (state.nextParameter >= state.pending.size()) return 0;
+    const Argument& arg = state.pending[state.nextParameter++];
+    if (typeFlag == abi::kFetchText) {
+      return reinterpret_cast<abi::HostWord>(arg.isText ? arg.text.c_str() : "");
+    }
+    return arg.number;
+  }
+  static abi::HostWord QUORREL_CALL fetchFirst(void* runRecord, int32_t typeFlag,
+                                               abi::HostWord token) {
+    of(runRecord).nextParameter = 0;
+    return fetch(runRecord, typeFlag, token);
+  }
+  static char* QUORREL_CALL allocate(void* runRecord, int32_t byteCount, int32_t) {
+    State& state = of(runRecord);
+    state.result.assign(static_cast<size_t>(std::max(byteCount, 1)), '\0');
+    return state.result.data();
+  }
+};
+
+Instance::Instance(const Module& module, const SetupFields& setup)
+    : state_(std::make_unique<State>(module)) {
+  State& s = *state_;
+  const auto size = required<abi::GetRunObjectDataSizeFn>(module, "GetRunObjectDataSize")(0, 0);
+  s.runRecord.assign(std::max<size_t>(static_cast<uint16_t>(size), abi::kRunRecordSize), 0);
+  s.runHeader.assign(abi::kRunHeaderMinSize, 0);
+  writeField(s.runHeader.data(), abi::kFetchFirstParameter,
+             static_cast<abi::FetchParameterService>(&State::fetchFirst));
+  writeField(s.runHeader.data(), abi::kFetchNextParameter,
+             static_cast<abi::FetchParameterService>(&State::fetch));
+  writeField(s.runHeader.data(), abi::kAllocateResultString,
+             static_cast<abi::AllocateResultStringService>(&State::allocate));
+  writeField(s.runRecord.data(), abi::kRunHeader, static_cast<void*>(s.runHeader.data()));
+  // The host's own part of the record is the host's to use: it finds its state there.
+  writeField(s.runRecord.data(), abi::kRunHostPartSize - sizeof(State*), &s);
+  auto record = setupRecord(setup);
+  required<abi::CreateRunObjectFn>(module, "CreateRunObject")(s.runRecord.data(), record.data(), 0);
+}
+
+Instance::~Instance() {
+  const auto destroy = optional<abi::DestroyRunObjectFn>(state_->module, "DestroyRunObject");
+  if (destroy) destroy(state_->runRecord.data(), 0);
+}
+
+void Instance::callAction(int32_t code, const std::vector<Argument>& args) {
+  abi::HostWord params[2] = {0, 0};
+  for (size_t i = 0; i < args.size() && i < 2; ++i) {
+    params[i] = args[i].isText ? reinterpret_cast<abi::HostWord>(args[i].text.c_str())
+                               : static_cast<abi::HostWord>(args[i].number);
+  }
+  state_->tables.actions[code](state_->runRecord.data(), params[0], params[1]);
+}
+
+ExpressionResult Instance::callExpression(int32_t code, const std::vector<Argument>& args) {
+  State& s = *state_;
+  s.pending = args;
+  s.nextParameter = 0;
+  s.result.clear();
+  auto* record = s.runRecord.data();
+  const auto flags = readField<uint16_t>(record, abi::kRunHostFlags);
+  writeField<uint16_t>(record, abi::kRunHostFlags, flags & ~abi::kResultIsString);
+  const abi::HostWord answer = s.tables.expressions[code](record, 0);
+  ExpressionResult result;
+  if (readField<uint16_t>(record, abi::kRunHostFlags) & abi::kResultIsString) {
+    result.isText = true;
+    const char* text = reinterpret_cast<const char*>(answer);
+    if (text) result.text = text;
+  } else {
+    result.number = static_cast<int32_t>(answer);
+  }
+  return result;
+}
+
+// ---------------------------------------------------------------------------------
+std::string defaultModulePath() {
+  namespace fs = std::filesystem;
+  std::error_code error;
+  const fs::path self = fs::read_symlink("/proc/self/exe", error);
+  if (error) return "libquorrel.so";
+  const fs::path dir = self.parent_path();
+  for (const fs::path& candidate :
+       {dir / "libquorrel.so", dir / "../src/host/libquorrel.so", dir / "../lib/libquorrel.so"}) {
+    if (fs::exists(candidate, error)) return candidate.lexically_normal().string();
+  }
+  return (dir / "../src/host/libquorrel.so").lexically_normal().string();
+}
+
+}  // namespace quorrel::tool

@@ -1,0 +1,228 @@
+#include "script.h"
+
+#include <charconv>
+
+namespace quorrel::tool {
+namespace {
+
+bool isBlank(char c) {
+  return c == ' ' || c == '\t' || c == '\r';
+}
+
+int hexDigit(char c) {
+  if (c >= '0' && c <= '9') return c - '0';
+  if (c >= 'a' && c <= 'f') return c - 'a' + 10;
+  if (c >= 'A' && c <= 'F') return c - 'A' + 10;
+  return -1;
+}
+
+// Index just past the closing quote of the string opening at `open`.
+size_t skipQuoted(std::string_view line, size_t open) {
+  size_t i = open + 1;
+  while (i < line.size() && line[i] != '"') i += line[i] == '\\' ? 2 : 1;
+  if (i >= line.size()) throw ScriptError("unterminated string");
+  return i + 1;
+}
+
+char decodeEscape(std::string_view token, size_t& i) {
+  const char c = token[i + 1];
+  i += 2;
+  switch (c) {
+    case '\\':
+      return '\\';
+    case '"':
+      return '"';
+    case 'n':
+      return '\n';
+    case 'r':
+      return '\r';
+    case 't':
+      return '\t';
+    case 'x': {
+      const int high = i < token.size() ? hexDigit(token[i]) : -1;
+      const int low = i + 1 < token.size() ? hexDigit(token[i + 1]) : -1;
+      if (high < 0 || low < 0) throw ScriptError("\\x needs two hex digits");
+      i += 2;
+      if (high == 0 && low == 0) throw ScriptError("\\x00 is not allowed in a string");
+      return static_cast<char>(high * 16 + low);
+    }
+    default:
+      throw ScriptError(std::string("unknown escape \\") + c + " in string");
+  }
+}
+
+int32_t parseField(std::string_view name, std::string_view value) {
+  if (isQuotedToken(value)) {
+    throw ScriptError("field " + std::string(name) + " of new must be an integer");
+  }
+  return parseInteger(value);
+}
+
+void applyNewField(SetupFields& setup, std::string_view token) {
+  const size_t eq = token.find('=');
+  if (eq == std::string_view::npos || eq == 0 || isQuotedToken(token)) {
+    throw ScriptError("new expects FIELD=VALUE, got " + quoteText(token));
+  }
+  const std::string_view name = token.substr(0, eq);
+  const std::string_view value = token.substr(eq + 1);
+  if (name == "dims") {
+    setup.dims = parseField(name, value);
+  } else if (name == "x") {
+    setup.x = parseField(name, value);
+  } else if (name == "y") {
+    setup.y = parseField(name, value);
+  } else if (name == "case") {
+    setup.caseSensitive = parseField(name, value);
+  } else if (name == "wildcard") {
+    setup.wildcard = parseField(name, value);
+  } else if (name == "autoselect") {
+    setup.autoSelect = parseField(name, value);
+  } else if (name == "delimiter") {
+    if (!isQuotedToken(value)) throw ScriptError("field delimiter of new must be a quoted string");
+    std::string text = parseQuoted(value);
+    if (text.size() > kMaxDelimiterLength) {
+      throw ScriptError("delimiter of " + std::to_string(text.size()) +
+                        " bytes is longer than 1023 bytes");
+    }
+    setup.delimiter = std::move(text);
+  } else {
+    throw ScriptError("unknown field " + quoteText(name) + " in new");
+  }
+}
+
+}  // namespace
+
+std::vector<std::string> splitTokens(std::string_view line) {
+  std::vector<std::string> tokens;
+  size_t i = 0;
+  while (i < line.size()) {
+    if (isBlank(line[i])) {
+      ++i;
+      continue;
+    }
+    const size_t start = i;
+    while (i < line.size() && !isBlank(line[i])) i = line[i] == '"' ? skipQuoted(line, i) : i + 1;
+    tokens.emplace_back(line.substr(start, i - start));
+  }
+  return tokens;
+}
+
+bool isQuotedToken(std::string_view token) {
+  return !token.empty() && token.front() == '"';
+}
+
+bool looksLikeInteger(std::string_view token) {
+  if (!token.empty() && (token.front() == '-' || token.front() == '+')) token.remove_prefix(1);
+  if (token.empty()) return false;
+  for (char c : token) {
+    if (c < '0' || c > '9') return false;
+  }
+  return true;
+}
+
+int32_t parseInteger(std::string_view token) {
+  if (!looksLikeInteger(token)) throw ScriptError("malformed integer " + quoteText(token));
+  std::string_view digits = token;
+  if (digits.front() == '+') digits.remove_prefix(1);
+  int64_t value = 0;
+  const auto [end, status] = std::from_chars(digits.data(), digits.data() + digits.size(), value);
+  if (status != std::errc{} || end != digits.data() + digits.size() || value < INT32_MIN ||
+      value > INT32_MAX) {
+    throw ScriptError("integer " + std::string(token) + " is out of range -2147483648..2147483647");
+  }
+  return static_cast<int32_t>(value);
+}
+
+std::string parseQuoted(std::string_view token) {
+  if (!isQuotedToken(token)) throw ScriptError("malformed string " + quoteText(token));
+  const size_t end = skipQuoted(token, 0);
+  if (end != token.size()) throw ScriptError("malformed string " + quoteText(token));
+  std::string text;
+  size_t i = 1;
+  while (i + 1 < end) {
+    if (token[i] == '\\') {
+      text += decodeEscape(token, i);
+    } else {
+      text += token[i++];
+    }
+  }
+  return text;
+}
+
+std::string quoteText(std::string_view bytes) {
+  static constexpr char kHex[] = "0123456789abcdef";
+  std::string out = "\"";
+  for (char c : bytes) {
+    const auto byte = static_cast<unsigned char>(c);
+    switch (c) {
+      case '"':
+        out += "\\\"";
+        break;
+      case '\\':
+        out += "\\\\";
+        break;
+      case '\n':
+        out += "\\n";
+        break;
+      case '\r':
+        out += "\\r";
+        break;
+      case '\t':
+        out += "\\t";
+        break;
+      default:
+        if (byte >= 0x20 && byte <= 0x7E) {
+          out += c;
+        } else {
+          out += "\\x";
+          out += kHex[byte >> 4];
+          out += kHex[byte & 15];
+        }
+    }
+  }
+  out += '"';
+  return out;
+}
+
+Command parseLine(std::string_view line) {
+  const size_t first = line.find_first_not_of(" \t\r");
+  if (first == std::string_view::npos || line[first] == '#') return {};
+  std::vector<std::string> tokens = splitTokens(line);
+  Command command;
+  const std::string& verb = tokens.front();
+  if (verb == "new") {
+    command.kind = CommandKind::New;
+    for (size_t i = 1; i < tokens.size(); ++i) applyNewField(command.setup, tokens[i]);
+    return command;
+  }
+  if (verb != "A" && verb != "E") throw ScriptError("unknown command " + quoteText(verb));
+  const bool isAction = verb == "A";
+  command.kind = isAction ? CommandKind::Action : CommandKind::Expression;
+  if (tokens.size() < 2) {
+    throw ScriptError(isAction ? "A needs an action code" : "E needs an expression code or name");
+  }
+  const std::string& code = tokens[1];
+  if (looksLikeInteger(code) || isAction) {
+    command.code = parseInteger(code);
+    const int32_t count = isAction ? abi::kActionCount : abi::kExpressionCount;
+    if (command.code < 0 || command.code >= count) {
+      throw ScriptError((isAction ? "action code " : "expression code ") + code +
+                        " is out of range 0.." + std::to_string(count - 1));
+    }
+  } else {
+    command.name = code;
+  }
+  for (size_t i = 2; i < tokens.size(); ++i) {
+    Argument arg;
+    arg.isText = isQuotedToken(tokens[i]);
+    if (arg.isText) {
+      arg.text = parseQuoted(tokens[i]);
+    } else {
+      arg.number = parseInteger(tokens[i]);
+    }
+    command.args.push_back(std::move(arg));
+  }
+  return command;
+}
+
+}  // namespace quorrel::tool

@@ -1,0 +1,68 @@
+// The quorrel script language: one command per line, parsed without the module.
+// Checks that need the module (declared parameter counts and types, expression
+// names) happen when the command runs; see session.h.
+#pragma once
+
+#include <cstdint>
+#include <stdexcept>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "host/abi.h"
+
+namespace quorrel::tool {
+
+// A mistake in one script line; the text is what follows "error: ".
+struct ScriptError : std::runtime_error {
+  using std::runtime_error::runtime_error;
+};
+
+// The setup record fields a `new` command can set, with the editor's defaults.
+struct SetupFields {
+  int32_t dims = 2;
+  int32_t x = 10;
+  int32_t y = 10;
+  int32_t caseSensitive = 0;
+  int32_t wildcard = 0;
+  int32_t autoSelect = 0;
+  std::string delimiter = ",";
+};
+
+// The longest delimiter the setup record holds (1024 bytes with the terminator).
+inline constexpr size_t kMaxDelimiterLength = 1023;
+
+// One typed argument of an action or expression call.
+struct Argument {
+  bool isText = false;
+  int32_t number = 0;
+  std::string text;
+};
+
+enum class CommandKind { Empty, New, Action, Expression };
+
+struct Command {
+  CommandKind kind = CommandKind::Empty;
+  SetupFields setup;           // New
+  int32_t code = -1;           // Action, Expression; -1 when named
+  std::string name;            // Expression given by name
+  std::vector<Argument> args;  // typed by their form, checked against the tables when run
+};
+
+// Splits a line at blanks; a quoted string is one token even with blanks inside.
+std::vector<std::string> splitTokens(std::string_view line);
+
+bool isQuotedToken(std::string_view token);
+bool looksLikeInteger(std::string_view token);
+
+// Literals: optional sign and decimal digits within int32; "..." with escapes.
+int32_t parseInteger(std::string_view token);
+std::string parseQuoted(std::string_view token);
+
+// The printed form of a text result: "..." with non-printing bytes escaped.
+std::string quoteText(std::string_view bytes);
+
+// Parses one line; blank lines and comments give CommandKind::Empty.
+Command parseLine(std::string_view line);
+
+}  // namespace quorrel::tool
