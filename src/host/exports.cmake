@@ -30,4 +30,8 @@ if(NOT WIN32 AND NOT APPLE)
   file(CONFIGURE OUTPUT ${quorrel_version_script} CONTENT "${quorrel_map_text}" @ONLY)
   target_link_options(quorrel_module PRIVATE "LINKER:--version-script=${quorrel_version_script}")
   set_property(TARGET quorrel_module APPEND PROPERTY LINK_DEPENDS ${quorrel_version_script})
+  # A routine that is declared but never defined must fail the build, not the host.
+  if(NOT QUORREL_SANITIZE)
+    target_link_options(quorrel_module PRIVATE "LINKER:--no-undefined")
+  endif()
 endif()

@@ -32,9 +32,6 @@ QUORREL_ACTION_ROUTINE(appendElementsFromHostArray) {
 QUORREL_ACTION_ROUTINE(appendElementsFromCsvFile) {
   return runAction(runRecord, [](ElementArray&) {});
 }
-QUORREL_ACTION_ROUTINE(pickColumnForBetween) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
 QUORREL_ACTION_ROUTINE(saveElementToFile) {
   return runAction(runRecord, [](ElementArray&) {});
 }
@@ -128,12 +125,6 @@ QUORREL_ACTION_ROUTINE(loadFromIniFile) {
 QUORREL_ACTION_ROUTINE(appendElementsFromIniFile) {
   return runAction(runRecord, [](ElementArray&) {});
 }
-QUORREL_ACTION_ROUTINE(andMode) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(orMode) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
 QUORREL_ACTION_ROUTINE(selectAllRows) {
   return runAction(runRecord, [](ElementArray&) {});
 }
@@ -187,43 +178,6 @@ QUORREL_ACTION_ROUTINE(startNewWhere) {
 
 namespace quorrel::host::expr {
 
-QUORREL_EXPRESSION_ROUTINE(indexOfKeyString) {
-  return runExpression<Text>(runRecord, parameterToken,
-                             [](ElementArray&, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(indexOfKeyValue) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray&, int32_t) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(stringWithStringKey) {
-  return runExpression<Text>(runRecord, parameterToken,
-                             [](ElementArray&, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(stringWithValueKey) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray&, int32_t) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(valueWithStringKey) {
-  return runExpression<Text>(runRecord, parameterToken,
-                             [](ElementArray&, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(valueWithValueKey) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray&, int32_t) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(findString) {
-  return runExpression<Text, Int>(runRecord, parameterToken,
-                                  [](ElementArray&, const char*, int32_t) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(findValue) {
-  return runExpression<Int, Int>(runRecord, parameterToken,
-                                 [](ElementArray&, int32_t, int32_t) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(containsString) {
-  return runExpression<Text, Int>(runRecord, parameterToken,
-                                  [](ElementArray&, const char*, int32_t) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(containsValue) {
-  return runExpression<Int, Int>(runRecord, parameterToken,
-                                 [](ElementArray&, int32_t, int32_t) { return 0; });
-}
 QUORREL_EXPRESSION_ROUTINE(list) {
   return runExpression<Text>(runRecord, parameterToken,
                              [](ElementArray&, const char*) { return 0; });
@@ -297,9 +251,6 @@ QUORREL_EXPRESSION_ROUTINE(getFromLabelRow) {
 QUORREL_EXPRESSION_ROUTINE(getStringFromLabelRow) {
   return runExpression<Text, Int>(runRecord, parameterToken,
                                   [](ElementArray&, const char*, int32_t) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(delimiter) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray&) { return 0; });
 }
 QUORREL_EXPRESSION_ROUTINE(colMax) {
   return runExpression<Int>(runRecord, parameterToken, [](ElementArray&, int32_t) { return 0; });

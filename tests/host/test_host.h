@@ -1,0 +1,224 @@
+// A small host for tests: loads the module by path, reads its RunInfo, and runs
+// instances with a fake run-time header whose three services record every call.
+#pragma once
+
+#include <dlfcn.h>
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <cstring>
+#include <deque>
+#include <string>
+#include <vector>
+
+#include "host/abi.h"
+
+namespace testhost {
+
+using namespace quorrel::abi;
+
+template <typename T>
+T readAt(const void* base, std::size_t offset) {
+  T value;
+  std::memcpy(&value, static_cast<const char*>(base) + offset, sizeof value);
+  return value;
+}
+template <typename T>
+void writeAt(void* base, std::size_t offset, T value) {
+  std::memcpy(static_cast<char*>(base) + offset, &value, sizeof value);
+}
+
+// The module, loaded once for the whole test program.
+class Module {
+ public:
+  static Module& get() {
+    static Module module;
+    return module;
+  }
+  void* symbol(const char* name) const { return handle_ ? dlsym(handle_, name) : nullptr; }
+  template <typename Fn>
+  Fn entry(const char* name) const {
+    void* address = symbol(name);
+    Fn fn = nullptr;
+    std::memcpy(&fn, &address, sizeof fn);
+    return fn;
+  }
+  bool loaded() const { return handle_ != nullptr; }
+  const char* error() const { return error_.c_str(); }
+
+  // Filled by GetRunObjectInfos.
+  std::vector<unsigned char> runInfo;
+  const ActionRoutine* actions() const {
+    return readAt<const ActionRoutine*>(runInfo.data(), kInfoActionRoutines);
+  }
+  const ExpressionRoutine* expressions() const {
+    return readAt<const ExpressionRoutine*>(runInfo.data(), kInfoExpressionRoutines);
+  }
+
+ private:
+  Module() {
+    handle_ = dlopen(QUORREL_MODULE_PATH, RTLD_NOW | RTLD_LOCAL);
+    if (handle_ == nullptr) {
+      error_ = dlerror();
+      return;
+    }
+    runInfo.assign(64, 0xCC);
+    entry<GetRunObjectInfosFn>("GetRunObjectInfos")(0, runInfo.data());
+  }
+  void* handle_ = nullptr;
+  std::string error_;
+};
+
+// A setup record as the host stores it, starting from the editor's defaults.
+struct SetupRecord {
+  std::vector<unsigned char> bytes = std::vector<unsigned char>(kSetupRecordSize, 0);
+  SetupRecord() {
+    writeAt<int16_t>(bytes.data(), kSetupObjectWidth, 32);
+    writeAt<int16_t>(bytes.data(), kSetupObjectHeight, 32);
+    set(kSetupDimensionCount, 2);
+    set(kSetupXBoundary, 10);
+    set(kSetupYBoundary, 10);
+    delimiter(",");
+  }
+  SetupRecord& set(std::size_t offset, int32_t value) {
+    writeAt(bytes.data(), offset, value);
+    return *this;
+  }
+  SetupRecord& delimiter(const char* text) {
+    std::memset(bytes.data() + kSetupListDelimiter, 0, kSetupListDelimiterSize);
+    std::memcpy(bytes.data() + kSetupListDelimiter, text, std::strlen(text));
+    return *this;
+  }
+  void* data() { return bytes.data(); }
+};
+
+// An action or expression argument: a number or a text.
+struct Arg {
+  Arg() = default;
+  Arg(int32_t n) : number(n) {}  // NOLINT: arguments read naturally as literals
+  Arg(const char* t) : text(t), isText(true) {}
+  Arg(const std::string& t) : text(t), isText(true) {}
+  HostWord word() const {
+    return isText ? reinterpret_cast<HostWord>(text.c_str()) : static_cast<HostWord>(number);
+  }
+  int32_t number = 0;
+  std::string text;
+  bool isText = false;
+};
+
+struct FetchCall {
+  bool first;
+  int32_t typeFlag;
+  HostWord token;
+};
+
+inline constexpr HostWord kToken = 0x5EED;
+
+class Instance {
+ public:
+  explicit Instance(SetupRecord setup = SetupRecord(), bool createNow = true)
+      : setup_(std::move(setup)) {
+    Module& module = Module::get();
+    const auto dataSize = module.entry<GetRunObjectDataSizeFn>("GetRunObjectDataSize")(0, 0);
+    record_.assign(static_cast<std::size_t>(dataSize), 0);
+    header_.assign(kRunHeaderMinSize, 0);
+    writeAt<Instance*>(record_.data(), 0, this);  // host-owned bytes: find the instance back
+    writeAt<void*>(record_.data(), kRunHeader, header_.data());
+    writeAt<FetchParameterService>(header_.data(), kFetchFirstParameter, &fetchFirst);
+    writeAt<FetchParameterService>(header_.data(), kFetchNextParameter, &fetchNext);
+    writeAt<AllocateResultStringService>(header_.data(), kAllocateResultString, &allocate);
+    if (createNow) create();
+  }
+  void create() {
+    created_ = true;
+    Module::get().entry<CreateRunObjectFn>("CreateRunObject")(record_.data(), setup_.data(), 0);
+  }
+  ~Instance() {
+    if (created_) Module::get().entry<DestroyRunObjectFn>("DestroyRunObject")(record_.data(), 0);
+  }
+  Instance(const Instance&) = delete;
+  Instance& operator=(const Instance&) = delete;
+
+  void* record() { return record_.data(); }
+  uint16_t flags() const { return readAt<uint16_t>(record_.data(), kRunHostFlags); }
+  void setFlags(uint16_t value) { writeAt(record_.data(), kRunHostFlags, value); }
+  void* elementArray() const { return readAt<void*>(record_.data(), kRunElementArray); }
+  int32_t betweenColumn() const { return readAt<int32_t>(record_.data(), kRunBetweenColumn); }
+
+  int16_t action(int code, const Arg& p1 = Arg(), const Arg& p2 = Arg()) {
+    return Module::get().actions()[code](record_.data(), p1.word(), p2.word());
+  }
+  HostWord expression(int code, std::vector<Arg> params = {}) {
+    params_ = std::move(params);
+    next_ = 0;
+    fetches.clear();
+    allocations.clear();
+    return Module::get().expressions()[code](record_.data(), kToken);
+  }
+  // A number result: the string flag must stay as it was.
+  int32_t number(int code, std::vector<Arg> params = {}) {
+    setFlags(0x0001);
+    const HostWord result = expression(code, std::move(params));
+    EXPECT_EQ(flags(), 0x0001) << "expression " << code;
+    return static_cast<int32_t>(result);
+  }
+  // A text result: flag set, buffer of exactly the text's size.
+  std::string text(int code, std::vector<Arg> params = {}) {
+    setFlags(0);
+    const HostWord result = expression(code, std::move(params));
+    EXPECT_EQ(flags(), kResultIsString) << "expression " << code;
+    if (result == 0 || allocations.size() != 1) {
+      ADD_FAILURE() << "expression " << code << " gave no text";
+      return "<none>";
+    }
+    std::string value(reinterpret_cast<const char*>(result));
+    EXPECT_EQ(allocations[0], static_cast<int32_t>(value.size() + 1));
+    return value;
+  }
+  // No text: the number 0, flag untouched, nothing allocated.
+  bool noText(int code, std::vector<Arg> params = {}) {
+    setFlags(0);
+    const HostWord result = expression(code, std::move(params));
+    return result == 0 && flags() == 0 && allocations.empty();
+  }
+
+  std::vector<FetchCall> fetches;
+  std::vector<int32_t> allocations;
+
+ private:
+  static Instance* owner(void* record) { return readAt<Instance*>(record, 0); }
+  static HostWord QUORREL_CALL fetchFirst(void* record, int32_t flag, HostWord token) {
+    Instance* self = owner(record);
+    self->next_ = 0;
+    return self->fetch(true, flag, token);
+  }
+  static HostWord QUORREL_CALL fetchNext(void* record, int32_t flag, HostWord token) {
+    return owner(record)->fetch(false, flag, token);
+  }
+  static char* QUORREL_CALL allocate(void* record, int32_t count, int32_t reserved) {
+    Instance* self = owner(record);
+    EXPECT_EQ(reserved, 0);
+    self->allocations.push_back(count);
+    self->buffers_.emplace_back(static_cast<std::size_t>(count), '\x7f');
+    return self->buffers_.back().data();
+  }
+  HostWord fetch(bool first, int32_t flag, HostWord token) {
+    fetches.push_back({first, flag, token});
+    if (next_ >= params_.size()) return 0;
+    const Arg& arg = params_[next_++];
+    if (flag == kFetchText) {
+      return reinterpret_cast<HostWord>(arg.isText ? arg.text.c_str() : "");
+    }
+    return static_cast<HostWord>(arg.number);
+  }
+
+  SetupRecord setup_;
+  bool created_ = false;
+  std::vector<unsigned char> record_;
+  std::vector<unsigned char> header_;
+  std::vector<Arg> params_;
+  std::size_t next_ = 0;
+  std::deque<std::vector<char>> buffers_;
+};
+
+}  // namespace testhost
