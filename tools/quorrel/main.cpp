@@ -80,6 +80,7 @@ struct Options {
   bool toGiven = false;
   bool help = false;
   std::vector<std::string> words;  // the command and its operands
+  std::string mistake;             // the first misuse found, reported once all is read
 };
 
 Options parseOptions(int argc, char** argv) {
@@ -89,8 +90,9 @@ Options parseOptions(int argc, char** argv) {
     auto value = [&](const char* name) -> std::string {
       const std::string prefix = std::string(name) + "=";
       if (arg.rfind(prefix, 0) == 0) return arg.substr(prefix.size());
-      if (i + 1 >= argc) throw UsageError(std::string(name) + " needs a value");
-      return argv[++i];
+      if (i + 1 < argc) return argv[++i];
+      if (options.mistake.empty()) options.mistake = std::string(name) + " needs a value";
+      return {};
     };
     if (arg == "--help" || arg == "-h") {
       options.help = true;
@@ -100,7 +102,7 @@ Options parseOptions(int argc, char** argv) {
       options.to = value("--to");
       options.toGiven = true;
     } else if (arg.size() > 1 && arg[0] == '-') {
-      throw UsageError("unknown option " + arg);
+      if (options.mistake.empty()) options.mistake = "unknown option " + arg;
     } else {
       options.words.push_back(arg);
     }
@@ -163,6 +165,7 @@ int main(int argc, char** argv) {
   try {
     const Options options = parseOptions(argc, argv);
     if (!options.words.empty()) command = options.words[0];
+    if (!options.mistake.empty()) throw UsageError(options.mistake);
     if (options.help) {
       const auto help = kCommandHelp.find(command);
       std::cout << (help == kCommandHelp.end() ? kMainHelp : help->second);
