@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
-#include <memory>
+#include <optional>
 #include <string>
 #include <tuple>
 #include <type_traits>
@@ -74,11 +74,6 @@ class ParameterFetcher {
 struct Borrowed {
   const char* text;
 };
-// A text built for this call: copied to the host, then released with the result.
-struct FreshText {
-  std::unique_ptr<char, decltype(&std::free)> text{nullptr, &std::free};
-};
-
 // Copies text into a host buffer and marks the result as text; no text answers the
 // number 0 and leaves the flag alone.
 inline HostWord handOverText(void* runRecord, const char* text) {
@@ -97,10 +92,12 @@ inline HostWord resultWord(void*, int32_t number) {
 inline HostWord resultWord(void* runRecord, Borrowed text) {
   return handOverText(runRecord, text.text);
 }
-inline HostWord resultWord(void* runRecord, const FreshText& text) {
-  return handOverText(runRecord, text.text.get());
+// A fresh text built for this call: copied, then released with the string.
+inline HostWord resultWord(void* runRecord, const std::string& text) {
+  return handOverText(runRecord, text.c_str());
 }
-inline HostWord resultWord(void* runRecord, const std::unique_ptr<std::string>& text) {
+// A fresh text that may be absent.
+inline HostWord resultWord(void* runRecord, const std::optional<std::string>& text) {
   return handOverText(runRecord, text ? text->c_str() : nullptr);
 }
 

@@ -5,25 +5,16 @@
 
 namespace quorrel::host::act {
 
-QUORREL_ACTION_ROUTINE(saveToFile) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
 QUORREL_ACTION_ROUTINE(saveAsHostArray) {
   return runAction(runRecord, [](ElementArray&) {});
 }
 QUORREL_ACTION_ROUTINE(saveToCsvFile) {
   return runAction(runRecord, [](ElementArray&) {});
 }
-QUORREL_ACTION_ROUTINE(loadFromFile) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
 QUORREL_ACTION_ROUTINE(loadFromHostArray) {
   return runAction(runRecord, [](ElementArray&) {});
 }
 QUORREL_ACTION_ROUTINE(loadFromCsvFile) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(appendElementsFromFile) {
   return runAction(runRecord, [](ElementArray&) {});
 }
 QUORREL_ACTION_ROUTINE(appendElementsFromHostArray) {
@@ -36,18 +27,6 @@ QUORREL_ACTION_ROUTINE(saveElementToFile) {
   return runAction(runRecord, [](ElementArray&) {});
 }
 QUORREL_ACTION_ROUTINE(appendElementToFile) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(sortStringsAscending) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(sortStringsDescending) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(sortValuesAscending) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(sortValuesDescending) {
   return runAction(runRecord, [](ElementArray&) {});
 }
 QUORREL_ACTION_ROUTINE(selectRowsBetweenValues) {
@@ -178,42 +157,6 @@ QUORREL_ACTION_ROUTINE(startNewWhere) {
 
 namespace quorrel::host::expr {
 
-QUORREL_EXPRESSION_ROUTINE(list) {
-  return runExpression<Text>(runRecord, parameterToken,
-                             [](ElementArray&, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(quotedList) {
-  return runExpression<Text>(runRecord, parameterToken,
-                             [](ElementArray&, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(keyList) {
-  return runExpression<Text>(runRecord, parameterToken,
-                             [](ElementArray&, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(keyQuotedList) {
-  return runExpression<Text>(runRecord, parameterToken,
-                             [](ElementArray&, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(pairList) {
-  return runExpression<Text, Text>(runRecord, parameterToken,
-                                   [](ElementArray&, const char*, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(pairQuotedList) {
-  return runExpression<Text, Text>(runRecord, parameterToken,
-                                   [](ElementArray&, const char*, const char*) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(max) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray&) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(min) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray&) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(sum) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray&) { return 0; });
-}
-QUORREL_EXPRESSION_ROUTINE(avg) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray&) { return 0; });
-}
 QUORREL_EXPRESSION_ROUTINE(numberOfRows) {
   return runExpression<>(runRecord, parameterToken, [](ElementArray&) { return 0; });
 }

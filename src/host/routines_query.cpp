@@ -1,7 +1,9 @@
 // Routines of the key probes, element searches, lists, totals and element sorts.
 #include "host/routine_support.h"
 #include "host/routines.h"
+#include "query/lists.h"
 #include "query/search.h"
+#include "query/sort.h"
 
 namespace quorrel::host::expr {
 
@@ -63,4 +65,66 @@ QUORREL_EXPRESSION_ROUTINE(containsValue) {
                                  });
 }
 
+// Lists are fresh texts: copied to the host, then released.
+QUORREL_EXPRESSION_ROUTINE(list) {
+  return runExpression<Text>(runRecord, parameterToken,
+                             [](ElementArray& a, const char* d) { return elementList(a, d); });
+}
+QUORREL_EXPRESSION_ROUTINE(quotedList) {
+  return runExpression<Text>(runRecord, parameterToken, [](ElementArray& a, const char* d) {
+    return quotedElementList(a, d);
+  });
+}
+QUORREL_EXPRESSION_ROUTINE(keyList) {
+  return runExpression<Text>(runRecord, parameterToken,
+                             [](ElementArray& a, const char* d) { return quorrel::keyList(a, d); });
+}
+QUORREL_EXPRESSION_ROUTINE(keyQuotedList) {
+  return runExpression<Text>(runRecord, parameterToken,
+                             [](ElementArray& a, const char* d) { return quotedKeyList(a, d); });
+}
+QUORREL_EXPRESSION_ROUTINE(pairList) {
+  return runExpression<Text, Text>(runRecord, parameterToken,
+                                   [](ElementArray& a, const char* separator, const char* d) {
+                                     return quorrel::pairList(a, separator, d);
+                                   });
+}
+QUORREL_EXPRESSION_ROUTINE(pairQuotedList) {
+  return runExpression<Text, Text>(runRecord, parameterToken,
+                                   [](ElementArray& a, const char* separator, const char* d) {
+                                     return quotedPairList(a, separator, d);
+                                   });
+}
+
+QUORREL_EXPRESSION_ROUTINE(max) {
+  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return maxValue(a); });
+}
+QUORREL_EXPRESSION_ROUTINE(min) {
+  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return minValue(a); });
+}
+QUORREL_EXPRESSION_ROUTINE(sum) {
+  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return sumValue(a); });
+}
+QUORREL_EXPRESSION_ROUTINE(avg) {
+  return runExpression<>(runRecord, parameterToken,
+                         [](ElementArray& a) { return averageValue(a); });
+}
+
 }  // namespace quorrel::host::expr
+
+namespace quorrel::host::act {
+
+QUORREL_ACTION_ROUTINE(sortStringsAscending) {
+  return runAction(runRecord, [](ElementArray& a) { sortElements(a, SortByText, 0); });
+}
+QUORREL_ACTION_ROUTINE(sortStringsDescending) {
+  return runAction(runRecord, [](ElementArray& a) { sortElements(a, SortByText, 1); });
+}
+QUORREL_ACTION_ROUTINE(sortValuesAscending) {
+  return runAction(runRecord, [](ElementArray& a) { sortElements(a, SortByValue, 0); });
+}
+QUORREL_ACTION_ROUTINE(sortValuesDescending) {
+  return runAction(runRecord, [](ElementArray& a) { sortElements(a, SortByValue, 1); });
+}
+
+}  // namespace quorrel::host::act
