@@ -1,0 +1,196 @@
+#include "recordset/table.h"
+
+#include <algorithm>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "array/text.h"
+#include "query/compare.h"
+
+namespace quorrel {
+
+namespace {
+
+bool isTable(const ElementArray& array) {
+  return array.dimensions() == 2;
+}
+
+// Joins the texts of the given cells with the whole delimiter text between them. The
+// length is measured first so the result is built in one allocation.
+template <typename ForEachCell>
+std::string joinCells(const ElementArray& array, ForEachCell&& forEachCell) {
+  const std::string_view delimiter = array.listDelimiter();
+  std::size_t length = 0;
+  std::size_t fields = 0;
+  forEachCell([&](const Element& cell) {
+    length += static_cast<std::size_t>(cell.textLength());
+    ++fields;
+  });
+  if (fields > 1) length += (fields - 1) * delimiter.size();
+  std::string out;
+  out.reserve(length);
+  NumberText scratch;
+  bool first = true;
+  forEachCell([&](const Element& cell) {
+    if (!first) out.append(delimiter);
+    first = false;
+    out.append(cell.asString(scratch));
+  });
+  return out;
+}
+
+// The fields of a list, split at the characters of the delimiter; each field is kept
+// zero-terminated for the element edits. Fields past `columns` are not needed.
+std::vector<std::string> splitFields(const ElementArray& array, const char* list, int32_t columns) {
+  std::vector<std::string> fields;
+  if (list == nullptr) return fields;
+  TokenSplitter tokens(list, array.listDelimiter());
+  while (static_cast<int32_t>(fields.size()) < columns) {
+    auto token = tokens.next();
+    if (!token) break;
+    fields.emplace_back(*token);
+  }
+  return fields;
+}
+
+// The field for column i, or null (stored as a None element) when the list ran out.
+const char* fieldText(const std::vector<std::string>& fields, int32_t i) {
+  return static_cast<std::size_t>(i) < fields.size() ? fields[static_cast<std::size_t>(i)].c_str()
+                                                     : nullptr;
+}
+
+}  // namespace
+
+// --- Geometry ----------------------------------------------------------------------------
+
+int32_t numberOfRows(const ElementArray& array) {
+  return static_cast<int32_t>(
+      std::count(array.rowStates.begin(), array.rowStates.end(), RowSelected));
+}
+
+int32_t numberOfCols(const ElementArray& array) {
+  return isTable(array) ? array.boundary(1) : 0;
+}
+
+int32_t visibleRowPosition(const ElementArray& array, int32_t n) {
+  int32_t selected = 0;
+  const auto count = static_cast<int32_t>(array.rowStates.size());
+  for (int32_t r = 0; r < count; ++r) {
+    if (array.rowStates[static_cast<std::size_t>(r)] != RowSelected) continue;
+    if (selected == n) return r;
+    ++selected;
+  }
+  // Not found: `selected` now counts every visible row.
+  return selected;
+}
+
+int32_t visibleCellIndex(const ElementArray& array, int32_t n, int32_t column) {
+  return cellIndex(array, visibleRowPosition(array, n), column);
+}
+
+// --- Lists -------------------------------------------------------------------------------
+
+std::optional<std::string> rowList(const ElementArray& array, int32_t n) {
+  if (!isTable(array) || n < 0 || n >= numberOfRows(array)) return std::nullopt;
+  const int32_t base = visibleCellIndex(array, n, 0);
+  const int32_t columns = numberOfCols(array);
+  return joinCells(array, [&](auto&& emit) {
+    for (int32_t j = 0; j < columns; ++j) emit(array.at(base + j));
+  });
+}
+
+std::optional<std::string> columnList(const ElementArray& array, int32_t column) {
+  if (!isTable(array) || column < 0 || column >= numberOfCols(array)) return std::nullopt;
+  return joinCells(array, [&](auto&& emit) {
+    forEachVisibleRow(array, [&](int32_t r) { emit(array.at(cellIndex(array, r, column))); });
+  });
+}
+
+std::optional<std::string> labelList(const ElementArray& array) {
+  if (!isTable(array) || array.labels.empty()) return std::nullopt;
+  const std::string_view delimiter = array.listDelimiter();
+  std::size_t length = (array.labels.size() - 1) * delimiter.size();
+  for (const std::string& label : array.labels) length += label.size();
+  std::string out;
+  out.reserve(length);
+  for (std::size_t i = 0; i < array.labels.size(); ++i) {
+    if (i > 0) out.append(delimiter);
+    out.append(array.labels[i]);
+  }
+  return out;
+}
+
+// --- Row edits ---------------------------------------------------------------------------
+
+void insertRowFromList(ElementArray& array, const char* list, int32_t n) {
+  if (!isTable(array) || n > numberOfRows(array)) return;
+  const int32_t columns = numberOfCols(array);
+  const std::vector<std::string> fields = splitFields(array, list, columns);
+  const int32_t base = visibleCellIndex(array, n, 0);
+  for (int32_t i = 0; i < columns; ++i) array.insertString(fieldText(fields, i), base + i);
+}
+
+void appendRowFromList(ElementArray& array, const char* list) {
+  insertRowFromList(array, list, numberOfRows(array));
+}
+
+void replaceRowWithList(ElementArray& array, const char* list, int32_t n) {
+  if (!isTable(array) || n >= numberOfRows(array)) return;
+  const int32_t columns = numberOfCols(array);
+  const std::vector<std::string> fields = splitFields(array, list, columns);
+  const int32_t base = visibleCellIndex(array, n, 0);
+  for (int32_t i = 0; i < columns; ++i) array.setString(fieldText(fields, i), base + i);
+}
+
+void deleteRow(ElementArray& array, int32_t n) {
+  if (!isTable(array) || n >= numberOfRows(array)) return;
+  const int32_t base = visibleCellIndex(array, n, 0);
+  // Highest index first, so each delete leaves the lower cells of the row in place.
+  for (int32_t i = numberOfCols(array) - 1; i >= 0; --i) array.deleteAt(base + i);
+}
+
+void swapRows(ElementArray& array, int32_t a, int32_t b) {
+  if (!isTable(array)) return;
+  const int32_t visible = numberOfRows(array);
+  if (a >= visible || b >= visible) return;
+  const int32_t columns = numberOfCols(array);
+  for (int32_t j = 0; j < columns; ++j) {
+    const int32_t x = cellIndex(array, a, j);
+    const int32_t y = cellIndex(array, b, j);
+    if (array.inRange(x) && array.inRange(y)) std::swap(array.at(x), array.at(y));
+  }
+}
+
+// --- Labels ------------------------------------------------------------------------------
+// An empty vector is "no labels yet"; an empty entry is a column without a label.
+
+const char* getLabel(const ElementArray& array, int32_t column) {
+  if (!isTable(array) || column < 0) return nullptr;
+  if (static_cast<std::size_t>(column) >= array.labels.size()) return nullptr;
+  const std::string& label = array.labels[static_cast<std::size_t>(column)];
+  return label.empty() ? nullptr : label.c_str();
+}
+
+void setLabel(ElementArray& array, const char* text, int32_t column) {
+  if (!isTable(array)) return;
+  // The list follows the column count only here, so a change of the X boundary shows
+  // in the labels at the next setLabel.
+  array.labels.resize(static_cast<std::size_t>(std::max(numberOfCols(array), 0)));
+  if (text == nullptr || column < 0) return;
+  if (static_cast<std::size_t>(column) >= array.labels.size()) return;
+  array.labels[static_cast<std::size_t>(column)] = text;
+}
+
+int32_t columnOfLabel(const ElementArray& array, const char* name) {
+  if (!isTable(array)) return -1;
+  for (std::size_t i = 0; i < array.labels.size(); ++i) {
+    const std::string& label = array.labels[i];
+    if (!label.empty() && searchCompare(array, name, label.c_str()) == 0) {
+      return static_cast<int32_t>(i);
+    }
+  }
+  return -1;
+}
+
+}  // namespace quorrel
