@@ -58,7 +58,9 @@ std::unordered_set<HWND>& liveWindows() {
   return windows;
 }
 
-Window* live(HWND handle) { return liveWindows().count(handle) ? handle : nullptr; }
+Window* live(HWND handle) {
+  return liveWindows().count(handle) ? handle : nullptr;
+}
 
 Window* openDialog(HWND handle) {
   Window* dialog = live(handle);
@@ -74,9 +76,15 @@ Window* control(HWND dialogHandle, int id) {
   return nullptr;
 }
 
-bool isButton(const Window& w) { return w.className == "Button"; }
-bool isEdit(const Window& w) { return w.className == "Edit"; }
-uint32_t buttonType(const Window& w) { return w.style & BS_TYPEMASK; }
+bool isButton(const Window& w) {
+  return w.className == "Button";
+}
+bool isEdit(const Window& w) {
+  return w.className == "Edit";
+}
+uint32_t buttonType(const Window& w) {
+  return w.style & BS_TYPEMASK;
+}
 
 // Owns a dialog built from its template and registered while it lives.
 class DialogInstance {
@@ -214,7 +222,9 @@ LONG_PTR GetWindowLongA(HWND handle, int index) {
   return window->userData;
 }
 
-HWND GetDlgItem(HWND dialog, int id) { return control(dialog, id); }
+HWND GetDlgItem(HWND dialog, int id) {
+  return control(dialog, id);
+}
 
 BOOL SetDlgItemTextA(HWND dialog, int id, LPCSTR text) {
   Window* target = control(dialog, id);
@@ -330,7 +340,9 @@ BOOL QuorrelDialogKey(HWND dialogHandle, UINT key) {
   return TRUE;
 }
 
-BOOL QuorrelDialogIsOpen(HWND dialog) { return openDialog(dialog) ? TRUE : FALSE; }
+BOOL QuorrelDialogIsOpen(HWND dialog) {
+  return openDialog(dialog) ? TRUE : FALSE;
+}
 
 }  // extern "C"
 

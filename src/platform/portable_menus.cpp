@@ -128,7 +128,9 @@ HMENU LoadMenuA(HINSTANCE, LPCSTR name) {
   return nullptr;
 }
 
-HMENU CreatePopupMenu(void) { return newMenu(); }
+HMENU CreatePopupMenu(void) {
+  return newMenu();
+}
 
 BOOL DestroyMenu(HMENU handle) {
   Menu* menu = live(handle);

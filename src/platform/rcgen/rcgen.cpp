@@ -97,7 +97,8 @@ class Lexer {
         token.kind = Token::Word;
         token.text = c == '{' ? "BEGIN" : "END";
         ++pos_;
-      } else if (isDigit(c) || (c == '-' && pos_ + 1 < source_.size() && isDigit(source_[pos_ + 1]))) {
+      } else if (isDigit(c) ||
+                 (c == '-' && pos_ + 1 < source_.size() && isDigit(source_[pos_ + 1]))) {
         token.kind = Token::Number;
         token.number = number();
       } else if (isWordChar(c)) {
@@ -170,10 +171,18 @@ class Lexer {
       if (c == '\\' && pos_ < source_.size()) {
         char e = source_[pos_++];
         switch (e) {
-          case 'n': text += '\n'; break;
-          case 't': text += '\t'; break;
-          case '0': text += '\0'; break;
-          default: text += e; break;
+          case 'n':
+            text += '\n';
+            break;
+          case 't':
+            text += '\t';
+            break;
+          case '0':
+            text += '\0';
+            break;
+          default:
+            text += e;
+            break;
         }
         continue;
       }
@@ -192,7 +201,7 @@ class Lexer {
     int64_t value = 0;
     while (pos_ < source_.size()) {
       char c = source_[pos_];
-      int digit = isDigit(c)                                ? c - '0'
+      int digit = isDigit(c)                           ? c - '0'
                   : base == 16 && c >= 'a' && c <= 'f' ? c - 'a' + 10
                   : base == 16 && c >= 'A' && c <= 'F' ? c - 'A' + 10
                                                        : -1;
@@ -257,9 +266,7 @@ class Parser {
     throw ParseError{"line " + std::to_string(peek().line) + ": " + what};
   }
 
-  bool atWord(const char* word) const {
-    return peek().kind == Token::Word && peek().text == word;
-  }
+  bool atWord(const char* word) const { return peek().kind == Token::Word && peek().text == word; }
   void expectWord(const char* word) {
     if (!atWord(word)) fail(std::string("expected ") + word);
     take();
@@ -326,9 +333,12 @@ class Parser {
       take();
       expectWord("BEGIN");
       while (!atWord("END")) {
-        if (peek().kind == Token::Comma) take();
-        else if (peek().kind == Token::Number || peek().kind == Token::Text) take();
-        else fail("unexpected data item");
+        if (peek().kind == Token::Comma)
+          take();
+        else if (peek().kind == Token::Number || peek().kind == Token::Text)
+          take();
+        else
+          fail("unexpected data item");
       }
       take();
     } else {
@@ -385,9 +395,11 @@ class Parser {
   }
 
   uint16_t menuOption() {
-    static const std::map<std::string, uint16_t> options = {
-        {"GRAYED", 0x1}, {"INACTIVE", 0x2}, {"CHECKED", 0x8}, {"MENUBARBREAK", 0x20},
-        {"MENUBREAK", 0x40}};
+    static const std::map<std::string, uint16_t> options = {{"GRAYED", 0x1},
+                                                            {"INACTIVE", 0x2},
+                                                            {"CHECKED", 0x8},
+                                                            {"MENUBARBREAK", 0x20},
+                                                            {"MENUBREAK", 0x40}};
     if (peek().kind == Token::Word) {
       auto found = options.find(peek().text);
       if (found != options.end()) {
@@ -507,13 +519,12 @@ std::string emit(const Script& script) {
   out << "const DialogResource dialogs[] = {\n";
   for (const Dialog& d : script.dialogs) {
     out << "    {" << d.id << ", 0x" << std::hex << d.style << std::dec << ", " << d.x << ", "
-        << d.y << ", " << d.cx << ", " << d.cy << ", " << literal(d.caption) << ", "
-        << d.fontSize << ", " << literal(d.fontName) << ", dialog" << d.id << "Controls},\n";
+        << d.y << ", " << d.cx << ", " << d.cy << ", " << literal(d.caption) << ", " << d.fontSize
+        << ", " << literal(d.fontName) << ", dialog" << d.id << "Controls},\n";
   }
   out << "};\n\n}  // namespace\n\n"
       << "const ResourceData& moduleResources() {\n"
-      << "  static const ResourceData data{" << script.language
-      << ", menus, strings, dialogs};\n"
+      << "  static const ResourceData data{" << script.language << ", menus, strings, dialogs};\n"
       << "  return data;\n}\n\n}  // namespace quorrel::platform\n";
   return out.str();
 }

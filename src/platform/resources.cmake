@@ -1,0 +1,41 @@
+# The module's resources, from the one script resources/quorrel.rc. Included from
+# src/host/CMakeLists.txt with quorrel_module defined.
+#  - Windows: the resource compiler builds the script into the DLL.
+#  - Elsewhere: rcgen, built for this machine, turns the script into constant tables
+#    (quorrel_resource_data) that the portable menu, string and dialog services read,
+#    and the module exports those services for host programs.
+set(QUORREL_RESOURCE_SCRIPT ${CMAKE_SOURCE_DIR}/resources/quorrel.rc)
+
+if(WIN32)
+  enable_language(RC)
+  target_sources(quorrel_module PRIVATE ${QUORREL_RESOURCE_SCRIPT})
+  set_property(SOURCE ${QUORREL_RESOURCE_SCRIPT} APPEND PROPERTY OBJECT_DEPENDS
+    ${CMAKE_SOURCE_DIR}/resources/quorrel400.bmp ${CMAKE_SOURCE_DIR}/resources/quorrel401.bmp)
+  return()
+endif()
+
+add_executable(quorrel_rcgen ${CMAKE_SOURCE_DIR}/src/platform/rcgen/rcgen.cpp)
+quorrel_warnings(quorrel_rcgen)
+
+set(QUORREL_GENERATED_RESOURCES ${CMAKE_BINARY_DIR}/generated/quorrel_resources.cpp)
+add_custom_command(
+  OUTPUT ${QUORREL_GENERATED_RESOURCES}
+  COMMAND ${CMAKE_COMMAND} -E make_directory ${CMAKE_BINARY_DIR}/generated
+  COMMAND quorrel_rcgen ${QUORREL_RESOURCE_SCRIPT} ${QUORREL_GENERATED_RESOURCES}
+  DEPENDS quorrel_rcgen ${QUORREL_RESOURCE_SCRIPT}
+  COMMENT "Generating resource tables from quorrel.rc"
+  VERBATIM)
+
+add_library(quorrel_resource_data OBJECT ${QUORREL_GENERATED_RESOURCES})
+target_include_directories(quorrel_resource_data PUBLIC ${CMAKE_SOURCE_DIR}/src)
+target_link_libraries(quorrel_module PRIVATE quorrel_resource_data)
+
+# The portable services host programs call on the module's menus and dialogs.
+set(QUORREL_PLATFORM_EXPORTS
+  LoadMenuA CreatePopupMenu DestroyMenu GetSubMenu GetMenuItemCount GetMenuItemID
+  GetMenuStringA GetMenuState AppendMenuA LoadStringA LocalAlloc LocalFree
+  DialogBoxParamA EndDialog SetWindowLongA GetWindowLongA GetDlgItem SetDlgItemTextA
+  GetDlgItemTextA SetDlgItemInt GetDlgItemInt CheckDlgButton IsDlgButtonChecked
+  EnableWindow IsWindowEnabled
+  QuorrelSetDialogScript QuorrelDialogClick QuorrelDialogType QuorrelDialogKey
+  QuorrelDialogIsOpen)
