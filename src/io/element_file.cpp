@@ -1,0 +1,24 @@
+#include "io/element_file.h"
+
+namespace quorrel {
+
+void saveElementToFile(const ElementArray& array, int32_t index, const char* path, uint16_t mode) {
+  ByteBlock block;
+  if (!array.getBytes(block, index)) return;
+  FileHandle file = FileHandle::openForWriting(path, mode);
+  if (!file.isOpen()) return;
+  if (array.at(index).type() == ElementType::Value) {
+    const auto u = static_cast<uint32_t>(array.at(index).number());
+    const char le[4] = {static_cast<char>(u & 0xFF), static_cast<char>((u >> 8) & 0xFF),
+                        static_cast<char>((u >> 16) & 0xFF), static_cast<char>(u >> 24)};
+    file.writeAll(le, sizeof le);
+  } else if (block.bytes != nullptr && block.length > 0) {
+    file.writeAll(block.bytes, static_cast<std::size_t>(block.length));
+  }
+}
+
+std::optional<ByteBuffer> readWholeFile(const char* path) {
+  return readFileBytes(path, 0);
+}
+
+}  // namespace quorrel

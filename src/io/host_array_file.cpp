@@ -1,0 +1,210 @@
+#include "io/host_array_file.h"
+
+#include <algorithm>
+#include <cstring>
+#include <new>
+#include <string_view>
+
+#include "array/int32.h"
+#include "array/text.h"
+#include "io/apply.h"
+#include "io/parsing.h"
+
+namespace quorrel {
+
+namespace {
+
+using io_detail::Cursor;
+
+constexpr std::string_view kHeader{"CNC ARRAY\0", 10};
+constexpr int32_t kVersion = 2;
+constexpr int32_t kTextCells = 2;
+// Text cells without bytes cost nothing to read, so a tiny file could declare
+// billions of them; past this many the file reads no cells.
+constexpr int64_t kMaxByteless = 16777216;
+
+int32_t atLeastOne(int32_t size) {
+  return size == 0 ? 1 : size;
+}
+
+// A text cell as written: its length field and, when that is above 0, its bytes.
+struct CellText {
+  int32_t length = 0;
+  const char* bytes = nullptr;
+};
+
+// Writes the header, the sizes (0 written and counted as 1) and every cell; textOf(k)
+// gives cell k (length 0 for a cell past the elements).
+template <class TextOf>
+void writeHostFile(const char* path, uint16_t mode, int32_t x, int32_t y, int32_t z,
+                   TextOf&& textOf) {
+  FileHandle file = FileHandle::openForWriting(path, mode);
+  if (!file.isOpen()) return;
+  BufferedWriter out(file);
+  out.text(kHeader);
+  out.i32(kVersion);
+  x = atLeastOne(x);
+  y = atLeastOne(y);
+  z = atLeastOne(z);
+  out.i32(x);
+  out.i32(y);
+  out.i32(z);
+  out.i32(kTextCells);
+  for (int32_t k3 = 0; k3 < z; ++k3) {
+    for (int32_t k2 = 0; k2 < y; ++k2) {
+      const int32_t row = mulWrap(addWrap(mulWrap(y, k3), k2), x);
+      for (int32_t k1 = 0; k1 < x; ++k1) {
+        const CellText cell = textOf(addWrap(row, k1));
+        out.i32(cell.length);
+        if (cell.length > 0) out.bytes(cell.bytes, static_cast<std::size_t>(cell.length));
+      }
+    }
+  }
+}
+
+// The number of cells X x Y x Z, or -1 when a size is negative or the product does
+// not fit 32 bits.
+int64_t cellCount(int32_t x, int32_t y, int32_t z) {
+  if (x < 0 || y < 0 || z < 0) return -1;
+  int64_t count = int64_t{x} * y;
+  if (count > INT32_MAX) return -1;
+  count *= z;
+  return count > INT32_MAX ? -1 : count;
+}
+
+// Walks a host array file held in memory; false when it is not one. Cells that would
+// start at or past the end of the file are not produced.
+template <class Sink>
+bool parseHost(std::string_view file, Sink& sink) {
+  Cursor in(file);
+  if (!in.matches(kHeader)) return false;
+  const int32_t version = in.i32();
+  const int32_t x = in.i32();
+  const int32_t y = in.i32();
+  const int32_t z = in.i32();
+  const int32_t kind = in.i32();
+  sink.header(x, y, z);
+  const int64_t count = cellCount(x, y, z);
+  if (count <= 0) return true;
+  if (kind == 1 || kind == 5) {
+    for (int64_t i = 0; i < count && !in.atEnd(); ++i) sink.number(in.i32());
+  } else if ((kind == 2 || kind == 6) && version == kVersion) {
+    for (int64_t i = 0; i < count && !in.atEnd(); ++i) {
+      const int32_t n = in.i32();
+      if (n <= 0) {
+        sink.text(nullptr, n);
+      } else {
+        const std::string_view held = in.take(n);
+        sink.text(held.data(), static_cast<int32_t>(held.size()));
+      }
+    }
+  } else if ((kind == 2 || kind == 6) && count <= kMaxByteless) {
+    for (int64_t i = 0; i < count; ++i) sink.text(nullptr, 0);
+  }
+  return true;
+}
+
+struct ImageSink {
+  ArrayImage& image;
+
+  void header(int32_t x, int32_t y, int32_t z) {
+    image.boundaries[0] = x;
+    image.boundaries[1] = y;
+    image.boundaries[2] = z;
+  }
+  void number(int32_t n) {
+    ElementRecord r;
+    r.type = static_cast<uint16_t>(ElementType::Value);
+    r.size = 4;
+    r.number = n;
+    image.elements.push_back(r);
+  }
+  void text(const char* data, int32_t size) {
+    ElementRecord r;
+    r.type = static_cast<uint16_t>(ElementType::String);
+    r.size = size;
+    r.data = data;
+    image.elements.push_back(r);
+  }
+};
+
+struct LoadSink {
+  ElementArray& array;
+  bool replace;
+  bool headerSeen = false;
+
+  void header(int32_t x, int32_t y, int32_t) {
+    headerSeen = true;
+    if (!replace) return;
+    array.setDimensions(3);
+    array.setBoundary(1, x);
+    array.setBoundary(2, y);
+  }
+  void number(int32_t n) { array.insertValue(n, array.size()); }
+  void text(const char* data, int32_t size) {
+    io_detail::insertTextAt(array, data, size, array.size());
+  }
+};
+
+}  // namespace
+
+void saveHostArrayFile(ElementArray& array, const char* path, uint16_t mode) {
+  array.fileMode = static_cast<int16_t>(mode);
+  try {
+    const int32_t x = array.boundary(1);
+    const int32_t y = array.boundary(2);
+    const int32_t z = addWrap(divTrunc(array.size(), mulWrap(atLeastOne(x), atLeastOne(y))), 1);
+    NumberText scratch;
+    writeHostFile(path, mode, x, y, z, [&](int32_t k) -> CellText {
+      if (!array.inRange(k)) return {};
+      const char* text = array.at(k).asString(scratch);
+      return {static_cast<int32_t>(std::strlen(text)), text};
+    });
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+void writeHostArrayFile(const char* path, const ArrayImage& image, uint16_t fileMode) {
+  try {
+    NumberText scratch;
+    const int32_t count = image.elementCount();
+    writeHostFile(path, fileMode, image.boundaries[0], image.boundaries[1], image.boundaries[2],
+                  [&](int32_t k) -> CellText {
+                    if (k < 0 || k >= count) return {};
+                    const ElementRecord& r = image.elements[static_cast<std::size_t>(k)];
+                    if (r.type == static_cast<uint16_t>(ElementType::Value)) {
+                      return {writeDecimal(r.number, scratch.text), scratch.text};
+                    }
+                    return {r.data == nullptr ? std::min(r.size, 0) : r.size, r.data};
+                  });
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+std::optional<ArrayImage> readHostArrayFile(const char* path) {
+  try {
+    std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
+    if (!bytes) return std::nullopt;
+    ArrayImage image;
+    image.storage = std::move(*bytes);
+    ImageSink sink{image};
+    if (!parseHost(image.storage.view(), sink)) return std::nullopt;
+    return image;
+  } catch (const std::bad_alloc&) {
+    return std::nullopt;
+  }
+}
+
+void loadHostArrayFile(ElementArray& array, const char* path, int32_t append) {
+  const bool replace = append == 0;
+  try {
+    const std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
+    if (replace) array.clear();
+    LoadSink sink{array, replace};
+    if (bytes) parseHost(bytes->view(), sink);
+    if (replace && !sink.headerSeen) array.setDimensions(0);
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+}  // namespace quorrel

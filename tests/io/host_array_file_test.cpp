@@ -1,0 +1,225 @@
+#include "io/host_array_file.h"
+
+#include "io_test_support.h"
+
+namespace quorrel {
+namespace {
+
+using HostArrayFile = IoTest;
+
+const std::string kHeader("CNC ARRAY\0", 10);
+
+std::string head(int32_t version, int32_t x, int32_t y, int32_t z, int32_t kind) {
+  return kHeader + le32(version) + le32(x) + le32(y) + le32(z) + le32(kind);
+}
+
+// Three-dimensional, X 2, Y 2: the string a, the value 5, an empty string.
+const std::string kExample =
+    head(2, 2, 2, 1, 2) + le32(1) + "a" + le32(1) + "5" + le32(0) + le32(0);
+
+TEST_F(HostArrayFile, WritesTheExampleByteForByte) {
+  ASSERT_EQ(kExample.size(), 48u);
+  ElementArray a;
+  a.setDimensions(3);
+  a.setBoundary(1, 2);
+  a.setBoundary(2, 2);
+  a.appendString("a");
+  a.appendValue(5);
+  a.appendString("");
+  a.setKeyString("key", 0);
+  saveHostArrayFile(a, path("h.arr").c_str(), 0);
+  EXPECT_EQ(readBytes(path("h.arr")), kExample);
+  EXPECT_EQ(a.fileMode, 0);
+
+  // Exactly X x Y elements still get a further, empty layer.
+  a.appendFile({"bin", 3});
+  saveHostArrayFile(a, path("full.arr").c_str(), 0);
+  EXPECT_EQ(readBytes(path("full.arr")), head(2, 2, 2, 2, 2) + le32(1) + "a" + le32(1) + "5" +
+                                             le32(0) + le32(0) + le32(0) + le32(0) + le32(0) +
+                                             le32(0));
+}
+
+TEST_F(HostArrayFile, ZeroSizesCountAsOne) {
+  ElementArray a;  // one dimension: X and Y are 0
+  a.appendValue(-12);
+  a.appendString("xy");
+  saveHostArrayFile(a, path("one.arr").c_str(), 0);
+  EXPECT_EQ(readBytes(path("one.arr")),
+            head(2, 1, 1, 3, 2) + le32(3) + "-12" + le32(2) + "xy" + le32(0));
+  ElementArray empty;
+  empty.setDimensions(2);
+  empty.setBoundary(1, 3);
+  saveHostArrayFile(empty, path("empty.arr").c_str(), 1);
+  EXPECT_EQ(empty.fileMode, 1);
+  EXPECT_EQ(readBytes(path("empty.arr")), head(2, 3, 1, 1, 2) + le32(0) + le32(0) + le32(0));
+}
+
+TEST_F(HostArrayFile, LoadsTextAndNumberCells) {
+  writeBytes(path("h.arr"), kExample);
+  ElementArray a;
+  a.appendString("old");
+  a.labels = {"keep"};
+  loadHostArrayFile(a, path("h.arr").c_str(), 0);
+  ASSERT_EQ(a.size(), 4);
+  EXPECT_EQ(a.dimensions(), 3);
+  EXPECT_EQ(a.boundary(1), 2);
+  EXPECT_EQ(a.boundary(2), 2);
+  EXPECT_STREQ(a.getString(0), "a");
+  EXPECT_EQ(a.at(1).type(), ElementType::String);
+  EXPECT_STREQ(a.getString(1), "5");
+  EXPECT_EQ(a.at(2).type(), ElementType::None);
+  EXPECT_EQ(a.at(3).type(), ElementType::None);
+  EXPECT_FALSE(a.at(0).hasKey());
+  EXPECT_EQ(a.labels, std::vector<std::string>{"keep"});
+
+  writeBytes(path("n.arr"), head(2, 2, 1, 1, 1) + le32(7) + le32(0));
+  ElementArray n;
+  loadHostArrayFile(n, path("n.arr").c_str(), 0);
+  ASSERT_EQ(n.size(), 2);
+  EXPECT_EQ(n.at(0).type(), ElementType::Value);
+  EXPECT_EQ(n.getValue(0), 7);
+  EXPECT_EQ(n.at(1).type(), ElementType::None);
+  EXPECT_EQ(n.boundary(1), 2);
+  EXPECT_EQ(n.boundary(2), 1);
+
+  // Kind 5 reads numbers and kind 6 texts, like 1 and 2.
+  writeBytes(path("n5.arr"), head(2, 1, 1, 1, 5) + le32(-9));
+  ElementArray n5;
+  loadHostArrayFile(n5, path("n5.arr").c_str(), 0);
+  EXPECT_EQ(n5.getValue(0), -9);
+  writeBytes(path("t6.arr"), head(2, 1, 1, 1, 6) + le32(2) + "hi");
+  ElementArray t6;
+  loadHostArrayFile(t6, path("t6.arr").c_str(), 0);
+  EXPECT_STREQ(t6.getString(0), "hi");
+}
+
+TEST_F(HostArrayFile, OtherVersionsAndKinds) {
+  // Text cells of a version other than 2 carry no bytes.
+  writeBytes(path("v1.arr"), head(1, 2, 1, 2, 2) + le32(1) + "a");
+  ElementArray a;
+  loadHostArrayFile(a, path("v1.arr").c_str(), 0);
+  EXPECT_EQ(a.size(), 4);
+  for (int32_t i = 0; i < 4; ++i) EXPECT_EQ(a.at(i).type(), ElementType::None);
+  // An unknown kind loads nothing, yet the replacing load still clears and takes X, Y.
+  writeBytes(path("k3.arr"), head(2, 2, 1, 1, 3) + le32(1) + "a");
+  a.appendValue(1);
+  loadHostArrayFile(a, path("k3.arr").c_str(), 0);
+  EXPECT_EQ(a.size(), 0);
+  EXPECT_EQ(a.dimensions(), 3);
+  EXPECT_EQ(a.boundary(1), 2);
+}
+
+TEST_F(HostArrayFile, AppendAndFailures) {
+  writeBytes(path("h.arr"), kExample);
+  ElementArray a;
+  a.setDimensions(2);
+  a.setBoundary(1, 7);
+  a.appendValue(1);
+  loadHostArrayFile(a, path("h.arr").c_str(), 1);
+  ASSERT_EQ(a.size(), 5);
+  EXPECT_EQ(a.dimensions(), 2);
+  EXPECT_EQ(a.boundary(1), 7);
+  EXPECT_EQ(a.getValue(0), 1);
+  EXPECT_STREQ(a.getString(1), "a");
+
+  writeBytes(path("bad.arr"), std::string("CNC ARRAY!") + kExample.substr(10));
+  writeBytes(path("zero.arr"), "");
+  for (const std::string& file :
+       {path("missing.arr"), path("bad.arr"), path("zero.arr"), dir_.string()}) {
+    SCOPED_TRACE(file);
+    ElementArray b;
+    b.setDimensions(2);
+    b.appendValue(3);
+    loadHostArrayFile(b, file.c_str(), 1);
+    EXPECT_EQ(b.size(), 1);
+    EXPECT_EQ(b.dimensions(), 2);
+    loadHostArrayFile(b, file.c_str(), 0);
+    EXPECT_EQ(b.size(), 0);
+    EXPECT_EQ(b.dimensions(), 0);
+    EXPECT_FALSE(readHostArrayFile(file.c_str()).has_value());
+  }
+}
+
+TEST_F(HostArrayFile, ImageReadAndWrite) {
+  writeBytes(path("h.arr"), kExample);
+  auto image = readHostArrayFile(path("h.arr").c_str());
+  ASSERT_TRUE(image.has_value());
+  EXPECT_EQ(image->dimensions, 0);
+  EXPECT_EQ(image->boundaries[0], 2);
+  EXPECT_EQ(image->boundaries[2], 1);
+  ASSERT_EQ(image->elementCount(), 4);
+  EXPECT_EQ(image->elements[0].type, 2);
+  EXPECT_EQ(image->elements[0].size, 1);
+  writeHostArrayFile(path("copy.arr").c_str(), *image, 0);
+  EXPECT_EQ(readBytes(path("copy.arr")), kExample);
+  // Number cells are written as their decimal text.
+  writeBytes(path("n.arr"), head(2, 2, 1, 1, 1) + le32(-7) + le32(40));
+  auto numbers = readHostArrayFile(path("n.arr").c_str());
+  ASSERT_TRUE(numbers.has_value());
+  writeHostArrayFile(path("ncopy.arr").c_str(), *numbers, 0);
+  EXPECT_EQ(readBytes(path("ncopy.arr")), head(2, 2, 1, 1, 2) + le32(2) + "-7" + le32(2) + "40");
+}
+
+// Offsets of the example: version 10-13, X 14-17, Y 18-21, Z 22-25, kind 26-29; cells
+// at 30 (text at 34), 35 (text at 39), 40 and 44. A cell cut inside its text keeps
+// what the file holds; a cell starting at or past the end does not exist.
+TEST_F(HostArrayFile, TruncatedExampleLoadsWhatItHolds) {
+  for (size_t n = 0; n <= kExample.size(); ++n) {
+    SCOPED_TRACE(n);
+    writeBytes(path("t.arr"), kExample.substr(0, n));
+    ElementArray a;
+    loadHostArrayFile(a, path("t.arr").c_str(), 0);
+    EXPECT_EQ(a.dimensions(), n < 10 ? 0 : 3);
+    EXPECT_EQ(a.boundaryEntry(1), n >= 15 ? 2 : 0);
+    EXPECT_EQ(a.boundaryEntry(2), n >= 19 ? 2 : 0);
+    const int32_t cells = n < 27 ? 0 : (n > 30) + (n > 35) + (n > 40) + (n > 44);
+    ASSERT_EQ(a.size(), cells);
+    if (cells >= 1) {
+      EXPECT_STREQ(a.getString(0), n < 35 ? "" : "a");
+      EXPECT_EQ(a.at(0).type(), ElementType::String);
+    }
+    if (cells >= 2) {
+      EXPECT_STREQ(a.getString(1), n < 40 ? "" : "5");
+    }
+    if (cells >= 3) {
+      EXPECT_EQ(a.at(2).type(), ElementType::None);
+    }
+  }
+}
+
+TEST_F(HostArrayFile, HostileSizesReadNoCellsOrOnlyWhatIsThere) {
+  const std::string cells = le32(1) + "a" + le32(1) + "b";
+  const std::string noCells[] = {head(2, -1, 1, 1, 2) + cells,
+                                 head(2, 1, -5, 1, 1) + cells,
+                                 head(2, 1, 1, INT32_MIN, 2) + cells,
+                                 head(2, 65536, 65536, 1, 2) + cells,
+                                 head(2, 2, 1 << 20, 1 << 20, 1) + cells,
+                                 head(1, 4097, 4096, 1, 2),
+                                 head(2, 0, 5, 5, 2) + cells};
+  for (const std::string& bytes : noCells) {
+    writeBytes(path("x.arr"), bytes);
+    ElementArray a;
+    loadHostArrayFile(a, path("x.arr").c_str(), 0);
+    EXPECT_EQ(a.size(), 0);
+    EXPECT_EQ(a.dimensions(), 3);
+  }
+  // A huge but valid count reads only the cells the file holds.
+  writeBytes(path("n.arr"), head(2, INT32_MAX, 1, 1, 1) + le32(4) + le32(5) + "\x06");
+  ElementArray n;
+  loadHostArrayFile(n, path("n.arr").c_str(), 0);
+  ASSERT_EQ(n.size(), 3);
+  EXPECT_EQ(n.getValue(2), 6);
+  writeBytes(path("t.arr"), head(2, 3, 1, 1, 2) + le32(INT32_MAX) + "abc");
+  ElementArray t;
+  loadHostArrayFile(t, path("t.arr").c_str(), 0);
+  ASSERT_EQ(t.size(), 1);
+  EXPECT_STREQ(t.getString(0), "abc");
+  writeBytes(path("neg.arr"), head(2, 2, 1, 1, 2) + le32(-1) + le32(-1));
+  ElementArray g;
+  loadHostArrayFile(g, path("neg.arr").c_str(), 0);
+  ASSERT_EQ(g.size(), 2);
+  EXPECT_EQ(g.at(0).type(), ElementType::None);
+}
+
+}  // namespace
+}  // namespace quorrel
