@@ -1,5 +1,6 @@
 #include "query/search.h"
 
+#include <algorithm>
 #include <cstring>
 
 #include "array/text.h"
@@ -97,20 +98,105 @@ bool containsPattern(std::string_view probe, std::string_view bytes, bool caseSe
   return false;
 }
 
-bool elementContains(const ElementArray& array, const Element& element, std::string_view probe) {
-  switch (element.type()) {
-    case ElementType::String:
-    case ElementType::Value: {
-      NumberText scratch;
-      return bytesContain(array, probe, textOf(element, scratch));
-    }
-    case ElementType::File:
-      return bytesContain(array, probe,
-                          {element.bytes(), static_cast<std::size_t>(element.size())});
-    default:
-      return probe.empty();
+// Folded search for short texts: a plain pass over the offsets. For a letter, OR-ing
+// 0x20 maps exactly its two cases onto the lower one.
+bool containsFoldedShort(std::string_view probe, std::string_view bytes) {
+  const std::size_t length = probe.size();
+  if (bytes.size() < length) return false;
+  const auto* t = reinterpret_cast<const unsigned char*>(bytes.data());
+  const unsigned char first = foldByte(static_cast<unsigned char>(probe[0]));
+  const bool letter = first >= 'a' && first <= 'z';
+  const std::size_t lastOffset = bytes.size() - length;
+  for (std::size_t o = 0; o <= lastOffset; ++o) {
+    const unsigned char c = letter ? static_cast<unsigned char>(t[o] | 0x20) : t[o];
+    if (c == first && equalFolded(bytes.data() + o + 1, probe.data() + 1, length - 1)) return true;
+  }
+  return false;
+}
+
+// Folds `count` bytes; written as a plain loop the compiler can vectorise.
+void foldInto(char* out, const char* in, std::size_t count) {
+  for (std::size_t i = 0; i < count; ++i) {
+    const auto c = static_cast<unsigned char>(in[i]);
+    out[i] = static_cast<char>(static_cast<unsigned>(c - 'A') < 26u ? c + ('a' - 'A') : c);
   }
 }
+
+// One containment probe with its method chosen once for a whole scan.
+class ProbeSearch {
+ public:
+  ProbeSearch(const ElementArray& array, std::string_view probe)
+      : probe_(probe), caseSensitive_(isCaseSensitive(array)) {
+    if (isWildcardSearch(array)) {
+      method_ = Method::Pattern;
+    } else if (caseSensitive_ || !hasLetter(probe)) {
+      // The probe holds no zero byte, so a plain search never matches across one.
+      method_ = Method::Exact;
+    } else {
+      method_ = Method::Folded;
+      // Folding both sides turns the search of a long text into a plain one.
+      canFoldChunks_ = probe.size() <= kMaxFoldedProbe;
+      if (canFoldChunks_) foldInto(foldedProbe_, probe.data(), probe.size());
+    }
+  }
+
+  bool in(std::string_view bytes) const {
+    if (probe_.empty()) return true;
+    if (bytes.size() < probe_.size()) return false;
+    switch (method_) {
+      case Method::Exact:
+        return bytes.find(probe_) != std::string_view::npos;
+      case Method::Folded:
+        if (bytes.size() < kShortText) return containsFoldedShort(probe_, bytes);
+        return canFoldChunks_ ? inFoldedChunks(bytes) : containsFolded(probe_, bytes);
+      default:
+        return containsPattern(probe_, bytes, caseSensitive_);
+    }
+  }
+
+  bool inElement(const Element& element) const {
+    switch (element.type()) {
+      case ElementType::String:
+        return in({element.bytes(), static_cast<std::size_t>(element.size() - 1)});
+      case ElementType::Value: {
+        NumberText scratch;
+        return in(textOf(element, scratch));
+      }
+      case ElementType::File:
+        return in({element.bytes(), static_cast<std::size_t>(element.size())});
+      default:
+        return probe_.empty();
+    }
+  }
+
+ private:
+  // Below this length a plain pass over the offsets beats folding and memchr.
+  static constexpr std::size_t kShortText = 64;
+  static constexpr std::size_t kMaxFoldedProbe = 128;
+  static constexpr std::size_t kChunk = 512;
+  enum class Method { Exact, Folded, Pattern };
+
+  // The text is folded a chunk at a time into a stack buffer; consecutive chunks
+  // overlap by L - 1 bytes so that no span is missed.
+  bool inFoldedChunks(std::string_view bytes) const {
+    const std::size_t length = probe_.size();
+    const std::string_view folded(foldedProbe_, length);
+    char chunk[kChunk];
+    for (std::size_t pos = 0;;) {
+      const std::size_t count = std::min(kChunk, bytes.size() - pos);
+      foldInto(chunk, bytes.data() + pos, count);
+      if (std::string_view(chunk, count).find(folded) != std::string_view::npos) return true;
+      if (pos + count == bytes.size()) return false;
+      pos += count - (length - 1);
+    }
+  }
+
+  std::string_view probe_;
+  bool canFoldChunks_ = false;
+  char foldedProbe_[kMaxFoldedProbe] = {};
+  bool caseSensitive_;
+  Method method_ = Method::Exact;
+};
 
 }  // namespace
 
@@ -196,22 +282,17 @@ int32_t findValue(const ElementArray& array, int32_t number, int32_t /*ignored*/
 }
 
 bool bytesContain(const ElementArray& array, std::string_view probe, std::string_view bytes) {
-  if (probe.empty()) return true;
-  if (bytes.size() < probe.size()) return false;
-  const bool caseSensitive = isCaseSensitive(array);
-  if (isWildcardSearch(array)) return containsPattern(probe, bytes, caseSensitive);
-  // The probe holds no zero byte, so a plain search never matches across one.
-  if (caseSensitive || !hasLetter(probe)) return bytes.find(probe) != std::string_view::npos;
-  return containsFolded(probe, bytes);
+  return ProbeSearch(array, probe).in(bytes);
 }
 
 int32_t findContainingString(const ElementArray& array, const char* probe, int32_t /*ignored*/) {
   if (probe == nullptr) return -1;
   const std::string_view text(probe);
   if (text.empty()) return array.size() > 0 ? 0 : -1;
+  const ProbeSearch search(array, text);
   const auto elements = array.slots();
   for (std::size_t i = 0; i < elements.size(); ++i) {
-    if (elementContains(array, elements[i], text)) return static_cast<int32_t>(i);
+    if (search.inElement(elements[i])) return static_cast<int32_t>(i);
   }
   return -1;
 }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <functional>
 #include <new>
 #include <span>
 #include <utility>
@@ -53,29 +54,55 @@ const char* textForm(const Element& e, NumberText& scratch) {
 // not its slot: its key does not change when exchanges move it) and compares slots
 // against it.
 
-class ValueKeys {
- public:
-  ValueKeys(std::span<Element> elements, std::vector<int32_t>& values)
-      : elements_(elements), values_(values) {
-    for (std::size_t i = 0; i < elements.size(); ++i) values_[i] = elements[i].asValue();
-  }
-  void takePivot(int32_t slot) { pivot_ = values_[static_cast<std::size_t>(slot)]; }
-  int32_t compareToPivot(int32_t slot) const {
-    return threeWay(values_[static_cast<std::size_t>(slot)], pivot_);
-  }
-  void swap(int32_t i, int32_t j) {
-    std::swap(elements_[static_cast<std::size_t>(i)], elements_[static_cast<std::size_t>(j)]);
-    std::swap(values_[static_cast<std::size_t>(i)], values_[static_cast<std::size_t>(j)]);
-  }
-
- private:
-  std::span<Element> elements_;
-  std::vector<int32_t>& values_;
-  int32_t pivot_ = 0;
+// Sorting a compact table of {key, original slot} instead of the elements themselves
+// runs the very same comparisons and exchanges, and so yields the same permutation,
+// which is then applied to the slots once. Each key is read once per sort.
+template <class Key>
+struct Proxy {
+  Key key;
+  uint32_t slot;
 };
 
-// Reads each value on every comparison: used when there is no string to parse, or no
-// memory for the table of values.
+template <class Key, class Compare>
+class ProxyKeys {
+ public:
+  ProxyKeys(std::vector<Proxy<Key>>& proxies, Compare compare)
+      : proxies_(proxies), compare_(compare) {}
+  void takePivot(int32_t slot) { pivot_ = at(slot).key; }
+  int32_t compareToPivot(int32_t slot) { return compare_(at(slot).key, pivot_); }
+  void swap(int32_t i, int32_t j) { std::swap(at(i), at(j)); }
+
+ private:
+  Proxy<Key>& at(int32_t slot) { return proxies_[static_cast<std::size_t>(slot)]; }
+  std::vector<Proxy<Key>>& proxies_;
+  Compare compare_;
+  Key pivot_{};
+};
+
+// Moves the elements so that slot k receives the element that was in slot
+// proxies[k].slot, following each cycle of the permutation once.
+template <class Key>
+void applyPermutation(std::span<Element> elements, std::vector<Proxy<Key>>& proxies) {
+  const auto count = static_cast<uint32_t>(elements.size());
+  for (uint32_t start = 0; start < count; ++start) {
+    if (proxies[start].slot == start) continue;
+    Element held = std::move(elements[start]);
+    uint32_t current = start;
+    for (;;) {
+      uint32_t source = proxies[current].slot;
+      proxies[current].slot = current;  // done
+      if (source == start) {
+        elements[current] = std::move(held);
+        break;
+      }
+      elements[current] = std::move(elements[source]);
+      current = source;
+    }
+  }
+}
+
+// Reads each value on every comparison, exchanging the elements in place: the way to
+// sort when there is no memory for a table of keys (same order, only slower).
 class DirectValueKeys {
  public:
   explicit DirectValueKeys(std::span<Element> elements) : elements_(elements) {}
@@ -180,31 +207,98 @@ void runSort(Keys& keys, bool descending, int32_t lo, int32_t hi) {
   }
 }
 
-bool holdsStrings(std::span<const Element> elements) {
-  return std::any_of(elements.begin(), elements.end(),
-                     [](const Element& e) { return e.type() == ElementType::String; });
+template <class Keys>
+void runAll(Keys& keys, std::size_t count, bool descending) {
+  runSort(keys, descending, 0, static_cast<int32_t>(count) - 1);
+}
+
+bool sortValuesByTable(std::span<Element> range, bool descending) {
+  std::vector<Proxy<int32_t>> proxies;
+  try {
+    proxies.resize(range.size());
+  } catch (const std::bad_alloc&) {
+    return false;
+  }
+  for (std::size_t i = 0; i < range.size(); ++i)
+    proxies[i] = {range[i].asValue(), static_cast<uint32_t>(i)};
+  ProxyKeys keys(proxies, [](int32_t a, int32_t b) { return threeWay(a, b); });
+  runAll(keys, range.size(), descending);
+  applyPermutation(range, proxies);
+  return true;
+}
+
+// The texts of Strings are their own bytes, which do not move; numbers are written
+// once into a table of their own.
+template <bool kCaseSensitive>
+bool sortTextsByTable(std::span<Element> range, bool descending) {
+  std::vector<Proxy<const char*>> proxies;
+  std::vector<NumberText> numbers;
+  try {
+    proxies.resize(range.size());
+    const auto valueCount = std::count_if(range.begin(), range.end(), [](const Element& e) {
+      return e.type() == ElementType::Value;
+    });
+    numbers.resize(static_cast<std::size_t>(valueCount));
+  } catch (const std::bad_alloc&) {
+    return false;
+  }
+  std::size_t nextNumber = 0;
+  for (std::size_t i = 0; i < range.size(); ++i) {
+    const Element& e = range[i];
+    const char* text = "";
+    if (e.type() == ElementType::String) {
+      text = e.bytes();
+    } else if (e.type() == ElementType::Value) {
+      text = numbers[nextNumber++].text;
+      writeDecimal(e.number(), numbers[nextNumber - 1].text);
+    }
+    proxies[i] = {text, static_cast<uint32_t>(i)};
+  }
+  auto compare = [](const char* a, const char* b) {
+    return kCaseSensitive ? textops::compareExact(a, b) : textops::compareFolded(a, b);
+  };
+  ProxyKeys keys(proxies, compare);
+  runAll(keys, range.size(), descending);
+  applyPermutation(range, proxies);
+  return true;
+}
+
+// Keyless numbers (None being 0) that compare equal are equal in every respect, so
+// every correct sort leaves the same sequence; the numbers are sorted on their own
+// and written back, with no element moved.
+bool sortPlainNumbers(std::span<Element> range, bool descending) {
+  const bool plain = std::all_of(range.begin(), range.end(), [](const Element& e) {
+    return !e.hasKey() && (e.type() == ElementType::Value || e.type() == ElementType::None);
+  });
+  if (!plain) return false;
+  std::vector<int32_t> values;
+  try {
+    values.resize(range.size());
+  } catch (const std::bad_alloc&) {
+    return false;
+  }
+  for (std::size_t i = 0; i < range.size(); ++i) values[i] = range[i].number();
+  if (descending) {
+    std::sort(values.begin(), values.end(), std::greater<>());
+  } else {
+    std::sort(values.begin(), values.end());
+  }
+  for (std::size_t i = 0; i < range.size(); ++i) range[i].assign(ElementValue::ofValue(values[i]));
+  return true;
 }
 
 void sortByValue(std::span<Element> range, bool descending) {
-  const auto hi = static_cast<int32_t>(range.size()) - 1;
-  // Strings are parsed once into a table of values when memory allows; otherwise every
-  // comparison reads the value again (same order, only slower).
-  if (holdsStrings(range)) {
-    std::vector<int32_t> values;
-    bool haveTable = true;
-    try {
-      values.resize(range.size());
-    } catch (const std::bad_alloc&) {
-      haveTable = false;
-    }
-    if (haveTable) {
-      ValueKeys keys(range, values);
-      runSort(keys, descending, 0, hi);
-      return;
-    }
-  }
+  if (sortPlainNumbers(range, descending)) return;
+  if (sortValuesByTable(range, descending)) return;
   DirectValueKeys keys(range);
-  runSort(keys, descending, 0, hi);
+  runAll(keys, range.size(), descending);
+}
+
+template <bool kCaseSensitive>
+void sortByText(std::span<Element> range, bool descending) {
+  if (sortTextsByTable<kCaseSensitive>(range, descending)) return;
+  TextKeys<kCaseSensitive> keys(range);
+  runAll(keys, range.size(), descending);
 }
 
 }  // namespace
@@ -235,18 +329,15 @@ void sortElementRange(ElementArray& array, SortKind kind, int16_t descending, in
   const auto range =
       array.slots().subspan(static_cast<std::size_t>(lo), static_cast<std::size_t>(hi - lo + 1));
   const bool down = descending != 0;
-  const int32_t last = hi - lo;
   if (kind == SortByValue) {
     sortByValue(range, down);
   } else if (kind == SortByText && isCaseSensitive(array)) {
-    TextKeys<true> keys(range);
-    runSort(keys, down, 0, last);
+    sortByText<true>(range, down);
   } else if (kind == SortByText) {
-    TextKeys<false> keys(range);
-    runSort(keys, down, 0, last);
+    sortByText<false>(range, down);
   } else {
     ByteKeys keys(range);
-    runSort(keys, down, 0, last);
+    runAll(keys, range.size(), down);
   }
 }
 

@@ -176,6 +176,33 @@ TEST(FindContaining, WildcardSpansHaveTheProbeLength) {
   EXPECT_EQ(findContainingString(array, "C"), 1);
 }
 
+TEST(FindContaining, LongTextsAtEveryPlacement) {
+  // Long texts are searched in pieces; a probe may straddle any boundary.
+  for (std::size_t length : {63u, 64u, 511u, 512u, 513u, 1100u}) {
+    for (std::size_t probeLength : {1u, 3u, 128u, 129u, 300u}) {
+      if (probeLength > length) continue;
+      std::string probe;
+      for (std::size_t i = 0; i < probeLength; ++i) probe += static_cast<char>('a' + i % 3);
+      std::string upper = probe;
+      for (char& c : upper) c = static_cast<char>(c - 'a' + 'A');
+      for (std::size_t at :
+           {std::size_t{0}, length / 2, std::size_t{509}, std::size_t{510}, length - probeLength}) {
+        if (at + probeLength > length) continue;
+        std::string text(length, 'x');
+        text.replace(at, probeLength, upper);
+        ElementArray array;
+        array.appendString(text.c_str());
+        ASSERT_EQ(findContainingString(array, probe.c_str()), 0)
+            << length << " " << probeLength << " " << at;
+        text[at + probeLength - 1] = 'y';
+        array.setString(text.c_str(), 0);
+        ASSERT_EQ(findContainingString(array, probe.c_str()), -1)
+            << length << " " << probeLength << " " << at;
+      }
+    }
+  }
+}
+
 // The scans against the comparison operations applied offset by offset.
 TEST(FindContaining, AgreesWithSpanComparisonAtEveryOffset) {
   std::mt19937 rng(777);
