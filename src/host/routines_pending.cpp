@@ -5,37 +5,13 @@
 
 namespace quorrel::host::act {
 
-QUORREL_ACTION_ROUTINE(saveAsHostArray) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
 QUORREL_ACTION_ROUTINE(saveToCsvFile) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(loadFromHostArray) {
   return runAction(runRecord, [](ElementArray&) {});
 }
 QUORREL_ACTION_ROUTINE(loadFromCsvFile) {
   return runAction(runRecord, [](ElementArray&) {});
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromHostArray) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
 QUORREL_ACTION_ROUTINE(appendElementsFromCsvFile) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(saveElementToFile) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(appendElementToFile) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(setFileAt) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(insertFileAt) {
-  return runAction(runRecord, [](ElementArray&) {});
-}
-QUORREL_ACTION_ROUTINE(appendFile) {
   return runAction(runRecord, [](ElementArray&) {});
 }
 QUORREL_ACTION_ROUTINE(saveToIniFile) {
