@@ -9,6 +9,7 @@
 #include <string_view>
 
 #include "array/element_array.h"
+#include "recordset/table.h"
 
 namespace quorrel::io_detail {
 
@@ -52,18 +53,13 @@ inline void setKeyTextAt(ElementArray& array, const char* data, int32_t held, in
   array.setKeyString(copy.c_str(), index);
 }
 
-// A column label as the recordset stores it: only in a two-dimensional array, the
-// list following the current column count, an empty entry meaning no label. A column
-// count past kMaxLabelColumns (only a damaged file sets one) leaves the labels alone
-// rather than allocating a list of that length.
+// setLabel, except that a column count past kMaxLabelColumns (only a damaged file sets
+// one) leaves the labels alone rather than growing the list to that length.
 inline constexpr int32_t kMaxLabelColumns = 1 << 20;
 
 inline void applyLabel(ElementArray& array, const std::string& text, int32_t column) {
-  if (array.dimensions() != 2) return;
-  const int32_t columns = std::max(array.boundary(1), 0);
-  if (columns > kMaxLabelColumns) return;
-  array.labels.resize(static_cast<std::size_t>(columns));
-  if (column >= 0 && column < columns) array.labels[static_cast<std::size_t>(column)] = text;
+  if (array.dimensions() == 2 && array.boundary(1) > kMaxLabelColumns) return;
+  setLabel(array, text.c_str(), column);
 }
 
 }  // namespace quorrel::io_detail

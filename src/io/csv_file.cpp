@@ -1,0 +1,141 @@
+#include "io/csv_file.h"
+
+#include <cstring>
+#include <new>
+#include <string_view>
+
+#include "io/parsing.h"
+
+namespace quorrel {
+
+namespace {
+
+constexpr std::string_view kEmptyCell = "\"\"";
+constexpr std::string_view kLineEnd = "\r\n";
+
+void writeCell(BufferedWriter& out, int32_t column, const char* text) {
+  if (column > 0) out.text(",");
+  if (text != nullptr && text[0] != '\0') {
+    out.text(text);
+  } else {
+    out.text(kEmptyCell);
+  }
+}
+
+int32_t cellsOfLine(const char* line, std::size_t length) {
+  int32_t cells = 1;
+  for (std::size_t i = 0; i < length; ++i) cells += line[i] == ',' ? 1 : 0;
+  return cells;
+}
+
+// Cuts the line's cells in place (its end must be writable) and hands each to visit;
+// a cell of exactly two double quotes is an empty text.
+template <class Visit>
+void forEachCell(char* line, std::size_t length, Visit&& visit) {
+  line[length] = '\0';
+  char* cell = line;
+  for (std::size_t i = 0; i <= length; ++i) {
+    if (line[i] != ',' && line[i] != '\0') continue;
+    line[i] = '\0';
+    if (std::string_view(cell) == kEmptyCell) cell[0] = '\0';
+    visit(cell);
+    cell = line + i + 1;
+  }
+}
+
+}  // namespace
+
+std::optional<ByteBuffer> readTextFile(const char* path) {
+  std::optional<ByteBuffer> text = readFileBytes(path, 1);
+  if (!text) return std::nullopt;
+  if (!text->reserve(text->size() + 1)) return ByteBuffer();
+  text->data()[text->size()] = '\0';
+  text->setSize(std::strlen(text->data()));
+  return text;
+}
+
+void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
+  array.fileMode = static_cast<int16_t>(mode);
+  try {
+    FileHandle file = FileHandle::openForWriting(path, mode);
+    if (!file.isOpen()) return;
+    const int64_t size = array.size();
+    int64_t columns = size;
+    int64_t rows = 1;
+    if (array.dimensions() > 1 && array.boundary(1) >= 1) {
+      columns = array.boundary(1);
+      rows = (size + columns - 1) / columns;
+    }
+    BufferedWriter out(file);
+    for (int64_t r = 0; r < rows; ++r) {
+      for (int64_t j = 0; j < columns; ++j) {
+        const int64_t index = r * columns + j;
+        writeCell(out, static_cast<int32_t>(j),
+                  index < size ? array.getString(static_cast<int32_t>(index)) : nullptr);
+      }
+      out.text(kLineEnd);
+    }
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+void writeCsvFile(const char* path, const CsvTable& table, uint16_t fileMode) {
+  try {
+    FileHandle file = FileHandle::openForWriting(path, fileMode);
+    if (!file.isOpen()) return;
+    BufferedWriter out(file);
+    for (const CsvRow& row : table.rows) {
+      for (int32_t j = 0; j < row.cellCount(); ++j) {
+        writeCell(out, j, row.cells[static_cast<std::size_t>(j)]);
+      }
+      out.text(kLineEnd);
+    }
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+std::optional<CsvTable> readCsvFile(const char* path) {
+  try {
+    std::optional<ByteBuffer> text = readTextFile(path);
+    if (!text) return std::nullopt;
+    CsvTable table;
+    table.text = std::move(*text);
+    io_detail::forEachLine(table.text.data(), table.text.size(), [&](char* line, size_t length) {
+      CsvRow& row = table.rows.emplace_back();
+      forEachCell(line, length, [&](const char* cell) { row.cells.push_back(cell); });
+    });
+    return table;
+  } catch (const std::bad_alloc&) {
+    return std::nullopt;
+  }
+}
+
+void loadCsvFile(ElementArray& array, const char* path, int32_t append) {
+  try {
+    std::optional<ByteBuffer> text = readTextFile(path);
+    if (append == 0) array.clear();
+    char* data = text ? text->data() : nullptr;
+    const std::size_t size = text ? text->size() : 0;
+    int32_t columns = 0;
+    io_detail::forEachLine(data, size, [&](char* line, size_t length) {
+      columns = std::max(columns, cellsOfLine(line, length));
+    });
+    array.setDimensions(2);
+    array.setBoundary(1, columns);
+    // Past the array's size limit appends change nothing, so the walk stops there.
+    io_detail::forEachLine(data, size, [&](char* line, size_t length) {
+      if (array.size() >= ElementArray::kMaxSize) return;
+      int32_t cells = 0;
+      forEachCell(line, length, [&](const char* cell) {
+        array.appendString(cell);
+        ++cells;
+      });
+      for (; cells < columns && array.size() < ElementArray::kMaxSize; ++cells) {
+        array.appendString("");
+      }
+    });
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+}  // namespace quorrel

@@ -1,0 +1,143 @@
+#include "io/ini_file.h"
+
+#include <cstring>
+#include <new>
+#include <string_view>
+
+#include "io/csv_file.h"
+#include "io/parsing.h"
+
+namespace quorrel {
+
+namespace {
+
+constexpr const char* kSectionName = "ZUBArray";
+constexpr std::string_view kLineEnd = "\r\n";
+
+void writeSectionLine(BufferedWriter& out, const char* name) {
+  out.text("[");
+  if (name != nullptr) out.text(name);
+  out.text("]\r\n");
+}
+
+void writeEntry(BufferedWriter& out, const char* key, const char* value) {
+  if (key != nullptr) out.text(key);
+  out.text("=");
+  if (value != nullptr) out.text(value);
+  out.text(kLineEnd);
+}
+
+// Walks the lines of an INI text, cutting names, keys and values in place, and hands
+// sections and entries to the sink. Lines of 0 or 1 characters, "//" comments (after
+// leading blanks) and entry lines before the first section are skipped.
+template <class Sink>
+void parseIni(char* text, std::size_t size, Sink& sink) {
+  bool inSection = false;
+  io_detail::forEachLine(text, size, [&](char* line, std::size_t length) {
+    if (length <= 1) return;
+    char* const end = line + length;
+    char* p = line;
+    while (p < end && (*p == ' ' || *p == '\t')) ++p;
+    if (p < end && *p == '[') {
+      if (p + 1 >= end ||
+          std::memchr(p + 1, ']', static_cast<std::size_t>(end - p - 1)) == nullptr) {
+        return;
+      }
+      // The name runs to the end of the line less its last character (the "]" of a
+      // written section line).
+      end[-1] = '\0';
+      sink.section(p + 1);
+      inSection = true;
+      return;
+    }
+    if (end - p >= 2 && p[0] == '/' && p[1] == '/') return;
+    if (!inSection) return;
+    *end = '\0';
+    char* equals = static_cast<char*>(std::memchr(p, '=', static_cast<std::size_t>(end - p)));
+    if (equals == nullptr) {
+      sink.entry(p, nullptr);
+      return;
+    }
+    *equals = '\0';
+    sink.entry(p, equals + 1);
+  });
+}
+
+struct DocumentSink {
+  IniDocument& document;
+  void section(const char* name) { document.sections.push_back({name, {}}); }
+  void entry(const char* key, const char* value) {
+    document.sections.back().entries.push_back({key, value});
+  }
+};
+
+struct LoadSink {
+  ElementArray& array;
+  void section(const char*) {}
+  void entry(const char* key, const char* value) {
+    const int32_t index = array.size();
+    array.appendString(value);
+    array.setKeyString(key, index);
+  }
+};
+
+}  // namespace
+
+void saveIniFile(ElementArray& array, const char* path, uint16_t mode) {
+  array.fileMode = static_cast<int16_t>(mode);
+  try {
+    FileHandle file = FileHandle::openForWriting(path, mode);
+    if (!file.isOpen()) return;
+    BufferedWriter out(file);
+    writeSectionLine(out, kSectionName);
+    NumberText keyScratch;
+    NumberText valueScratch;
+    for (const Element& e : array.slots()) {
+      const char* key = e.hasKey() ? e.key()->asString(keyScratch) : nullptr;
+      writeEntry(out, key, e.asString(valueScratch));
+    }
+    out.text(kLineEnd);
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+void writeIniFile(const char* path, const IniDocument& document, uint16_t fileMode) {
+  try {
+    FileHandle file = FileHandle::openForWriting(path, fileMode);
+    if (!file.isOpen()) return;
+    BufferedWriter out(file);
+    for (const IniSection& section : document.sections) {
+      writeSectionLine(out, section.name);
+      for (const IniEntry& entry : section.entries) writeEntry(out, entry.key, entry.value);
+      out.text(kLineEnd);
+    }
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+std::optional<IniDocument> readIniFile(const char* path) {
+  try {
+    std::optional<ByteBuffer> text = readTextFile(path);
+    if (!text) return std::nullopt;
+    IniDocument document;
+    document.text = std::move(*text);
+    DocumentSink sink{document};
+    parseIni(document.text.data(), document.text.size(), sink);
+    return document;
+  } catch (const std::bad_alloc&) {
+    return std::nullopt;
+  }
+}
+
+void loadIniFile(ElementArray& array, const char* path, int32_t append) {
+  try {
+    std::optional<ByteBuffer> text = readTextFile(path);
+    if (append == 0) array.clear();
+    if (!text) return;
+    LoadSink sink{array};
+    parseIni(text->data(), text->size(), sink);
+  } catch (const std::bad_alloc&) {
+  }
+}
+
+}  // namespace quorrel

@@ -1,0 +1,147 @@
+#include "io/ini_file.h"
+
+#include "io_test_support.h"
+
+namespace quorrel {
+namespace {
+
+using IniFile = IoTest;
+
+struct Entry {
+  ElementType type;
+  std::string value;
+  std::string key;
+  bool operator==(const Entry&) const = default;
+};
+
+std::vector<Entry> entriesOf(ElementArray& a) {
+  std::vector<Entry> out;
+  for (int32_t i = 0; i < a.size(); ++i) {
+    EXPECT_TRUE(a.at(i).hasKey());
+    EXPECT_EQ(a.at(i).key()->type(), ElementType::String);
+    out.push_back({a.at(i).type(), a.getString(i), a.getKeyString(i)});
+  }
+  return out;
+}
+
+constexpr ElementType S = ElementType::String;
+constexpr ElementType N = ElementType::None;
+
+TEST_F(IniFile, SavesOneSectionWithALinePerElement) {
+  ElementArray a;
+  a.appendString("a");
+  a.setKeyString("k1", 0);
+  a.appendValue(5);
+  saveIniFile(a, path("s.ini").c_str(), 0);
+  EXPECT_EQ(readBytes(path("s.ini")), "[ZUBArray]\r\nk1=a\r\n=5\r\n\r\n");
+
+  ElementArray b;
+  b.setDimensions(2);
+  b.setBoundary(1, 3);
+  b.labels = {"l"};
+  b.appendValue(1);
+  loadIniFile(b, path("s.ini").c_str(), 0);
+  EXPECT_EQ(entriesOf(b), (std::vector<Entry>{{S, "a", "k1"}, {S, "5", ""}}));
+  EXPECT_EQ(b.dimensions(), 2);
+  EXPECT_EQ(b.boundary(1), 3);
+  EXPECT_EQ(b.labels, std::vector<std::string>{"l"});
+
+  ElementArray empty;
+  saveIniFile(empty, path("e.ini").c_str(), 1);
+  EXPECT_EQ(empty.fileMode, 1);
+  EXPECT_EQ(readBytes(path("e.ini")), "[ZUBArray]\r\n\r\n");
+}
+
+TEST_F(IniFile, KeysOfEveryTypeAndEqualsSignsInKeys) {
+  ElementArray a;
+  a.appendString("x");
+  a.setKeyString("a=b", 0);
+  a.appendFile({"bin", 3});
+  a.setKeyValue(-4, 1);
+  a.appendString("");
+  a.setKeyFile({"f", 1}, 2);
+  a.appendValue(0);
+  a.setKeyString(" sp ", 3);
+  saveIniFile(a, path("k.ini").c_str(), 0);
+  EXPECT_EQ(readBytes(path("k.ini")), "[ZUBArray]\r\na=b=x\r\n-4=\r\n=\r\n sp =\r\n\r\n");
+  // The line "=" is a single character and so is skipped by the reader.
+  ElementArray b;
+  loadIniFile(b, path("k.ini").c_str(), 0);
+  EXPECT_EQ(entriesOf(b), (std::vector<Entry>{{S, "b=x", "a"}, {S, "", "-4"}, {S, "", "sp "}}));
+}
+
+TEST_F(IniFile, ReaderRules) {
+  const std::string text =
+      "before=ignored\r\n"
+      "[first]\r\n"
+      "x=\r\n"
+      "flag\r\n"
+      "// comment=1\r\n"
+      "  \t// indented comment\r\n"
+      "y\r\n"
+      "\t  key = value \r\n"
+      "[bad\r\n"
+      "[a] word\r\n"
+      "z=1\r\n";
+  writeBytes(path("r.ini"), text);
+  auto doc = readIniFile(path("r.ini").c_str());
+  ASSERT_TRUE(doc.has_value());
+  ASSERT_EQ(doc->sectionCount(), 2);
+  EXPECT_STREQ(doc->sections[0].name, "first");
+  EXPECT_STREQ(doc->sections[1].name, "a] wor");
+  ASSERT_EQ(doc->sections[0].entryCount(), 3);
+  EXPECT_STREQ(doc->sections[0].entries[1].key, "flag");
+  EXPECT_EQ(doc->sections[0].entries[1].value, nullptr);
+
+  ElementArray a;
+  loadIniFile(a, path("r.ini").c_str(), 0);
+  EXPECT_EQ(
+      entriesOf(a),
+      (std::vector<Entry>{{S, "", "x"}, {N, "", "flag"}, {S, " value ", "key "}, {S, "1", "z"}}));
+}
+
+TEST_F(IniFile, AnyLineBreakSeparates) {
+  for (const std::string& text :
+       std::vector<std::string>{"[s]\r\na=1\r\nb=2\r\n", "[s]\na=1\nb=2", "[s]\ra=1\rb=2\r",
+                                "\n\n[s]\n\n\na=1\r\r\nb=2\n"}) {
+    SCOPED_TRACE(text);
+    writeBytes(path("l.ini"), text);
+    ElementArray a;
+    loadIniFile(a, path("l.ini").c_str(), 0);
+    EXPECT_EQ(entriesOf(a), (std::vector<Entry>{{S, "1", "a"}, {S, "2", "b"}}));
+  }
+}
+
+TEST_F(IniFile, AppendAndFailedOpens) {
+  writeBytes(path("a.ini"), "[s]\r\nk=v\r\n[t]\r\nm=n\r\n");
+  ElementArray a;
+  a.appendValue(3);
+  loadIniFile(a, path("a.ini").c_str(), 1);
+  ASSERT_EQ(a.size(), 3);
+  EXPECT_EQ(a.getValue(0), 3);
+  EXPECT_STREQ(a.getString(1), "v");
+  EXPECT_STREQ(a.getKeyString(2), "m");
+
+  for (const std::string& file : {path("missing.ini"), dir_.string()}) {
+    ElementArray b;
+    b.setDimensions(2);
+    b.appendValue(1);
+    loadIniFile(b, file.c_str(), 1);
+    EXPECT_EQ(b.size(), 1);
+    loadIniFile(b, file.c_str(), 0);
+    EXPECT_EQ(b.size(), 0);
+    EXPECT_EQ(b.dimensions(), 2);
+    EXPECT_FALSE(readIniFile(file.c_str()).has_value());
+  }
+}
+
+TEST_F(IniFile, DocumentWrite) {
+  IniDocument doc;
+  doc.sections.push_back({"one", {{"k", "v"}, {nullptr, "nokey"}, {"novalue", nullptr}}});
+  doc.sections.push_back({"two", {}});
+  writeIniFile(path("d.ini").c_str(), doc, 0);
+  EXPECT_EQ(readBytes(path("d.ini")), "[one]\r\nk=v\r\n=nokey\r\nnovalue=\r\n\r\n[two]\r\n\r\n");
+}
+
+}  // namespace
+}  // namespace quorrel
