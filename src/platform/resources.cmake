@@ -1,17 +1,13 @@
 # The module's resources, from the one script resources/quorrel.rc. Included from
 # src/host/CMakeLists.txt with quorrel_module defined.
-#  - Windows: the resource compiler builds the script into the DLL.
+#  - Windows: the resource compiler builds the script into the DLL (WindowsDll.cmake).
 #  - Elsewhere: rcgen, built for this machine, turns the script into constant tables
 #    (quorrel_resource_data) that the portable menu, string and dialog services read,
 #    and the module exports those services for host programs.
 set(QUORREL_RESOURCE_SCRIPT ${CMAKE_SOURCE_DIR}/resources/quorrel.rc)
 
 if(WIN32)
-  enable_language(RC)
-  target_sources(quorrel_module PRIVATE ${QUORREL_RESOURCE_SCRIPT})
-  set_property(SOURCE ${QUORREL_RESOURCE_SCRIPT} APPEND PROPERTY OBJECT_DEPENDS
-    ${CMAKE_SOURCE_DIR}/resources/quorrel400.bmp ${CMAKE_SOURCE_DIR}/resources/quorrel401.bmp)
-  return()
+  return()  # cmake/WindowsDll.cmake hands the script to the resource compiler
 endif()
 
 add_executable(quorrel_rcgen ${CMAKE_SOURCE_DIR}/src/platform/rcgen/rcgen.cpp)
