@@ -32,7 +32,7 @@ if(NOT WIN32 AND NOT APPLE)
   target_link_options(quorrel_module PRIVATE "LINKER:--version-script=${quorrel_version_script}")
   set_property(TARGET quorrel_module APPEND PROPERTY LINK_DEPENDS ${quorrel_version_script})
   # A routine that is declared but never defined must fail the build, not the host.
-  if(NOT QUORREL_SANITIZE)
+  if(NOT QUORREL_SANITIZE AND NOT QUORREL_BUILD_FUZZ)
     target_link_options(quorrel_module PRIVATE "LINKER:--no-undefined")
   endif()
 endif()
