@@ -10,6 +10,7 @@
 
 #include "array/text.h"
 #include "query/compare.h"
+#include "query/sort_detail.h"
 #include "query/text_ops.h"
 
 namespace quorrel {
@@ -287,16 +288,16 @@ bool sortPlainNumbers(std::span<Element> range, bool descending) {
   return true;
 }
 
-void sortByValue(std::span<Element> range, bool descending) {
-  if (sortPlainNumbers(range, descending)) return;
-  if (sortValuesByTable(range, descending)) return;
+void sortByValue(std::span<Element> range, bool descending, bool allowTables) {
+  if (allowTables && sortPlainNumbers(range, descending)) return;
+  if (allowTables && sortValuesByTable(range, descending)) return;
   DirectValueKeys keys(range);
   runAll(keys, range.size(), descending);
 }
 
 template <bool kCaseSensitive>
-void sortByText(std::span<Element> range, bool descending) {
-  if (sortTextsByTable<kCaseSensitive>(range, descending)) return;
+void sortByText(std::span<Element> range, bool descending, bool allowTables) {
+  if (allowTables && sortTextsByTable<kCaseSensitive>(range, descending)) return;
   TextKeys<kCaseSensitive> keys(range);
   runAll(keys, range.size(), descending);
 }
@@ -323,6 +324,17 @@ void swapElements(ElementArray& array, int32_t i, int32_t j) {
 
 void sortElementRange(ElementArray& array, SortKind kind, int16_t descending, int32_t lo,
                       int32_t hi) {
+  sortdetail::sortRange(array, kind, descending, lo, hi, true);
+}
+
+void sortElements(ElementArray& array, SortKind kind, int16_t descending) {
+  sortElementRange(array, kind, descending, 0, array.size() - 1);
+}
+
+namespace sortdetail {
+
+void sortRange(ElementArray& array, SortKind kind, int16_t descending, int32_t lo, int32_t hi,
+               bool allowTables) {
   lo = std::max(lo, 0);
   hi = std::min(hi, array.size() - 1);
   if (hi <= lo) return;
@@ -330,19 +342,17 @@ void sortElementRange(ElementArray& array, SortKind kind, int16_t descending, in
       array.slots().subspan(static_cast<std::size_t>(lo), static_cast<std::size_t>(hi - lo + 1));
   const bool down = descending != 0;
   if (kind == SortByValue) {
-    sortByValue(range, down);
+    sortByValue(range, down, allowTables);
   } else if (kind == SortByText && isCaseSensitive(array)) {
-    sortByText<true>(range, down);
+    sortByText<true>(range, down, allowTables);
   } else if (kind == SortByText) {
-    sortByText<false>(range, down);
+    sortByText<false>(range, down, allowTables);
   } else {
     ByteKeys keys(range);
     runAll(keys, range.size(), down);
   }
 }
 
-void sortElements(ElementArray& array, SortKind kind, int16_t descending) {
-  sortElementRange(array, kind, descending, 0, array.size() - 1);
-}
+}  // namespace sortdetail
 
 }  // namespace quorrel

@@ -2,12 +2,14 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <random>
 #include <string>
 #include <utility>
 #include <vector>
 
 #include "query/compare.h"
+#include "query/sort_detail.h"
 
 namespace quorrel {
 namespace {
@@ -213,7 +215,7 @@ void fillRandom(ElementArray& array, std::mt19937& rng, int count) {
   }
 }
 
-void checkAgainstReference(std::mt19937& rng, int count, int round) {
+void checkAgainstReference(std::mt19937& rng, int count, int round, bool allowTables = true) {
   ElementArray original;
   original.caseMode = static_cast<int16_t>(round % 2);
   fillRandom(original, rng, count);
@@ -234,7 +236,8 @@ void checkAgainstReference(std::mt19937& rng, int count, int round) {
     sorted.insertElement(v, sorted.size());
     sorted.setKeyValue(i + 1, i);
   }
-  sortElements(sorted, kind, static_cast<int16_t>(descending));
+  sortdetail::sortRange(sorted, kind, static_cast<int16_t>(descending), 0, sorted.size() - 1,
+                        allowTables);
   ASSERT_EQ(keyIds(sorted), expected)
       << "kind " << kind << " descending " << descending << " case " << original.caseMode;
 }
@@ -245,6 +248,41 @@ TEST(SortElements, MatchesTheSpecifiedStepsOnRandomInputsWithTies) {
     checkAgainstReference(rng, static_cast<int>(rng() % 14), round);
   }
   for (int round = 0; round < 24; ++round) checkAgainstReference(rng, 3000, round);
+}
+
+TEST(SortElements, InPlaceMethodGivesTheSameOrder) {
+  std::mt19937 rng(99);
+  for (int round = 0; round < 3000; ++round) {
+    checkAgainstReference(rng, static_cast<int>(rng() % 14), round, false);
+  }
+  for (int round = 0; round < 12; ++round) checkAgainstReference(rng, 2000, round, false);
+}
+
+// Keyless numbers: only the sequence of values is observable.
+TEST(SortElements, KeylessNumbersMatchTheSpecifiedSteps) {
+  std::mt19937 rng(5);
+  for (int round = 0; round < 2000; ++round) {
+    const int count = static_cast<int>(rng() % 40);
+    const bool descending = round % 2 != 0;
+    ElementArray array;
+    for (int i = 0; i < count; ++i) {
+      const int32_t small = static_cast<int32_t>(rng() % 7) - 3;
+      array.appendValue(rng() % 9 == 0 ? INT32_MIN : small);
+    }
+    std::vector<int32_t> ids(static_cast<std::size_t>(count));
+    for (int i = 0; i < count; ++i) ids[static_cast<std::size_t>(i)] = i;
+    referenceSort(array, ids, SortByValue, descending, 0, count - 1);
+    std::vector<int32_t> expected;
+    for (int32_t id : ids) expected.push_back(array.getValue(id));
+    sortElements(array, SortByValue, static_cast<int16_t>(descending));
+    std::vector<int32_t> actual;
+    for (int32_t i = 0; i < array.size(); ++i) actual.push_back(array.getValue(i));
+    ASSERT_EQ(actual, expected);
+    for (int32_t i = 0; i < array.size(); ++i) {
+      ASSERT_EQ(array.at(i).type(),
+                array.getValue(i) == 0 ? ElementType::None : ElementType::Value);
+    }
+  }
 }
 
 }  // namespace
