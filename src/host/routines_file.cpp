@@ -4,8 +4,10 @@
 
 #include "host/routine_support.h"
 #include "host/routines.h"
+#include "io/csv_file.h"
 #include "io/element_file.h"
 #include "io/host_array_file.h"
+#include "io/ini_file.h"
 #include "io/native_file.h"
 
 namespace quorrel::host {
@@ -43,6 +45,25 @@ QUORREL_ACTION_ROUTINE(loadFromHostArray) {
 }
 QUORREL_ACTION_ROUTINE(appendElementsFromHostArray) {
   return runAction(runRecord, [&](ElementArray& a) { loadHostArrayFile(a, textParam(param1), 1); });
+}
+
+QUORREL_ACTION_ROUTINE(saveToCsvFile) {
+  return runAction(runRecord, [&](ElementArray& a) { saveCsvFile(a, textParam(param1), 0); });
+}
+QUORREL_ACTION_ROUTINE(loadFromCsvFile) {
+  return runAction(runRecord, [&](ElementArray& a) { loadCsvFile(a, textParam(param1), 0); });
+}
+QUORREL_ACTION_ROUTINE(appendElementsFromCsvFile) {
+  return runAction(runRecord, [&](ElementArray& a) { loadCsvFile(a, textParam(param1), 1); });
+}
+QUORREL_ACTION_ROUTINE(saveToIniFile) {
+  return runAction(runRecord, [&](ElementArray& a) { saveIniFile(a, textParam(param1), 0); });
+}
+QUORREL_ACTION_ROUTINE(loadFromIniFile) {
+  return runAction(runRecord, [&](ElementArray& a) { loadIniFile(a, textParam(param1), 0); });
+}
+QUORREL_ACTION_ROUTINE(appendElementsFromIniFile) {
+  return runAction(runRecord, [&](ElementArray& a) { loadIniFile(a, textParam(param1), 1); });
 }
 
 // Element files: index first, path second; a new file (0) or appended to (1).

@@ -88,5 +88,51 @@ TEST(FileRoutinesTest, HostArrayFileSavesLoadsAndAppends) {
   std::remove(path.c_str());
 }
 
+TEST(FileRoutinesTest, CsvFileSavesLoadsAndAppends) {
+  const std::string path = tempPath("table.csv");
+  Instance t(SetupRecord().set(kSetupXBoundary, 2));
+  t.action(8, "name");
+  t.action(8, "age");
+  t.action(9, 7);
+  t.action(2, path);  // Save to CSV file
+  EXPECT_EQ(readFile(path), "name,age\r\n7,\"\"\r\n");
+
+  Instance loaded(SetupRecord().set(kSetupDimensionCount, 1));
+  loaded.action(8, "old");
+  loaded.action(5, path);  // Load from CSV file: replaces, takes the table's shape
+  EXPECT_EQ(loaded.number(0), 4);
+  EXPECT_EQ(loaded.number(26), 2);
+  EXPECT_EQ(loaded.number(28), 2);
+  EXPECT_EQ(loaded.text(2, {2}), "7");
+  EXPECT_EQ(loaded.text(2, {3}), "");
+  loaded.action(12, path);  // Append elements from CSV file
+  EXPECT_EQ(loaded.number(0), 8);
+  EXPECT_EQ(loaded.text(2, {4}), "name");
+  std::remove(path.c_str());
+}
+
+TEST(FileRoutinesTest, IniFileSavesLoadsAndAppends) {
+  const std::string path = tempPath("elements.ini");
+  Instance t(SetupRecord().set(kSetupDimensionCount, 1));
+  t.action(8, "a");
+  t.action(20, "k1", 0);
+  t.action(9, 5);
+  t.action(58, path);  // Save to INI file
+  EXPECT_EQ(readFile(path), "[ZUBArray]\r\nk1=a\r\n=5\r\n\r\n");
+
+  Instance loaded(SetupRecord().set(kSetupDimensionCount, 1));
+  loaded.action(8, "old");
+  loaded.action(59, path);  // Load from INI file: replaces
+  EXPECT_EQ(loaded.number(0), 2);
+  EXPECT_EQ(loaded.text(2, {0}), "a");
+  EXPECT_EQ(loaded.text(4, {0}), "k1");
+  EXPECT_EQ(loaded.text(2, {1}), "5");
+  EXPECT_EQ(loaded.text(4, {1}), "");  // an empty String key
+  loaded.action(60, path);             // Append elements from INI file
+  EXPECT_EQ(loaded.number(0), 4);
+  EXPECT_EQ(loaded.number(6, {"k1"}), 0);
+  std::remove(path.c_str());
+}
+
 }  // namespace
 }  // namespace testhost
