@@ -76,6 +76,7 @@ int32_t compareTextPrefix(const ElementArray& array, const char* a, const char* 
 }
 
 bool wildcardMatch(const char* pattern, const char* text, bool caseSensitive) {
+  if (pattern == nullptr || text == nullptr) return false;  // matchPattern orders these
   return textops::matchViews(pattern, text, caseSensitive);
 }
 
