@@ -111,6 +111,7 @@ void printRows(const std::vector<std::vector<std::string>>& rows, std::ostream& 
       line += ' ' + row[c];
       if (c + 1 < row.size()) line += std::string(widths[c] - row[c].size(), ' ');
     }
+    line.erase(line.find_last_not_of(' ') + 1);
     out << line << '\n';
   }
 }

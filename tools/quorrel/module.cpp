@@ -145,8 +145,55 @@ std::string Module::expressionTitle(int32_t code) const {
   return buffer;
 }
 
-void Module::printMenu(std::string_view, std::string&) const {
-  throw ModuleError("menus are not available yet");
+// The platform menu services the module exports for its hosts (on Windows these
+// are the system's own).
+namespace menus {
+using Menu = void*;
+using ItemCountFn = int (*)(Menu);
+using ItemIdFn = unsigned (*)(Menu, int);
+using ItemTextFn = int (*)(Menu, unsigned, char*, int, unsigned);
+using SubMenuFn = Menu (*)(Menu, int);
+using DestroyFn = int (*)(Menu);
+constexpr unsigned kByPosition = 0x400;
+
+struct Services {
+  ItemCountFn count;
+  ItemIdFn id;
+  ItemTextFn text;
+  SubMenuFn subMenu;
+};
+
+void walk(const Services& services, Menu menu, int depth, std::string& out) {
+  const int count = services.count(menu);
+  for (int position = 0; position < count; ++position) {
+    out.append(2 * depth, ' ');
+    char text[256] = {};
+    services.text(menu, static_cast<unsigned>(position), text, sizeof text, kByPosition);
+    if (Menu sub = services.subMenu(menu, position)) {
+      out += quoteText(text) + '\n';
+      walk(services, sub, depth + 1, out);
+    } else if (const unsigned id = services.id(menu, position); id == 0) {
+      out += "-\n";
+    } else {
+      out += std::to_string(id) + ' ' + quoteText(text) + '\n';
+    }
+  }
+}
+}  // namespace menus
+
+void Module::printMenu(std::string_view which, std::string& out) const {
+  const char* entry = which == "actions"       ? "GetActionMenu"
+                      : which == "expressions" ? "GetExpressionMenu"
+                                               : "GetConditionMenu";
+  void* menu = required<abi::GetMenuFn>(*this, entry)(0, 0, 0);
+  if (!menu) return;
+  const menus::Services services{required<menus::ItemCountFn>(*this, "GetMenuItemCount"),
+                                 required<menus::ItemIdFn>(*this, "GetMenuItemID"),
+                                 required<menus::ItemTextFn>(*this, "GetMenuStringA"),
+                                 required<menus::SubMenuFn>(*this, "GetSubMenu")};
+  menus::walk(services, menu, 0, out);
+  // The host owns the menu it was handed.
+  if (const auto destroy = optional<menus::DestroyFn>(*this, "DestroyMenu")) destroy(menu);
 }
 
 // ---------------------------------------------------------------------------------

@@ -1,0 +1,37 @@
+# inspect on native array files: a table with labels, a list with keys and types,
+# long contents cut short, and files that cannot be read.
+q() { "$QUORREL" "$@"; echo "status $?"; }
+{
+  echo 'new x=9'
+  for i in $(seq 198); do echo 'A 8 "x"'; done
+  echo 'A 0 "wide.arr"'
+  echo 'new dims=1'
+  for i in $(seq 42); do echo "A 9 $i"; done
+  echo 'A 0 "long.arr"'
+} >make.qs
+cat >>make.qs <<'QS'
+new dims=1
+A 8 "alpha"
+A 9 -3
+A 9 0
+A 8 " padded "
+A 8 "tab\there"
+A 20 "k1" 0
+A 21 9 1
+A 0 "list.arr"
+new x=3
+A 8 "ann"
+A 8 "120"
+A 9 3
+A 8 "bob"
+A 8 "95"
+A 0 "part.arr"
+QS
+q run make.qs
+q inspect list.arr
+q inspect part.arr
+q inspect wide.arr
+q inspect long.arr
+q inspect missing.arr
+printf 'ZUB\0' >junk.bin
+q inspect junk.bin
