@@ -5,14 +5,13 @@
 #            (no NAME.err: nothing on stderr, exit status 0; else exit status 2).
 #   NAME.sh: run with $QUORREL set; stdout and stderr together against NAME.out,
 #            exit status 0 (the session prints the statuses it wants to check).
-# Files in data/ are copied into the directory first.
+# $QUORREL_EXAMPLES names the examples folder.
 set -u
-quorrel=$1 case=$2 work=$3
+quorrel=$1 case=$2 work=$3 examples=${4:-}
 dir=$(dirname "$case")
 name=$(basename "$case")
 stem=${name%.*}
 rm -rf "$work" && mkdir -p "$work"
-cp "$dir"/../data/* "$work"/ 2>/dev/null || true
 cp "$case" "$work"/
 cd "$work" || exit 1
 
@@ -37,7 +36,7 @@ if [[ $name == *.qs ]]; then
   compare "$dir/$stem.out" stdout.txt stdout
   compare "$err_golden" stderr.txt stderr
 else
-  QUORREL=$quorrel bash "$name" >stdout.txt 2>&1
+  QUORREL=$quorrel QUORREL_EXAMPLES=$examples bash "$name" >stdout.txt 2>&1
   status=$?
   expected_status=0
   compare "$dir/$stem.out" stdout.txt output
