@@ -6,6 +6,7 @@
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
+#include <filesystem>
 #include <fstream>
 #include <iostream>
 #include <iterator>
@@ -79,13 +80,17 @@ std::unique_ptr<Instance> loadInto(const Module& module, ArrayFormat format,
 
 // The element types, taken from a native snapshot of the instance.
 std::vector<ElementTypes> snapshotTypes(Instance& instance) {
-  char name[] = "/tmp/quorrel-inspect-XXXXXX";
-  const int fd = mkstemp(name);
+  std::error_code error;
+  std::string pattern = (std::filesystem::temp_directory_path(error) / "quorrel-XXXXXX").string();
+  if (error) pattern = "/tmp/quorrel-XXXXXX";
+  std::vector<char> name(pattern.begin(), pattern.end());
+  name.push_back('\0');
+  const int fd = mkstemp(name.data());
   if (fd < 0) return {};
   close(fd);
-  instance.callAction(formatInfo(ArrayFormat::Native).saveAction, {text(name)});
-  const auto bytes = readFile(name);
-  std::remove(name);
+  instance.callAction(formatInfo(ArrayFormat::Native).saveAction, {text(name.data())});
+  const auto bytes = readFile(name.data());
+  std::remove(name.data());
   return bytes ? readNativeElementTypes(*bytes) : std::vector<ElementTypes>{};
 }
 

@@ -1,12 +1,10 @@
 #include "module.h"
 
 #include <dlfcn.h>
-#include <unistd.h>
 
-#include <climits>
+#include <algorithm>
 #include <cstring>
 #include <filesystem>
-#include <map>
 
 namespace quorrel::tool {
 namespace {
