@@ -7,20 +7,6 @@
 
 namespace quorrel {
 
-void Element::moveFrom(Element& other) noexcept {
-  if (other.isOwning()) {
-    bytes_ = other.bytes_;
-  } else {
-    number_ = other.number_;
-  }
-  size_ = other.size_;
-  type_ = other.type_;
-  key_ = std::move(other.key_);
-  other.number_ = 0;
-  other.size_ = 0;
-  other.type_ = ElementType::None;
-}
-
 void Element::assign(const ElementValue& value) {
   if (value.type == ElementType::None || value.size < 1) {
     release();
