@@ -24,6 +24,11 @@ int32_t compareNumbers(int32_t a, int32_t b) {
   return a < b ? -1 : (a > b ? 1 : 0);
 }
 
+// A function object, so the comparison inlines into the partition loop.
+struct NumberOrder {
+  int32_t operator()(int32_t a, int32_t b) const { return compareNumbers(a, b); }
+};
+
 template <typename Key, typename Compare>
 class RowKeySort {
  public:
@@ -92,8 +97,27 @@ class RowKeySort {
     int32_t start = 0;
     for (int32_t k = 1; k <= count; ++k) {
       if (k < count && directed(key(start), key(k)) == 0) continue;
-      if (k - 1 > start) partitionSteps(start, k - 1);
+      if (k - 1 > start) rearrangeEqualRun(start, k);
       start = k;
+    }
+  }
+
+  // The steps on a range of equal keys: each pass stops both scans at once on every
+  // row, so it reverses the range; its parts are the two halves on either side of the
+  // middle (which stays put when the length is odd). Only the rows move; the keys are
+  // all the same.
+  void rearrangeEqualRun(int32_t begin, int32_t end) {
+    auto rows = rows_.begin();
+    std::vector<std::pair<int32_t, int32_t>>& pending = pending_;
+    pending.assign(1, {begin, end});
+    while (!pending.empty()) {
+      auto [b, e] = pending.back();
+      pending.pop_back();
+      if (e - b < 2) continue;
+      std::reverse(rows + b, rows + e);
+      const int32_t half = (e - b) / 2;
+      pending.emplace_back(b, b + half);
+      pending.emplace_back(e - half, e);
     }
   }
 
@@ -120,7 +144,8 @@ class RowKeySort {
   // on an explicit stack: the parts are disjoint, so the order of work changes nothing
   // and the stack stays O(log n).
   void partitionSteps(int32_t lo, int32_t hi) {
-    std::vector<std::pair<int32_t, int32_t>> pending;
+    std::vector<std::pair<int32_t, int32_t>>& pending = pending_;
+    pending.clear();
     for (;;) {
       while (hi > lo) {
         auto [i, j] = partitionPass(lo, hi);
@@ -160,6 +185,7 @@ class RowKeySort {
 
   std::vector<Key> keys_;
   std::vector<int32_t> rows_;
+  std::vector<std::pair<int32_t, int32_t>> pending_;
   Compare compare_;
   bool descending_;
   int64_t compares_ = 0;
@@ -173,30 +199,44 @@ std::vector<int32_t> sortedOrder(std::vector<Key> keys, Compare compare, bool de
   return sort.order();
 }
 
+constexpr int kPrefetchDistance = 8;
+
+void prefetchRow(const Element* row, std::size_t width) {
+  const char* bytes = reinterpret_cast<const char*>(row);
+  const std::size_t length = width * sizeof(Element);
+  for (std::size_t offset = 0; offset < length; offset += 64) __builtin_prefetch(bytes + offset, 1);
+  __builtin_prefetch(bytes + length - 1, 1);
+}
+
 // Moves whole rows so that table row first + k receives the row that was at
 // first + order[k], following each cycle of the permutation with one spare row.
 void moveRows(ElementArray& array, int32_t first, const std::vector<int32_t>& order) {
-  const int32_t columns = numberOfCols(array);
-  std::vector<Element> spare(static_cast<std::size_t>(columns));
-  std::vector<bool> placed(order.size(), false);
-  auto cell = [&](int32_t row, int32_t j) -> Element& {
-    return array.at(cellIndex(array, first + row, j));
-  };
+  const auto width = static_cast<std::size_t>(numberOfCols(array));
+  Element* table = array.slots().data() + static_cast<std::size_t>(first) * width;
+  auto row = [&](std::size_t r) { return table + r * width; };
+  std::vector<Element> spare(width);
+  std::vector<uint8_t> placed(order.size(), 0);
   for (std::size_t start = 0; start < order.size(); ++start) {
-    if (placed[start] || order[start] == static_cast<int32_t>(start)) continue;
-    const auto s = static_cast<int32_t>(start);
-    for (int32_t j = 0; j < columns; ++j)
-      spare[static_cast<std::size_t>(j)] = std::move(cell(s, j));
-    int32_t k = s;
-    while (order[static_cast<std::size_t>(k)] != s) {
-      const int32_t from = order[static_cast<std::size_t>(k)];
-      for (int32_t j = 0; j < columns; ++j) cell(k, j) = std::move(cell(from, j));
-      placed[static_cast<std::size_t>(k)] = true;
+    if (placed[start] != 0 || order[start] == static_cast<int32_t>(start)) continue;
+    std::move(row(start), row(start) + width, spare.begin());
+    // The rows of a cycle lie anywhere in the table: fetch a few steps ahead so the
+    // cache misses overlap instead of queueing one after another.
+    std::size_t ahead = start;
+    for (int step = 0; step < kPrefetchDistance; ++step) {
+      ahead = static_cast<std::size_t>(order[ahead]);
+      prefetchRow(row(ahead), width);
+    }
+    std::size_t k = start;
+    for (;;) {
+      const auto from = static_cast<std::size_t>(order[k]);
+      placed[k] = 1;
+      if (from == start) break;
+      ahead = static_cast<std::size_t>(order[ahead]);
+      prefetchRow(row(ahead), width);
+      std::move(row(from), row(from) + width, row(k));
       k = from;
     }
-    for (int32_t j = 0; j < columns; ++j)
-      cell(k, j) = std::move(spare[static_cast<std::size_t>(j)]);
-    placed[static_cast<std::size_t>(k)] = true;
+    std::move(spare.begin(), spare.end(), row(k));
   }
 }
 
@@ -204,9 +244,11 @@ std::vector<int32_t> orderByValue(const ElementArray& array, int32_t column, boo
                                   int32_t first, int32_t count) {
   std::vector<int32_t> keys(static_cast<std::size_t>(count));
   for (int32_t k = 0; k < count; ++k) {
-    keys[static_cast<std::size_t>(k)] = array.at(cellIndex(array, first + k, column)).asValue();
+    const Element& cell = array.at(cellIndex(array, first + k, column));
+    keys[static_cast<std::size_t>(k)] =
+        cell.type() == ElementType::Value ? cell.number() : cell.asValue();
   }
-  return sortedOrder(std::move(keys), compareNumbers, descending);
+  return sortedOrder(std::move(keys), NumberOrder{}, descending);
 }
 
 std::vector<int32_t> orderByText(const ElementArray& array, int32_t column, bool descending,
