@@ -1,6 +1,6 @@
 #include "query/search.h"
 
-#include <algorithm>
+#include <cstdint>
 #include <cstring>
 
 #include "array/text.h"
@@ -98,30 +98,6 @@ bool containsPattern(std::string_view probe, std::string_view bytes, bool caseSe
   return false;
 }
 
-// Folded search for short texts: a plain pass over the offsets. For a letter, OR-ing
-// 0x20 maps exactly its two cases onto the lower one.
-bool containsFoldedShort(std::string_view probe, std::string_view bytes) {
-  const std::size_t length = probe.size();
-  if (bytes.size() < length) return false;
-  const auto* t = reinterpret_cast<const unsigned char*>(bytes.data());
-  const unsigned char first = foldByte(static_cast<unsigned char>(probe[0]));
-  const bool letter = first >= 'a' && first <= 'z';
-  const std::size_t lastOffset = bytes.size() - length;
-  for (std::size_t o = 0; o <= lastOffset; ++o) {
-    const unsigned char c = letter ? static_cast<unsigned char>(t[o] | 0x20) : t[o];
-    if (c == first && equalFolded(bytes.data() + o + 1, probe.data() + 1, length - 1)) return true;
-  }
-  return false;
-}
-
-// Folds `count` bytes; written as a plain loop the compiler can vectorise.
-void foldInto(char* out, const char* in, std::size_t count) {
-  for (std::size_t i = 0; i < count; ++i) {
-    const auto c = static_cast<unsigned char>(in[i]);
-    out[i] = static_cast<char>(static_cast<unsigned>(c - 'A') < 26u ? c + ('a' - 'A') : c);
-  }
-}
-
 // One containment probe with its method chosen once for a whole scan.
 class ProbeSearch {
  public:
@@ -134,9 +110,6 @@ class ProbeSearch {
       method_ = Method::Exact;
     } else {
       method_ = Method::Folded;
-      // Folding both sides turns the search of a long text into a plain one.
-      canFoldChunks_ = probe.size() <= kMaxFoldedProbe;
-      if (canFoldChunks_) foldInto(foldedProbe_, probe.data(), probe.size());
     }
   }
 
@@ -147,8 +120,7 @@ class ProbeSearch {
       case Method::Exact:
         return bytes.find(probe_) != std::string_view::npos;
       case Method::Folded:
-        if (bytes.size() < kShortText) return containsFoldedShort(probe_, bytes);
-        return canFoldChunks_ ? inFoldedChunks(bytes) : containsFolded(probe_, bytes);
+        return containsFolded(probe_, bytes);
       default:
         return containsPattern(probe_, bytes, caseSensitive_);
     }
@@ -170,30 +142,9 @@ class ProbeSearch {
   }
 
  private:
-  // Below this length a plain pass over the offsets beats folding and memchr.
-  static constexpr std::size_t kShortText = 64;
-  static constexpr std::size_t kMaxFoldedProbe = 128;
-  static constexpr std::size_t kChunk = 512;
   enum class Method { Exact, Folded, Pattern };
 
-  // The text is folded a chunk at a time into a stack buffer; consecutive chunks
-  // overlap by L - 1 bytes so that no span is missed.
-  bool inFoldedChunks(std::string_view bytes) const {
-    const std::size_t length = probe_.size();
-    const std::string_view folded(foldedProbe_, length);
-    char chunk[kChunk];
-    for (std::size_t pos = 0;;) {
-      const std::size_t count = std::min(kChunk, bytes.size() - pos);
-      foldInto(chunk, bytes.data() + pos, count);
-      if (std::string_view(chunk, count).find(folded) != std::string_view::npos) return true;
-      if (pos + count == bytes.size()) return false;
-      pos += count - (length - 1);
-    }
-  }
-
   std::string_view probe_;
-  bool canFoldChunks_ = false;
-  char foldedProbe_[kMaxFoldedProbe] = {};
   bool caseSensitive_;
   Method method_ = Method::Exact;
 };

@@ -177,7 +177,7 @@ TEST(FindContaining, WildcardSpansHaveTheProbeLength) {
 }
 
 TEST(FindContaining, LongTextsAtEveryPlacement) {
-  // Long texts are searched in pieces; a probe may straddle any boundary.
+  // Folded probes at the start, middle and end of long texts, and just short of them.
   for (std::size_t length : {63u, 64u, 511u, 512u, 513u, 1100u}) {
     for (std::size_t probeLength : {1u, 3u, 128u, 129u, 300u}) {
       if (probeLength > length) continue;
