@@ -37,7 +37,17 @@ void applyValueWhere(ElementArray& array, int32_t column, Test&& passes) {
 bool containsProbe(const ElementArray& array, const char* text, const char* probe) {
   const auto probeLength = static_cast<int32_t>(std::strlen(probe));
   const auto textLength = static_cast<int32_t>(std::strlen(text));
+  // Literal mode: a span can only match where its first character does, so most
+  // positions are passed over without a call.
+  const bool literal = !isWildcardSearch(array) && probeLength > 0;
+  const bool folded = !isCaseSensitive(array);
+  const auto head = static_cast<unsigned char>(probe[0]);
+  const unsigned char wanted = folded ? foldByte(head) : head;
   for (int32_t o = 0; o <= textLength - probeLength; ++o) {
+    if (literal) {
+      const auto c = static_cast<unsigned char>(text[o]);
+      if ((folded ? foldByte(c) : c) != wanted) continue;
+    }
     if (searchCompareSpan(array, probe, text + o, probeLength) == 0) return true;
   }
   return false;

@@ -16,20 +16,13 @@ bool isTable(const ElementArray& array) {
   return array.dimensions() == 2;
 }
 
-// Joins the texts of the given cells with the whole delimiter text between them. The
-// length is measured first so the result is built in one allocation.
+// Joins the texts of the given cells with the whole delimiter text between them, in
+// one walk: the cells of a long column lie far apart, and a second walk to measure
+// them first would cost more than the few reallocations of the growing text.
 template <typename ForEachCell>
 std::string joinCells(const ElementArray& array, ForEachCell&& forEachCell) {
   const std::string_view delimiter = array.listDelimiter();
-  std::size_t length = 0;
-  std::size_t fields = 0;
-  forEachCell([&](const Element& cell) {
-    length += static_cast<std::size_t>(cell.textLength());
-    ++fields;
-  });
-  if (fields > 1) length += (fields - 1) * delimiter.size();
   std::string out;
-  out.reserve(length);
   NumberText scratch;
   bool first = true;
   forEachCell([&](const Element& cell) {

@@ -153,6 +153,16 @@ TEST(Selection, ContainingAndMatching) {
   startNewWhere(a);
   selectWhereContaining(a, 0, "ABC");  // case insensitive by default
   EXPECT_EQ(a.rowStates, (States{U, S, U, U, U}));
+  startNewWhere(a);
+  selectWhereContaining(a, 0, "Bc");
+  EXPECT_EQ(a.rowStates, (States{U, S, U, U, U}));
+  a.caseMode = 1;
+  startNewWhere(a);
+  selectWhereContaining(a, 0, "Bc");
+  EXPECT_EQ(a.rowStates, (States{U, U, U, U, U}));
+  selectWhereContaining(a, 0, "34");
+  EXPECT_EQ(a.rowStates, (States{S, U, U, U, S}));
+  a.caseMode = 0;
 
   a.searchMode = 1;
   startNewWhere(a);
