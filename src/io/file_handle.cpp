@@ -185,29 +185,14 @@ std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare) {
 BufferedWriter::BufferedWriter(FileHandle& file)
     : file_(file), buffer_(std::make_unique<char[]>(kCapacity)) {}
 
-void BufferedWriter::bytes(const char* data, std::size_t count) {
-  if (failed_ || count == 0) return;
-  if (count > kCapacity - used_) {
-    flush();
-    if (count >= kCapacity) {
-      failed_ = failed_ || !file_.writeAll(data, count);
-      return;
-    }
+void BufferedWriter::bytesSlow(const char* data, std::size_t count) {
+  flush();
+  if (count >= kCapacity) {
+    failed_ = failed_ || !file_.writeAll(data, count);
+    return;
   }
-  std::memcpy(buffer_.get() + used_, data, count);
-  used_ += count;
-}
-
-void BufferedWriter::u16(uint16_t v) {
-  const char le[2] = {static_cast<char>(v & 0xFF), static_cast<char>(v >> 8)};
-  bytes(le, 2);
-}
-
-void BufferedWriter::i32(int32_t v) {
-  const auto u = static_cast<uint32_t>(v);
-  const char le[4] = {static_cast<char>(u & 0xFF), static_cast<char>((u >> 8) & 0xFF),
-                      static_cast<char>((u >> 16) & 0xFF), static_cast<char>(u >> 24)};
-  bytes(le, 4);
+  std::memcpy(buffer_.get(), data, count);
+  used_ = count;
 }
 
 void BufferedWriter::flush() {

@@ -6,6 +6,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstdlib>
+#include <cstring>
 #include <memory>
 #include <optional>
 #include <string_view>
@@ -90,13 +91,31 @@ class BufferedWriter {
   BufferedWriter(const BufferedWriter&) = delete;
   BufferedWriter& operator=(const BufferedWriter&) = delete;
 
-  void bytes(const char* data, std::size_t count);
+  void bytes(const char* data, std::size_t count) {
+    if (count == 0) return;
+    if (count <= kCapacity - used_) {
+      std::memcpy(buffer_.get() + used_, data, count);
+      used_ += count;
+    } else {
+      bytesSlow(data, count);
+    }
+  }
   void text(std::string_view s) { bytes(s.data(), s.size()); }
-  void u16(uint16_t v);
-  void i32(int32_t v);
+  void u16(uint16_t v) {
+    const char le[2] = {static_cast<char>(v & 0xFF), static_cast<char>(v >> 8)};
+    bytes(le, 2);
+  }
+  void i32(int32_t v) {
+    const auto u = static_cast<uint32_t>(v);
+    const char le[4] = {static_cast<char>(u & 0xFF), static_cast<char>((u >> 8) & 0xFF),
+                        static_cast<char>((u >> 16) & 0xFF), static_cast<char>(u >> 24)};
+    bytes(le, 4);
+  }
   void flush();
 
  private:
+  void bytesSlow(const char* data, std::size_t count);
+
   static constexpr std::size_t kCapacity = 1 << 16;
   FileHandle& file_;
   std::unique_ptr<char[]> buffer_;

@@ -123,6 +123,8 @@ bool parseNative(std::string_view file, Sink& sink) {
   }
 
   const int32_t elementCount = in.i32();
+  // Every complete record takes at least 12 bytes.
+  sink.expectElements(std::min<std::size_t>(std::max(elementCount, 0), in.remaining() / 12 + 1));
   for (int32_t i = 0; i < elementCount && !in.atEnd(); ++i) {
     ElementRecord r;
     readHalf(in, sink, r.type, r.size, r.number, r.data);
@@ -142,6 +144,7 @@ struct ImageSink {
     std::copy(boundaries, boundaries + kMaxDimensions, image.boundaries);
   }
   void label(const LabelRecord& label) { image.labels.push_back(label); }
+  void expectElements(std::size_t count) { image.elements.reserve(count); }
   void element(const ElementRecord& r) { image.elements.push_back(r); }
   const char* zeroFilled(std::string_view held, int32_t size) {
     auto block = std::make_unique<char[]>(static_cast<std::size_t>(size));
@@ -164,6 +167,7 @@ struct LoadSink {
   std::vector<std::unique_ptr<char[]>> filled;
 
   void version(uint16_t) {}
+  void expectElements(std::size_t) {}
   void header(int32_t dimensions, const int32_t* boundaries) {
     headerSeen = true;
     if (!replace) return;

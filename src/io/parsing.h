@@ -11,28 +11,33 @@
 namespace quorrel::io_detail {
 
 // Reads fields from a file image. Bytes past the end read as zero, so a short file
-// leaves the fields it does not hold at 0.
+// leaves the fields it does not hold at 0; the position never passes the end.
 class Cursor {
  public:
   explicit Cursor(std::string_view file) : file_(file) {}
 
   bool atEnd() const { return pos_ >= file_.size(); }
   std::size_t fileSize() const { return file_.size(); }
-  std::size_t remaining() const { return file_.size() - std::min(pos_, file_.size()); }
+  std::size_t remaining() const { return file_.size() - pos_; }
 
   uint32_t unsignedLE(int byteCount) {
+    const std::size_t held = std::min(static_cast<std::size_t>(byteCount), remaining());
+    const auto* p = reinterpret_cast<const unsigned char*>(file_.data()) + pos_;
     uint32_t v = 0;
-    for (int i = 0; i < byteCount; ++i, ++pos_) {
-      if (pos_ < file_.size()) v |= uint32_t{static_cast<unsigned char>(file_[pos_])} << (8 * i);
+    if (held == 4) {
+      v = uint32_t{p[0]} | uint32_t{p[1]} << 8 | uint32_t{p[2]} << 16 | uint32_t{p[3]} << 24;
+    } else {
+      for (std::size_t i = 0; i < held; ++i) v |= uint32_t{p[i]} << (8 * i);
     }
+    pos_ += held;
     return v;
   }
   uint16_t u16() { return static_cast<uint16_t>(unsignedLE(2)); }
   int32_t i32() { return static_cast<int32_t>(unsignedLE(4)); }
 
   bool matches(std::string_view magic) {
-    const bool same = pos_ <= file_.size() && file_.substr(pos_).starts_with(magic);
-    pos_ += magic.size();
+    const bool same = file_.substr(pos_).starts_with(magic);
+    pos_ = std::min(pos_ + magic.size(), file_.size());
     return same;
   }
 
