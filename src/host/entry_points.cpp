@@ -6,6 +6,7 @@
 #include <new>
 
 #include "array/element_array.h"
+#include "array/int32.h"
 #include "host/run_record.h"
 #include "host/tables.h"
 
@@ -81,8 +82,8 @@ QUORREL_EXPORT void QUORREL_CALL GetObjectRect(HostWord, int32_t* rect, HostWord
                                                void* setupRecord) {
   if (rect == nullptr || setupRecord == nullptr) return;
   const host::SetupFields setup = host::readSetup(setupRecord);
-  rect[2] = rect[0] + setup.objectWidth;
-  rect[3] = rect[1] + setup.objectHeight;
+  rect[2] = quorrel::addWrap(rect[0], setup.objectWidth);
+  rect[3] = quorrel::addWrap(rect[1], setup.objectHeight);
 }
 
 QUORREL_EXPORT int16_t QUORREL_CALL CreateRunObject(void* runRecord, void* setupRecord, HostWord) {
