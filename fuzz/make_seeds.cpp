@@ -5,6 +5,10 @@
 #include <string>
 
 #include "array/element_array.h"
+#include "io/csv_file.h"
+#include "io/element_file.h"
+#include "io/host_array_file.h"
+#include "io/ini_file.h"
 #include "io/native_file.h"
 
 namespace {
@@ -53,5 +57,14 @@ int main(int argc, char** argv) {
   quorrel::saveNativeFile(empty, (dir("native_file") / "empty.arr").c_str(), 0);
   quorrel::saveNativeFile(t, (dir("native_file") / "table.arr").c_str(), 0);
   quorrel::saveNativeFile(c, (dir("native_file") / "cube.arr").c_str(), 0);
+  quorrel::saveHostArrayFile(t, (dir("host_file") / "table.mmf").c_str(), 0);
+  quorrel::saveHostArrayFile(c, (dir("host_file") / "cube.mmf").c_str(), 0);
+  quorrel::saveCsvFile(t, (dir("csv_file") / "table.csv").c_str(), 0);
+  quorrel::saveCsvFile(c, (dir("csv_file") / "cube.csv").c_str(), 0);
+  quorrel::saveIniFile(t, (dir("ini_file") / "table.ini").c_str(), 0);
+  quorrel::saveIniFile(empty, (dir("ini_file") / "empty.ini").c_str(), 0);
+  quorrel::saveElementToFile(t, 0, (dir("element_file") / "string.bin").c_str(), 0);
+  quorrel::saveElementToFile(t, 8, (dir("element_file") / "file.bin").c_str(), 0);
+  quorrel::saveElementToFile(t, 6, (dir("element_file") / "value.bin").c_str(), 0);
   return 0;
 }

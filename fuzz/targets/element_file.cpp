@@ -1,0 +1,34 @@
+// Any bytes as a raw element file: read whole into a file element (set, insert, append),
+// saved back byte for byte, and appended to a file.
+#include <cstdint>
+#include <cstring>
+#include <string>
+
+#include "fuzz_files.h"
+#include "io/element_file.h"
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  static const std::string path = quorrel::fuzzTempPath("element");
+  static const std::string copy = quorrel::fuzzTempPath("element-copy");
+  quorrel::writeFuzzFile(path, data, size);
+
+  auto block = quorrel::readWholeFile(path.c_str());
+  if (!block || block->size() != size) __builtin_trap();
+  if (size > 0 && std::memcmp(block->data(), data, size) != 0) __builtin_trap();
+
+  quorrel::ElementArray array;
+  quorrel::fillSample(array);
+  const quorrel::ByteBlock bytes{block->data(), static_cast<int32_t>(block->size())};
+  array.setFile(bytes, 1);
+  array.insertFile(bytes, 0);
+  array.appendFile(bytes);
+  quorrel::checkInvariants(array);
+
+  // A file element writes back exactly the bytes it was read from.
+  quorrel::saveElementToFile(array, array.size() - 1, copy.c_str(), 0);
+  auto back = quorrel::readWholeFile(copy.c_str());
+  if (!back || back->size() != size) __builtin_trap();
+  if (size > 0 && std::memcmp(back->data(), data, size) != 0) __builtin_trap();
+  quorrel::saveElementToFile(array, 0, copy.c_str(), 1);
+  return 0;
+}
