@@ -26,17 +26,7 @@ set_target_properties(quorrel_module PROPERTIES
 target_sources(quorrel_module PRIVATE ${quorrel_def})
 target_link_options(quorrel_module PRIVATE "LINKER:--kill-at")
 
-# The resource script (menus, string tables, the setup dialog, bitmaps, data).
-set(quorrel_rc ${CMAKE_SOURCE_DIR}/resources/quorrel.rc)
-if(EXISTS ${quorrel_rc})
-  target_sources(quorrel_module PRIVATE ${quorrel_rc})
-  set_property(SOURCE ${quorrel_rc} TARGET_DIRECTORY quorrel_module APPEND PROPERTY COMPILE_OPTIONS
-    -I${CMAKE_SOURCE_DIR}/resources --codepage=1252)
-  file(GLOB quorrel_rc_inputs CONFIGURE_DEPENDS ${CMAKE_SOURCE_DIR}/resources/*)
-  set_property(SOURCE ${quorrel_rc} TARGET_DIRECTORY quorrel_module APPEND PROPERTY OBJECT_DEPENDS ${quorrel_rc_inputs})
-else()
-  message(WARNING "resources/quorrel.rc is missing: the DLL is built without resources")
-endif()
+# The resource script is added by src/platform/resources.cmake.
 
 # Layout checks compiled for i686, and the Windows test host.
 add_subdirectory(${CMAKE_SOURCE_DIR}/tests/windows ${CMAKE_BINARY_DIR}/tests/windows)
