@@ -87,6 +87,10 @@ TEST(DllExports, ExactlyTheEntryPointsByPlainNameAndOrdinal) {
     EXPECT_NE(e.name.front(), '_') << e.name;
   }
   EXPECT_LE(image.ordinalBase, 2u);
+  // GetProcAddress searches the name table by bisection: it must be in byte order.
+  std::vector<std::string> names;
+  for (const Export& e : image.exports) names.push_back(e.name);
+  EXPECT_TRUE(std::is_sorted(names.begin(), names.end()));
 }
 
 // The list the .def and the Linux version script are generated from must say the same.
