@@ -221,18 +221,23 @@ void moveRows(ElementArray& array, int32_t first, const std::vector<int32_t>& or
     std::move(row(start), row(start) + width, spare.begin());
     // The rows of a cycle lie anywhere in the table: fetch a few steps ahead so the
     // cache misses overlap instead of queueing one after another.
+    // Short cycles (most of them when runs of ties are rearranged) stop fetching as
+    // soon as the look-ahead comes round to the start.
     std::size_t ahead = start;
-    for (int step = 0; step < kPrefetchDistance; ++step) {
+    bool fetching = true;
+    auto fetchNext = [&] {
+      if (!fetching) return;
       ahead = static_cast<std::size_t>(order[ahead]);
-      prefetchRow(row(ahead), width);
-    }
+      fetching = ahead != start;
+      if (fetching) prefetchRow(row(ahead), width);
+    };
+    for (int step = 0; step < kPrefetchDistance; ++step) fetchNext();
     std::size_t k = start;
     for (;;) {
       const auto from = static_cast<std::size_t>(order[k]);
       placed[k] = 1;
       if (from == start) break;
-      ahead = static_cast<std::size_t>(order[ahead]);
-      prefetchRow(row(ahead), width);
+      fetchNext();
       std::move(row(from), row(from) + width, row(k));
       k = from;
     }
