@@ -4,12 +4,10 @@
 #pragma once
 
 #include <cstdint>
-#include <cstdlib>
 #include <cstring>
 #include <optional>
 #include <string>
 #include <tuple>
-#include <type_traits>
 
 #include "array/element_array.h"
 #include "host/abi.h"

@@ -49,6 +49,16 @@ TEST(RecordsetRoutinesTest, RowsLabelsAndCellReads) {
   EXPECT_EQ(t.number(58, {"big"}), 60);
   EXPECT_EQ(t.number(59, {"big"}), 20);
 
+  // Cell reads ignore the row states; lists follow the current delimiter.
+  t.action(78);  // Start new Where: no row visible
+  EXPECT_EQ(t.number(47, {1, 2}), 3);
+  t.action(63);
+  t.action(57, ";");
+  EXPECT_EQ(t.text(51), ";");
+  EXPECT_EQ(t.text(51), ";");
+  EXPECT_EQ(t.text(41, {0}), "x;1;10");
+  t.action(57, ",");
+
   t.action(32, "w,0,5", 0);  // Insert row from list
   EXPECT_EQ(t.text(41, {0}), "w,0,5");
   EXPECT_EQ(t.number(40), 4);
