@@ -9,7 +9,7 @@ namespace {
 
 int32_t cellValue(const ElementArray& array, int32_t row, int32_t column) {
   const int32_t index = cellIndex(array, row, column);
-  return array.inRange(index) ? array.at(index).asValue() : 0;
+  return array.inRange(index) ? cellNumber(array.at(index)) : 0;
 }
 
 // Folds the visible rows' values in order: the first value starts the result and every

@@ -250,8 +250,7 @@ std::vector<int32_t> orderByValue(const ElementArray& array, int32_t column, boo
   std::vector<int32_t> keys(static_cast<std::size_t>(count));
   for (int32_t k = 0; k < count; ++k) {
     const Element& cell = array.at(cellIndex(array, first + k, column));
-    keys[static_cast<std::size_t>(k)] =
-        cell.type() == ElementType::Value ? cell.number() : cell.asValue();
+    keys[static_cast<std::size_t>(k)] = cellNumber(cell);
   }
   return sortedOrder(std::move(keys), NumberOrder{}, descending);
 }

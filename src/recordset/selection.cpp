@@ -31,7 +31,7 @@ void applyWhere(ElementArray& array, int32_t column, Test&& passes) {
 
 template <typename Test>
 void applyValueWhere(ElementArray& array, int32_t column, Test&& passes) {
-  applyWhere(array, column, [&](const Element& cell) { return passes(cell.asValue()); });
+  applyWhere(array, column, [&](const Element& cell) { return passes(cellNumber(cell)); });
 }
 
 bool containsProbe(const ElementArray& array, const char* text, const char* probe) {

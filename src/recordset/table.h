@@ -21,6 +21,11 @@ inline int32_t cellIndex(const ElementArray& array, int32_t row, int32_t column)
   return addWrap(column, mulWrap(row, array.boundaryEntry(1)));
 }
 
+// A cell's numeric value (asValue), without a call for the common Value cell.
+inline int32_t cellNumber(const Element& cell) {
+  return cell.type() == ElementType::Value ? cell.number() : cell.asValue();
+}
+
 // Calls visit(r) for each selected table row r, in position order. Row states always
 // have one entry per table row, so every r is a complete row of the array.
 template <typename Visit>
