@@ -4,7 +4,7 @@
 
 #include <cstdint>
 #include <cstring>
-#include <memory>
+#include <memory>  // kept for files that relied on it through this header
 
 namespace quorrel {
 
@@ -34,78 +34,123 @@ struct NumberText {
   char text[12] = {};
 };
 
+// An element is one machine word, so that the array's slots are small and edits move
+// words. The word is 0 for a keyless None, an odd number carrying the 32-bit value for
+// a keyless Value, and otherwise points to a heap record: a small header followed by
+// the value (the bytes with a hidden terminator, or the number), preceded by the key
+// element when the record was made for a key. Moving an element moves the word.
 class Element {
  public:
-  Element() : number_(0) {}
-  ~Element() { reset(); }
-  Element(Element&& other) noexcept { moveFrom(other); }
+  Element() = default;
+  ~Element() {
+    if (isRecord()) destroyRecord();
+  }
+  Element(Element&& other) noexcept : word_(other.word_) { other.word_ = 0; }
   Element& operator=(Element&& other) noexcept {
     if (this != &other) {
-      reset();
-      moveFrom(other);
+      if (isRecord()) destroyRecord();
+      word_ = other.word_;
+      other.word_ = 0;
     }
     return *this;
   }
   Element(const Element&) = delete;
   Element& operator=(const Element&) = delete;
 
-  ElementType type() const { return type_; }
-  int32_t size() const { return size_; }
+  ElementType type() const {
+    if (word_ == 0) return ElementType::None;
+    return isInlineValue() ? ElementType::Value : record()->type;
+  }
+  int32_t size() const {
+    if (word_ == 0) return 0;
+    return isInlineValue() ? 4 : record()->size;
+  }
   // The number of a Value; 0 for every other type.
-  int32_t number() const { return type_ == ElementType::Value ? number_ : 0; }
+  int32_t number() const {
+    if (isInlineValue()) return inlineNumber();
+    return isRecord() && record()->type == ElementType::Value ? record()->number() : 0;
+  }
   // The owned bytes of a String or File; null for None and Value.
-  const char* bytes() const { return isOwning() ? bytes_ : nullptr; }
-  const Element* key() const { return key_.get(); }
-  bool hasKey() const { return key_ != nullptr; }
+  const char* bytes() const {
+    if (!isRecord()) return nullptr;
+    const Record* r = record();
+    return r->type != ElementType::None && r->type != ElementType::Value ? r->payload() : nullptr;
+  }
+  const Element* key() const { return hasKey() ? record()->key() : nullptr; }
+  bool hasKey() const { return isRecord() && (record()->flags & kHasKey) != 0; }
 
   // Replaces the value; the key stays. The number 0, a null operand, a size below 1
   // and the None type all store None. Throws std::bad_alloc and leaves the element
   // unchanged when the copy cannot be made.
   void assign(const ElementValue& value);
+  // assign(ElementValue::ofValue(number)) without the detour.
+  void assignValue(int32_t number) {
+    if (isRecord()) {
+      assign(ElementValue::ofValue(number));
+    } else {
+      word_ = number == 0 ? 0 : inlineWord(number);
+    }
+  }
 
   // The value as text: a String's own text, a Value's decimal form (written into
   // scratch), or "" for None and File. Never null.
-  const char* asString(NumberText& scratch) const;
-  int32_t asValue() const;
+  const char* asString(NumberText& scratch) const {
+    if (isRecord() && record()->type == ElementType::String) return record()->payload();
+    return numberOrEmptyText(scratch);
+  }
+  int32_t asValue() const {
+    if (isInlineValue()) return inlineNumber();
+    return isRecord() ? recordValue() : 0;
+  }
   int32_t textLength() const;
 
+  // Gives the element a key (created when there is none) or replaces the key's value.
+  // Throws std::bad_alloc and leaves the element unchanged when it cannot be made.
   void setKey(const ElementValue& value);
-  void deleteKey() { key_.reset(); }
-  void reset() {
-    release();
-    key_.reset();
+  void deleteKey() noexcept;
+  void reset() noexcept {
+    if (isRecord()) destroyRecord();
+    word_ = 0;
   }
 
  private:
-  bool isOwning() const { return type_ != ElementType::None && type_ != ElementType::Value; }
-  void release() {
-    if (isOwning()) std::free(bytes_);
-    number_ = 0;
-    size_ = 0;
-    type_ = ElementType::None;
-  }
-  // Inline: the sorts move elements by the million.
-  void moveFrom(Element& other) noexcept {
-    if (other.isOwning()) {
-      bytes_ = other.bytes_;
-    } else {
-      number_ = other.number_;
-    }
-    size_ = other.size_;
-    type_ = other.type_;
-    key_ = std::move(other.key_);
-    other.number_ = 0;
-    other.size_ = 0;
-    other.type_ = ElementType::None;
-  }
+  static constexpr uint16_t kHasKey = 1;   // a live key element precedes the header
+  static constexpr uint16_t kKeySlot = 2;  // the allocation starts with a key slot
 
-  union {
-    int32_t number_;
-    char* bytes_;
+  struct Record {
+    int32_t size;
+    ElementType type;
+    uint16_t flags;
+
+    char* payload() { return reinterpret_cast<char*>(this + 1); }
+    const char* payload() const { return reinterpret_cast<const char*>(this + 1); }
+    int32_t number() const {
+      int32_t n;
+      std::memcpy(&n, payload(), sizeof n);
+      return n;
+    }
+    Element* key() { return reinterpret_cast<Element*>(reinterpret_cast<char*>(this) - 8); }
+    const Element* key() const {
+      return reinterpret_cast<const Element*>(reinterpret_cast<const char*>(this) - 8);
+    }
   };
-  int32_t size_ = 0;
-  ElementType type_ = ElementType::None;
-  std::unique_ptr<Element> key_;
+
+  static uint64_t inlineWord(int32_t number) {
+    return (uint64_t{static_cast<uint32_t>(number)} << 32) | 1u;
+  }
+  bool isInlineValue() const { return (word_ & 1u) != 0; }
+  bool isRecord() const { return word_ != 0 && (word_ & 1u) == 0; }
+  int32_t inlineNumber() const { return static_cast<int32_t>(static_cast<uint32_t>(word_ >> 32)); }
+  Record* record() const { return reinterpret_cast<Record*>(static_cast<uintptr_t>(word_)); }
+  static uint64_t recordWord(Record* r) { return reinterpret_cast<uintptr_t>(r); }
+
+  int32_t recordValue() const;
+  const char* numberOrEmptyText(NumberText& scratch) const;
+  // A new record holding `value` (already normalised), with a key slot when asked.
+  static Record* makeRecord(const ElementValue& value, bool keySlot);
+  void destroyRecord() noexcept;
+
+  uint64_t word_ = 0;
 };
 
 }  // namespace quorrel

@@ -7,7 +7,9 @@
 
 namespace quorrel {
 
-ElementArray::ElementArray() = default;
+ElementArray::ElementArray() {
+  refreshAppendRange();
+}
 
 // --- Capacity policy ---------------------------------------------------------------
 
@@ -30,14 +32,6 @@ int32_t ElementArray::rebalancedCapacity(int32_t capacity, int32_t sizeBefore,
 }
 
 // --- Reading ---------------------------------------------------------------------------
-
-const char* ElementArray::getString(int32_t index) {
-  return inRange(index) ? at(index).asString(scratch_) : nullptr;
-}
-
-int32_t ElementArray::getValue(int32_t index) const {
-  return inRange(index) ? at(index).asValue() : 0;
-}
 
 bool ElementArray::getBytes(ByteBlock& out, int32_t index) const {
   if (!inRange(index)) return false;
@@ -70,8 +64,9 @@ void ElementArray::setAt(const ElementValue& value, int32_t index) {
     Element fresh;
     fresh.assign(value);
     int32_t newCapacity = rebalancedCapacity(capacity_, size(), int64_t{index} + 1);
-    elements_.resize(static_cast<std::size_t>(index) + 1);
-    elements_.back() = std::move(fresh);
+    elements_.reserve(static_cast<std::size_t>(index) + 1);
+    elements_.growTo(static_cast<std::size_t>(index));
+    elements_.pushBack(std::move(fresh));
     capacity_ = newCapacity;
   }
   syncRowStates();
@@ -87,7 +82,7 @@ void ElementArray::insertAt(const ElementValue& value, int32_t index) {
   Element fresh;
   fresh.assign(value);
   int32_t newCapacity = rebalancedCapacity(capacity_, size(), size());
-  elements_.insert(elements_.begin() + index, std::move(fresh));
+  elements_.insertAt(static_cast<std::size_t>(index)) = std::move(fresh);
   capacity_ = newCapacity;
   syncRowStates();
 }
@@ -112,12 +107,12 @@ void ElementArray::setKey(const ElementValue& key, int32_t index) {
 void ElementArray::deleteAt(int32_t index) {
   if (!inRange(index)) return;
   capacity_ = rebalancedCapacity(capacity_, size(), size());
-  elements_.erase(elements_.begin() + index);
+  elements_.eraseAt(static_cast<std::size_t>(index));
   syncRowStates();
 }
 
 void ElementArray::clear() {
-  std::vector<Element>().swap(elements_);
+  elements_.clear();
   capacity_ = kInitialCapacity;
   syncRowStates();
 }
@@ -174,16 +169,18 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
   const int64_t finalSize = growing ? sizeBefore + change : sizeBefore - change;
   if (finalSize > kMaxSize) return;
 
-  std::vector<Element> result;
+  ElementStore result;
   result.reserve(static_cast<std::size_t>(finalSize));
   int64_t cap = capacity_;
   int64_t current = sizeBefore;
   const int64_t kept = growing ? block : block - count;
   for (int32_t k = 0; k < blocks; ++k) {
-    auto first = elements_.begin() + int64_t{k} * block;
-    std::move(first, first + kept, std::back_inserter(result));
+    const auto first = static_cast<std::size_t>(int64_t{k} * block);
+    for (std::size_t i = 0; i < static_cast<std::size_t>(kept); ++i) {
+      result.pushBack(std::move(elements_[first + i]));
+    }
     if (growing) {
-      result.resize(result.size() + static_cast<std::size_t>(count));
+      result.growTo(result.size() + static_cast<std::size_t>(count));
       // Insert positions: the end of the (k+1)-th old block after the earlier inserts.
       const int64_t position = int64_t{k + 1} * block + int64_t{k} * count;
       for (int64_t i = 0; i < count; ++i) {
@@ -198,8 +195,9 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
       }
     }
   }
-  std::move(elements_.begin() + int64_t{blocks} * block, elements_.end(),
-            std::back_inserter(result));
+  for (auto i = static_cast<std::size_t>(int64_t{blocks} * block); i < elements_.size(); ++i) {
+    result.pushBack(std::move(elements_[i]));
+  }
   // Rows stay selected where the table never lost them during the edits; positions the
   // edits dropped come back with the starting state.
   const int32_t lowestRows =
@@ -210,6 +208,7 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
   capacity_ = static_cast<int32_t>(cap);
   boundaries_[d] = n;
   resizeRowStates(lowestRows);
+  refreshAppendRange();
 }
 
 int32_t ElementArray::dimIndexOfIndex(int32_t d, int32_t index) const {
@@ -244,6 +243,19 @@ int32_t ElementArray::tableRowCount() const {
 void ElementArray::syncRowStates() {
   const auto target = static_cast<std::size_t>(tableRowCount());
   rowStates.resize(target, autoSelectNewRows == 1 ? RowSelected : RowUnselected);
+  refreshAppendRange();
+}
+
+// An append grows the size to size + 1: it leaves the capacity alone while that is at
+// most half the capacity and at least a quarter, and it touches no row state outside
+// two dimensions.
+void ElementArray::refreshAppendRange() {
+  if (dimensions_ == 2 || !rowStates.empty()) {
+    plainAppendFloor_ = plainAppendLimit_ = 0;
+    return;
+  }
+  plainAppendFloor_ = std::max(0, capacity_ / 4 - 1);
+  plainAppendLimit_ = std::min(capacity_ / 2, kMaxSize - 1);
 }
 
 void ElementArray::resizeRowStates(int32_t keep) {

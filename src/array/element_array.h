@@ -6,9 +6,11 @@
 #include <cstdint>
 #include <span>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "array/element.h"
+#include "array/element_store.h"
 
 namespace quorrel {
 
@@ -38,14 +40,16 @@ class ElementArray {
   bool inRange(int32_t index) const { return index >= 0 && index < size(); }
 
   // Unchecked access to the elements in use, for the query, recordset and file code.
-  std::span<Element> slots() { return elements_; }
-  std::span<const Element> slots() const { return elements_; }
+  std::span<Element> slots() { return elements_.span(); }
+  std::span<const Element> slots() const { return elements_.span(); }
   Element& at(int32_t index) { return elements_[static_cast<std::size_t>(index)]; }
   const Element& at(int32_t index) const { return elements_[static_cast<std::size_t>(index)]; }
 
   // The element's text, valid until the next text read from this array; null outside.
-  const char* getString(int32_t index);
-  int32_t getValue(int32_t index) const;
+  const char* getString(int32_t index) {
+    return inRange(index) ? std::as_const(*this).at(index).asString(scratch_) : nullptr;
+  }
+  int32_t getValue(int32_t index) const { return inRange(index) ? at(index).asValue() : 0; }
   // Raw view of an element: a String's bytes with terminator, a File's bytes; for a
   // Value `bytes` is null and `length` 4 (use getValue). False outside.
   bool getBytes(ByteBlock& out, int32_t index) const;
@@ -65,7 +69,13 @@ class ElementArray {
   void insertElement(const ElementValue& value, int32_t index) { insertAt(value, index); }
 
   void appendString(const char* text) { insertString(text, size()); }
-  void appendValue(int32_t value) { insertValue(value, size()); }
+  void appendValue(int32_t value) {
+    if (size() >= plainAppendFloor_ && size() < plainAppendLimit_) {
+      elements_.pushBackValue(value);
+    } else {
+      insertValue(value, size());
+    }
+  }
   void appendFile(ByteBlock block) { insertFile(block, size()); }
 
   void setKeyString(const char* text, int32_t index);
@@ -118,7 +128,14 @@ class ElementArray {
   int32_t rebalancedCapacity(int32_t capacity, int32_t sizeBefore, int64_t newSize) const;
   void resizeRowStates(int32_t keep);
 
-  std::vector<Element> elements_;
+  // Sizes from which an append neither changes the capacity nor adds a table row, so
+  // that it only stores: kept up to date by every operation that changes the capacity
+  // or the dimension count.
+  void refreshAppendRange();
+  int32_t plainAppendFloor_ = 0;
+  int32_t plainAppendLimit_ = 0;
+
+  ElementStore elements_;
   int32_t capacity_ = kInitialCapacity;
   int32_t dimensions_ = 1;
   int32_t boundaries_[kBoundaryCount] = {-1, 0, 0, 0, 0, 0, 0, 0, 0, 0};

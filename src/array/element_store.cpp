@@ -1,0 +1,126 @@
+#include "array/element_store.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <cstring>
+
+namespace quorrel {
+
+namespace {
+
+constexpr std::size_t kMinimumRoom = 16;
+
+void moveElements(Element* to, const Element* from, std::size_t count) {
+  std::memmove(static_cast<void*>(to), static_cast<const void*>(from), count * sizeof(Element));
+}
+
+}  // namespace
+
+void ElementStore::release() noexcept {
+  if (!onlyPlainWords_) {
+    Element* slots = rawSlots();
+    for (std::size_t i = 0; i < count_; ++i) slots[i].~Element();
+  }
+  std::free(buffer_);
+  buffer_ = nullptr;
+  head_ = count_ = room_ = 0;
+  onlyPlainWords_ = true;
+}
+
+void ElementStore::take(ElementStore& other) noexcept {
+  buffer_ = other.buffer_;
+  head_ = other.head_;
+  count_ = other.count_;
+  room_ = other.room_;
+  onlyPlainWords_ = other.onlyPlainWords_;
+  other.buffer_ = nullptr;
+  other.head_ = other.count_ = other.room_ = 0;
+  other.onlyPlainWords_ = true;
+}
+
+void ElementStore::moveTo(std::size_t head) noexcept {
+  if (head != head_) moveElements(buffer_ + head, buffer_ + head_, count_);
+  head_ = head;
+}
+
+void ElementStore::reserve(std::size_t total) {
+  if (head_ + total <= room_) return;
+  makeRoomAtBack(total);
+}
+
+// Room runs out at the back: reuse a large free front by sliding the elements down,
+// otherwise grow the block by half (realloc keeps the front gap and often avoids the
+// copy for large blocks).
+void ElementStore::makeRoomAtBack(std::size_t total) {
+  if (total <= room_ && head_ >= count_ / 4 + 1) {
+    moveTo(head_ / 2 < room_ - total ? head_ / 2 : room_ - total);
+    return;
+  }
+  const std::size_t grown = head_ + std::max({total, count_ + count_ / 2, kMinimumRoom});
+  void* block = std::realloc(static_cast<void*>(buffer_), grown * sizeof(Element));
+  if (block == nullptr) throw std::bad_alloc();
+  buffer_ = static_cast<Element*>(block);
+  room_ = grown;
+}
+
+// No free slot before the first element: centre the elements in the free room,
+// growing the block first when the room is short.
+void ElementStore::makeRoomAtFront() {
+  if (room_ - count_ < count_ / 4 + 2) {
+    const std::size_t grown = std::max(count_ + count_ / 2 + 2, kMinimumRoom);
+    void* block = std::realloc(static_cast<void*>(buffer_), grown * sizeof(Element));
+    if (block == nullptr) throw std::bad_alloc();
+    buffer_ = static_cast<Element*>(block);
+    room_ = grown;
+  }
+  moveTo((room_ - count_ + 1) / 2);
+}
+
+void ElementStore::growTo(std::size_t total) {
+  if (total <= count_) return;
+  reserve(total);
+  while (count_ < total) {
+    new (rawSlots() + count_) Element();
+    ++count_;
+  }
+}
+
+Element& ElementStore::insertAt(std::size_t index) {
+  if (index >= count_) return pushBack();
+  if (index < count_ - index) {
+    if (head_ == 0) makeRoomAtFront();
+    moveElements(buffer_ + head_ - 1, buffer_ + head_, index);
+    --head_;
+  } else {
+    if (head_ + count_ == room_) makeRoomAtBack(count_ + 1);
+    moveElements(buffer_ + head_ + index + 1, buffer_ + head_ + index, count_ - index);
+  }
+  ++count_;
+  onlyPlainWords_ = false;
+  return *new (buffer_ + head_ + index) Element();
+}
+
+void ElementStore::eraseAt(std::size_t index) {
+  rawSlots()[index].~Element();
+  if (index < count_ - 1 - index) {
+    moveElements(buffer_ + head_ + 1, buffer_ + head_, index);
+    ++head_;
+  } else {
+    moveElements(buffer_ + head_ + index, buffer_ + head_ + index + 1, count_ - 1 - index);
+  }
+  --count_;
+  shrinkIfSparse();
+}
+
+// After many deletions give memory back: a block less than a quarter full halves.
+void ElementStore::shrinkIfSparse() noexcept {
+  if (room_ <= 1024 || count_ >= room_ / 4) return;
+  moveTo(0);
+  const std::size_t smaller = std::max(count_ * 2, kMinimumRoom);
+  void* block = std::realloc(static_cast<void*>(buffer_), smaller * sizeof(Element));
+  if (block == nullptr) return;  // keeping the larger block is fine
+  buffer_ = static_cast<Element*>(block);
+  room_ = smaller;
+}
+
+}  // namespace quorrel
