@@ -1,0 +1,143 @@
+// File scenarios: saving and loading each whole-array format, and reading a whole file,
+// against writing or reading the same number of bytes with one fwrite or fread.
+#include <unistd.h>
+
+#include <cstdio>
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include "array/element_array.h"
+#include "harness.h"
+#include "io/csv_file.h"
+#include "io/element_file.h"
+#include "io/ini_file.h"
+#include "io/native_file.h"
+
+namespace quorrel::bench {
+
+namespace {
+
+std::string scratchPath(const std::string& name) {
+  static const std::filesystem::path dir = [] {
+    auto path = std::filesystem::temp_directory_path() /
+                ("quorrel-bench-" + std::to_string(static_cast<long>(getpid())));
+    std::filesystem::create_directories(path);
+    return path;
+  }();
+  return (dir / name).string();
+}
+
+int64_t fileSize(const std::string& path) {
+  std::error_code error;
+  const auto size = std::filesystem::file_size(path, error);
+  return error ? 0 : static_cast<int64_t>(size);
+}
+
+void writeBytes(const std::string& path, const std::vector<char>& bytes) {
+  std::FILE* file = std::fopen(path.c_str(), "wb");
+  if (file == nullptr) return;
+  std::fwrite(bytes.data(), 1, bytes.size(), file);
+  std::fclose(file);
+}
+
+void readBytes(const std::string& path, std::vector<char>& bytes) {
+  std::FILE* file = std::fopen(path.c_str(), "rb");
+  if (file == nullptr) return;
+  benchmark::DoNotOptimize(std::fread(bytes.data(), 1, bytes.size(), file));
+  std::fclose(file);
+}
+
+using Fill = void (*)(ElementArray&, int64_t);
+using Save = void (*)(ElementArray&, const char*, uint16_t);
+using Load = void (*)(ElementArray&, const char*, int32_t);
+
+// Save and load of one format; the baselines move the bytes of the file the save made.
+void addFormat(const std::string& format, int64_t n, Fill fill, Save save, Load load) {
+  const std::string path = scratchPath(format + ".out");
+  const std::string copy = scratchPath(format + ".copy");
+  const auto ensureFile = [=] {
+    if (fileSize(path) > 0) return;
+    ElementArray array;
+    fill(array, n);
+    save(array, path.c_str(), 0);
+  };
+  add({"save " + format, n, 1, 2.0,
+       [=](benchmark::State& state) {
+         ElementArray array;
+         fill(array, n);
+         for (auto _ : state) save(array, path.c_str(), 0);
+       },
+       [=](benchmark::State& state) {
+         ensureFile();
+         std::vector<char> bytes(static_cast<std::size_t>(fileSize(path)), 'x');
+         for (auto _ : state) writeBytes(copy, bytes);
+       }});
+  add({"load " + format, n, 1, 2.0,
+       [=](benchmark::State& state) {
+         ensureFile();
+         ElementArray array;
+         for (auto _ : state) load(array, path.c_str(), 0);
+         benchmark::DoNotOptimize(array.size());
+       },
+       [=](benchmark::State& state) {
+         ensureFile();
+         std::vector<char> bytes(static_cast<std::size_t>(fileSize(path)));
+         for (auto _ : state) readBytes(path, bytes);
+       }});
+}
+
+void fillMixed(ElementArray& array, int64_t n) {
+  const std::vector<std::string> texts = randomTexts(n / 2 + 1, 8, 16, 31);
+  const std::vector<int32_t> values = randomValues(n / 2 + 1, 32);
+  for (int64_t i = 0; i < n; ++i) {
+    const auto half = static_cast<std::size_t>(i / 2);
+    if (i % 2 == 0) {
+      array.appendString(texts[half].c_str());
+    } else {
+      array.appendValue(values[half]);
+    }
+  }
+}
+
+// A table of 10 columns of 10-letter texts: 111 bytes per CSV line.
+void fillCsvTable(ElementArray& array, int64_t bytes) {
+  array.setDimensions(2);
+  array.setBoundary(1, 10);
+  const int64_t cells = bytes / 111 * 10;
+  for (const std::string& t : randomTexts(cells, 10, 10, 33)) array.appendString(t.c_str());
+}
+
+void fillTexts(ElementArray& array, int64_t n) {
+  for (const std::string& t : randomTexts(n, 8, 16, 34)) array.appendString(t.c_str());
+}
+
+}  // namespace
+
+void registerIoScenarios() {
+  addFormat("native file", scaled(1'000'000), fillMixed, saveNativeFile, loadNativeFile);
+  addFormat("CSV file (bytes)", scaled(100'000'000), fillCsvTable, saveCsvFile, loadCsvFile);
+  addFormat("INI file", scaled(1'000'000), fillTexts, saveIniFile, loadIniFile);
+
+  const int64_t bytes = scaled(100'000'000);
+  const std::string path = scratchPath("whole.bin");
+  add({"readWholeFile (bytes)", bytes, 1, 2.0,
+       [=](benchmark::State& state) {
+         writeBytes(path, std::vector<char>(static_cast<std::size_t>(bytes), 'w'));
+         for (auto _ : state) {
+           auto block = readWholeFile(path.c_str());
+           benchmark::DoNotOptimize(block);
+         }
+       },
+       [=](benchmark::State& state) {
+         std::vector<char> buffer(static_cast<std::size_t>(bytes));
+         for (auto _ : state) readBytes(path, buffer);
+       }});
+}
+
+void removeScratchFiles() {
+  std::error_code error;
+  std::filesystem::remove_all(std::filesystem::path(scratchPath("x")).parent_path(), error);
+}
+
+}  // namespace quorrel::bench
