@@ -26,7 +26,13 @@ set_target_properties(quorrel_module PROPERTIES
 target_sources(quorrel_module PRIVATE ${quorrel_def})
 target_link_options(quorrel_module PRIVATE "LINKER:--kill-at")
 
-# The resource script is added by src/platform/resources.cmake.
+# The resource script (menus, string tables, the setup dialog, bitmaps, data), with
+# the pictures it names as dependencies.
+set(quorrel_rc ${CMAKE_SOURCE_DIR}/resources/quorrel.rc)
+target_sources(quorrel_module PRIVATE ${quorrel_rc})
+file(GLOB quorrel_rc_inputs CONFIGURE_DEPENDS ${CMAKE_SOURCE_DIR}/resources/*.bmp)
+set_property(SOURCE ${quorrel_rc} TARGET_DIRECTORY quorrel_module APPEND PROPERTY
+  OBJECT_DEPENDS ${quorrel_rc_inputs})
 
 # Layout checks compiled for i686, and the Windows test host.
 add_subdirectory(${CMAKE_SOURCE_DIR}/tests/windows ${CMAKE_BINARY_DIR}/tests/windows)
