@@ -164,6 +164,28 @@ TEST_F(CsvFile, TableReadAndWrite) {
   EXPECT_EQ(readBytes(path("w.csv")), "");
 }
 
+TEST_F(CsvFile, TruncatedFileLoadsItsPrefix) {
+  const std::string full = "a,b\r\nc\r\n";
+  const Texts expected[] = {{},
+                            {"a"},
+                            {"a", ""},
+                            {"a", "b"},
+                            {"a", "b"},
+                            {"a", "b"},
+                            {"a", "b", "c", ""},
+                            {"a", "b", "c", ""},
+                            {"a", "b", "c", ""}};
+  ASSERT_EQ(full.size() + 1, std::size(expected));
+  for (size_t n = 0; n <= full.size(); ++n) {
+    SCOPED_TRACE(n);
+    writeBytes(path("t.csv"), full.substr(0, n));
+    ElementArray a;
+    loadCsvFile(a, path("t.csv").c_str(), 0);
+    EXPECT_EQ(textsOf(a), expected[n]);
+    EXPECT_EQ(a.dimensions(), 2);
+  }
+}
+
 TEST_F(CsvFile, ReadTextFileStopsAtAZeroByte) {
   writeBytes(path("z.txt"), std::string("ab\0cd", 5));
   auto text = readTextFile(path("z.txt").c_str());

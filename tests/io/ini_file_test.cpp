@@ -135,6 +135,22 @@ TEST_F(IniFile, AppendAndFailedOpens) {
   }
 }
 
+TEST_F(IniFile, TruncatedFileLoadsItsPrefix) {
+  const std::string full = "[s]\r\nk=v\r\n";
+  for (size_t n = 0; n <= full.size(); ++n) {
+    SCOPED_TRACE(n);
+    writeBytes(path("t.ini"), full.substr(0, n));
+    ElementArray a;
+    loadIniFile(a, path("t.ini").c_str(), 0);
+    // "k" alone (n = 6) is a single character and is skipped.
+    if (n < 7) {
+      EXPECT_EQ(a.size(), 0);
+    } else {
+      EXPECT_EQ(entriesOf(a), (std::vector<Entry>{{S, n == 7 ? "" : "v", "k"}}));
+    }
+  }
+}
+
 TEST_F(IniFile, DocumentWrite) {
   IniDocument doc;
   doc.sections.push_back({"one", {{"k", "v"}, {nullptr, "nokey"}, {"novalue", nullptr}}});
