@@ -244,5 +244,30 @@ TEST(TableLabels, MissingLabelsNeverMatch) {
   EXPECT_EQ(columnOfLabel(a, nullptr), -1);
 }
 
+TEST(TableLabels, AnEmptyLabelIsALabel) {
+  ElementArray a = makeTable(3);
+  setLabel(a, "", 0);
+  setLabel(a, "b", 1);
+  ASSERT_NE(getLabel(a, 0), nullptr);
+  EXPECT_EQ(std::string(getLabel(a, 0)), "");
+  EXPECT_EQ(getLabel(a, 2), nullptr);
+  EXPECT_EQ(columnOfLabel(a, ""), 0);
+  EXPECT_EQ(labelList(a), ",b,");
+  a.searchMode = 1;
+  EXPECT_EQ(columnOfLabel(a, "*"), 0);
+  EXPECT_EQ(columnOfLabel(a, "?"), 1);
+  // Replacing it, and dropping it with its column, leave no trace.
+  setLabel(a, "a", 0);
+  EXPECT_EQ(columnOfLabel(a, "*"), 0);
+  setLabel(a, "", 2);
+  a.setBoundary(1, 2);
+  setLabel(a, "x", 0);
+  a.setBoundary(1, 3);
+  setLabel(a, "y", 0);
+  EXPECT_EQ(getLabel(a, 2), nullptr);
+  a.searchMode = 0;
+  EXPECT_EQ(columnOfLabel(a, ""), -1);
+}
+
 }  // namespace
 }  // namespace quorrel
