@@ -117,6 +117,9 @@ class ElementArray {
   int32_t autoSelectNewRows = 0;
   std::vector<std::string> labels;  // one per column, set through recordset/
   std::vector<uint8_t> rowStates;   // one RowState per table row, always tableRowCount()
+  // Columns whose label is the empty text: an empty entry of `labels` alone is a
+  // column without a label.
+  std::vector<bool> emptyLabels;
 
  private:
   static ElementValue fileOperand(ByteBlock block) {

@@ -156,30 +156,43 @@ void swapRows(ElementArray& array, int32_t a, int32_t b) {
 }
 
 // --- Labels ------------------------------------------------------------------------------
-// An empty vector is "no labels yet"; an empty entry is a column without a label.
+// An empty vector is "no labels yet"; an empty entry is a column without a label unless
+// `emptyLabels` marks it as set to the empty text.
+
+namespace {
+
+bool hasLabel(const ElementArray& array, std::size_t column) {
+  return !array.labels[column].empty() ||
+         (column < array.emptyLabels.size() && array.emptyLabels[column]);
+}
+
+}  // namespace
 
 const char* getLabel(const ElementArray& array, int32_t column) {
   if (!isTable(array) || column < 0) return nullptr;
   if (static_cast<std::size_t>(column) >= array.labels.size()) return nullptr;
-  const std::string& label = array.labels[static_cast<std::size_t>(column)];
-  return label.empty() ? nullptr : label.c_str();
+  const auto j = static_cast<std::size_t>(column);
+  return hasLabel(array, j) ? array.labels[j].c_str() : nullptr;
 }
 
 void setLabel(ElementArray& array, const char* text, int32_t column) {
   if (!isTable(array)) return;
   // The list follows the column count only here, so a change of the X boundary shows
   // in the labels at the next setLabel.
-  array.labels.resize(static_cast<std::size_t>(std::max(numberOfCols(array), 0)));
+  const auto columns = static_cast<std::size_t>(std::max(numberOfCols(array), 0));
+  array.labels.resize(columns);
+  array.emptyLabels.resize(columns);
   if (text == nullptr || column < 0) return;
-  if (static_cast<std::size_t>(column) >= array.labels.size()) return;
-  array.labels[static_cast<std::size_t>(column)] = text;
+  const auto j = static_cast<std::size_t>(column);
+  if (j >= columns) return;
+  array.labels[j] = text;
+  array.emptyLabels[j] = *text == '\0';
 }
 
 int32_t columnOfLabel(const ElementArray& array, const char* name) {
   if (!isTable(array)) return -1;
   for (std::size_t i = 0; i < array.labels.size(); ++i) {
-    const std::string& label = array.labels[i];
-    if (!label.empty() && searchCompare(array, name, label.c_str()) == 0) {
+    if (hasLabel(array, i) && searchCompare(array, name, array.labels[i].c_str()) == 0) {
       return static_cast<int32_t>(i);
     }
   }
