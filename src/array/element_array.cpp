@@ -117,6 +117,14 @@ void ElementArray::clear() {
   syncRowStates();
 }
 
+// --- Settings ------------------------------------------------------------------------
+
+// Out of line: inlined into callers that pass a literal, the assignment trips a false
+// -Wrestrict warning of GCC 12 at -O3.
+void ElementArray::setListDelimiter(const char* text) {
+  delimiterText_ = text == nullptr ? "" : text;
+}
+
 // --- Dimensions ----------------------------------------------------------------------
 
 void ElementArray::setDimensions(int32_t n) {

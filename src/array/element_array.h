@@ -87,7 +87,7 @@ class ElementArray {
   void clear();
 
   // --- Settings ----------------------------------------------------------------------
-  void setListDelimiter(const char* text) { delimiterText_ = text == nullptr ? "" : text; }
+  void setListDelimiter(const char* text);
   const char* listDelimiter() const { return delimiterText_.c_str(); }
   void setAutoSelect(int32_t flag) { autoSelectNewRows = flag != 0 ? 1 : 0; }
 
