@@ -43,7 +43,7 @@ inline void fillSample(ElementArray& array) {
   array.appendValue(-7);
   array.appendString("");
   array.setKeyString("k", 0);
-  array.labels = {"a", ""};
+  array.labels = LabelList{"a", std::nullopt};
 }
 
 }  // namespace quorrel

@@ -22,7 +22,7 @@ ElementArray table() {
   for (const char* cell : {"name", "score", "", "Ann", "120", "x,y"}) a.appendString(cell);
   a.appendValue(-2147483647 - 1);
   a.appendValue(7);
-  a.labels = {"name", "", "note"};
+  a.labels = quorrel::LabelList{"name", std::nullopt, "note"};
   a.setKeyString("first", 0);
   a.setKeyValue(42, 1);
   const char bytes[] = {'a', '\0', 'b', '\r', '\n'};

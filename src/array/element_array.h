@@ -4,6 +4,7 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <span>
 #include <string>
 #include <utility>
@@ -19,6 +20,9 @@ struct ByteBlock {
   const char* bytes = nullptr;
   int32_t length = 0;
 };
+
+// A column's label text per column; an absent entry is a column without a label.
+using LabelList = std::vector<std::optional<std::string>>;
 
 enum RowState : uint8_t { RowUnset = 0, RowSelected = 1, RowUnselected = 2 };
 
@@ -115,11 +119,11 @@ class ElementArray {
   int16_t fileMode = 0;       // 0 create or truncate, 1 append
   int32_t selectionMode = 1;  // 0 AND, 1 OR
   int32_t autoSelectNewRows = 0;
-  std::vector<std::string> labels;  // one per column, set through recordset/
-  std::vector<uint8_t> rowStates;   // one RowState per table row, always tableRowCount()
-  // Columns whose label is the empty text: an empty entry of `labels` alone is a
-  // column without a label.
-  std::vector<bool> emptyLabels;
+  // Column labels, set through recordset/: absent until the first setLabel, then one
+  // entry per column as counted at the last setLabel; an entry is absent for a column
+  // whose label was never set (an empty text is a label).
+  std::optional<LabelList> labels;
+  std::vector<uint8_t> rowStates;  // one RowState per table row, always tableRowCount()
 
  private:
   static ElementValue fileOperand(ByteBlock block) {

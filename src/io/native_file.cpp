@@ -217,9 +217,13 @@ void saveNativeFile(ElementArray& array, const char* path, uint16_t mode) {
     int32_t boundaries[kMaxDimensions];
     for (int32_t d = 0; d < kMaxDimensions; ++d) boundaries[d] = array.boundary(d + 1);
     writeHeader(out, array.dimensions(), boundaries);
-    out.i32(static_cast<int32_t>(array.labels.size()));
-    for (const std::string& label : array.labels) {
-      writeLabel(out, static_cast<int32_t>(label.size()), label.data());
+    // A column without a label text is written with length 0, like an empty label.
+    const std::size_t labelCount = array.labels ? array.labels->size() : 0;
+    out.i32(static_cast<int32_t>(labelCount));
+    for (std::size_t i = 0; i < labelCount; ++i) {
+      const auto& label = (*array.labels)[i];
+      writeLabel(out, label ? static_cast<int32_t>(label->size()) : 0,
+                 label ? label->data() : nullptr);
     }
     out.i32(array.size());
     for (const Element& e : array.slots()) writeRecord(out, recordOf(e));

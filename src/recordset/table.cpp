@@ -101,15 +101,16 @@ std::optional<std::string> columnList(const ElementArray& array, int32_t column)
 }
 
 std::optional<std::string> labelList(const ElementArray& array) {
-  if (!isTable(array) || array.labels.empty()) return std::nullopt;
+  if (!isTable(array) || !array.labels) return std::nullopt;
+  const auto& labels = *array.labels;
   const std::string_view delimiter = array.listDelimiter();
-  std::size_t length = (array.labels.size() - 1) * delimiter.size();
-  for (const std::string& label : array.labels) length += label.size();
+  std::size_t length = labels.empty() ? 0 : (labels.size() - 1) * delimiter.size();
+  for (const auto& label : labels) length += label ? label->size() : 0;
   std::string out;
   out.reserve(length);
-  for (std::size_t i = 0; i < array.labels.size(); ++i) {
+  for (std::size_t i = 0; i < labels.size(); ++i) {
     if (i > 0) out.append(delimiter);
-    out.append(array.labels[i]);
+    if (labels[i]) out.append(*labels[i]);
   }
   return out;
 }
@@ -156,43 +157,31 @@ void swapRows(ElementArray& array, int32_t a, int32_t b) {
 }
 
 // --- Labels ------------------------------------------------------------------------------
-// An empty vector is "no labels yet"; an empty entry is a column without a label unless
-// `emptyLabels` marks it as set to the empty text.
-
-namespace {
-
-bool hasLabel(const ElementArray& array, std::size_t column) {
-  return !array.labels[column].empty() ||
-         (column < array.emptyLabels.size() && array.emptyLabels[column]);
-}
-
-}  // namespace
 
 const char* getLabel(const ElementArray& array, int32_t column) {
-  if (!isTable(array) || column < 0) return nullptr;
-  if (static_cast<std::size_t>(column) >= array.labels.size()) return nullptr;
-  const auto j = static_cast<std::size_t>(column);
-  return hasLabel(array, j) ? array.labels[j].c_str() : nullptr;
+  if (!isTable(array) || column < 0 || !array.labels) return nullptr;
+  if (static_cast<std::size_t>(column) >= array.labels->size()) return nullptr;
+  const auto& label = (*array.labels)[static_cast<std::size_t>(column)];
+  return label ? label->c_str() : nullptr;
 }
 
 void setLabel(ElementArray& array, const char* text, int32_t column) {
   if (!isTable(array)) return;
   // The list follows the column count only here, so a change of the X boundary shows
   // in the labels at the next setLabel.
-  const auto columns = static_cast<std::size_t>(std::max(numberOfCols(array), 0));
-  array.labels.resize(columns);
-  array.emptyLabels.resize(columns);
+  if (!array.labels) array.labels.emplace();
+  array.labels->resize(static_cast<std::size_t>(std::max(numberOfCols(array), 0)));
   if (text == nullptr || column < 0) return;
-  const auto j = static_cast<std::size_t>(column);
-  if (j >= columns) return;
-  array.labels[j] = text;
-  array.emptyLabels[j] = *text == '\0';
+  if (static_cast<std::size_t>(column) >= array.labels->size()) return;
+  (*array.labels)[static_cast<std::size_t>(column)] = text;
 }
 
 int32_t columnOfLabel(const ElementArray& array, const char* name) {
   if (!isTable(array)) return -1;
-  for (std::size_t i = 0; i < array.labels.size(); ++i) {
-    if (hasLabel(array, i) && searchCompare(array, name, array.labels[i].c_str()) == 0) {
+  if (!array.labels) return -1;
+  for (std::size_t i = 0; i < array.labels->size(); ++i) {
+    const auto& label = (*array.labels)[i];
+    if (label && searchCompare(array, name, label->c_str()) == 0) {
       return static_cast<int32_t>(i);
     }
   }

@@ -164,7 +164,7 @@ TEST(Store, ClearKeepsSettingsAndDelimiterTakesAnyText) {
   ElementArray a;
   a.setDimensions(2);
   a.setBoundary(1, 4);
-  a.labels = {"n", "m"};
+  a.labels = LabelList{"n", "m"};
   a.caseMode = 1;
   a.setListDelimiter("");
   EXPECT_STREQ(a.listDelimiter(), "");
@@ -175,7 +175,7 @@ TEST(Store, ClearKeepsSettingsAndDelimiterTakesAnyText) {
   EXPECT_EQ(a.capacity(), 25);
   EXPECT_EQ(a.dimensions(), 2);
   EXPECT_EQ(a.boundary(1), 4);
-  EXPECT_EQ(a.labels.size(), 2u);
+  EXPECT_EQ(a.labels, (LabelList{"n", "m"}));
   EXPECT_EQ(a.caseMode, 1);
   EXPECT_STREQ(a.listDelimiter(), ";:");
   a.setAutoSelect(7);

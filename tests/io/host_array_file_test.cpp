@@ -58,7 +58,7 @@ TEST_F(HostArrayFile, LoadsTextAndNumberCells) {
   writeBytes(path("h.arr"), kExample);
   ElementArray a;
   a.appendString("old");
-  a.labels = {"keep"};
+  a.labels = LabelList{"keep"};
   loadHostArrayFile(a, path("h.arr").c_str(), 0);
   ASSERT_EQ(a.size(), 4);
   EXPECT_EQ(a.dimensions(), 3);
@@ -70,7 +70,7 @@ TEST_F(HostArrayFile, LoadsTextAndNumberCells) {
   EXPECT_EQ(a.at(2).type(), ElementType::None);
   EXPECT_EQ(a.at(3).type(), ElementType::None);
   EXPECT_FALSE(a.at(0).hasKey());
-  EXPECT_EQ(a.labels, std::vector<std::string>{"keep"});
+  EXPECT_EQ(a.labels, LabelList{"keep"});
 
   writeBytes(path("n.arr"), head(2, 2, 1, 1, 1) + le32(7) + le32(0));
   ElementArray n;

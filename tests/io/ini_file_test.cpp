@@ -38,13 +38,13 @@ TEST_F(IniFile, SavesOneSectionWithALinePerElement) {
   ElementArray b;
   b.setDimensions(2);
   b.setBoundary(1, 3);
-  b.labels = {"l"};
+  b.labels = LabelList{"l"};
   b.appendValue(1);
   loadIniFile(b, path("s.ini").c_str(), 0);
   EXPECT_EQ(entriesOf(b), (std::vector<Entry>{{S, "a", "k1"}, {S, "5", ""}}));
   EXPECT_EQ(b.dimensions(), 2);
   EXPECT_EQ(b.boundary(1), 3);
-  EXPECT_EQ(b.labels, std::vector<std::string>{"l"});
+  EXPECT_EQ(b.labels, LabelList{"l"});
 
   ElementArray empty;
   saveIniFile(empty, path("e.ini").c_str(), 1);

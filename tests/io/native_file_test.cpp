@@ -130,7 +130,7 @@ TEST_F(NativeFile, RoundTripsEveryTypeOfElementAndKey) {
 
 TEST_F(NativeFile, LabelsTravelAndLengthZeroLeavesAColumnAlone) {
   ElementArray a = exampleArray();
-  a.labels = {"name", "", "age"};
+  a.labels = LabelList{"name", std::nullopt, "age"};
   saveNativeFile(a, path("l.arr").c_str(), 0);
   const std::string bytes = readBytes(path("l.arr"));
   const std::string labelPart = le32(3) + le32(4) + "name" + le32(0) + le32(3) + "age";
@@ -139,20 +139,20 @@ TEST_F(NativeFile, LabelsTravelAndLengthZeroLeavesAColumnAlone) {
   ElementArray b;
   b.setDimensions(2);
   b.setBoundary(1, 3);
-  b.labels = {"x", "y", "z"};
+  b.labels = LabelList{"x", "y", "z"};
   loadNativeFile(b, path("l.arr").c_str(), 0);
-  EXPECT_EQ(b.labels, (std::vector<std::string>{"name", "y", "age"}));
+  EXPECT_EQ(b.labels, (LabelList{"name", "y", "age"}));
 
   // Labels only apply to a two-dimensional array, within its columns.
   ElementArray c;
   c.setBoundary(1, 3);
   loadNativeFile(c, path("l.arr").c_str(), 1);
-  EXPECT_TRUE(c.labels.empty());
+  EXPECT_FALSE(c.labels.has_value());
   ElementArray d;
   d.setDimensions(2);
   d.setBoundary(1, 2);
   loadNativeFile(d, path("l.arr").c_str(), 1);
-  EXPECT_EQ(d.labels, (std::vector<std::string>{"name", ""}));
+  EXPECT_EQ(d.labels, (LabelList{"name", std::nullopt}));
 }
 
 TEST_F(NativeFile, AppendAddsAtTheEndAndKeepsDimensions) {
@@ -187,7 +187,7 @@ TEST_F(NativeFile, UnusableFilesClearOnReplaceAndChangeNothingOnAppend) {
     a.setDimensions(2);
     a.setBoundary(1, 4);
     a.appendString("keep");
-    a.labels = {"l"};
+    a.labels = LabelList{"l"};
     loadNativeFile(a, file.c_str(), 1);
     EXPECT_EQ(a.size(), 1);
     EXPECT_EQ(a.dimensions(), 2);
@@ -195,7 +195,7 @@ TEST_F(NativeFile, UnusableFilesClearOnReplaceAndChangeNothingOnAppend) {
     EXPECT_EQ(a.size(), 0);
     EXPECT_EQ(a.dimensions(), 0);
     EXPECT_EQ(a.boundaryEntry(1), 4);
-    EXPECT_EQ(a.labels, std::vector<std::string>{"l"});
+    EXPECT_EQ(a.labels, LabelList{"l"});
     EXPECT_FALSE(readNativeFile(file.c_str()).has_value());
   }
 }
@@ -214,7 +214,7 @@ TEST_F(NativeFile, VersionsZeroAndNegativeReadLikeOne) {
 
 TEST_F(NativeFile, ReadAndWriteImageReproduceTheFile) {
   ElementArray a = exampleArray();
-  a.labels = {"p", "", "qq"};
+  a.labels = LabelList{"p", "", "qq"};
   a.appendFile({"\0\1\2", 3});
   a.setKeyFile({"\0", 1}, 2);
   saveNativeFile(a, path("a.arr").c_str(), 0);
@@ -326,7 +326,7 @@ TEST_F(NativeFile, HostileCountsAndSizesAreBoundedByTheFile) {
   ElementArray x;
   loadNativeFile(x, path("x.arr").c_str(), 0);
   EXPECT_EQ(x.boundary(1), INT32_MAX);
-  EXPECT_TRUE(x.labels.empty());
+  EXPECT_FALSE(x.labels.has_value());
 }
 
 TEST_F(NativeFile, SaveToAnUnusablePathWritesNothing) {

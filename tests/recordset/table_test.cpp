@@ -269,5 +269,24 @@ TEST(TableLabels, AnEmptyLabelIsALabel) {
   EXPECT_EQ(columnOfLabel(a, ""), -1);
 }
 
+// The empty text is a label like any other; only a column never labelled has none.
+TEST(TableLabels, EmptyTextIsALabel) {
+  ElementArray a = makeTable(3);
+  EXPECT_FALSE(labelList(a).has_value());
+  setLabel(a, "", 1);
+  ASSERT_NE(getLabel(a, 1), nullptr);
+  EXPECT_STREQ(getLabel(a, 1), "");
+  EXPECT_EQ(getLabel(a, 0), nullptr);
+  EXPECT_EQ(columnOfLabel(a, ""), 1);
+  EXPECT_EQ(labelList(a), ",,");
+
+  // Labels created on a table of no columns exist, empty: their list is the empty text.
+  ElementArray b;
+  b.setDimensions(2);
+  setLabel(b, "x", 0);
+  EXPECT_EQ(labelList(b), "");
+  EXPECT_EQ(columnOfLabel(b, "x"), -1);
+}
+
 }  // namespace
 }  // namespace quorrel
