@@ -28,6 +28,9 @@ struct Scenario {
   double target = 2.0;
   std::function<void(benchmark::State&)> impl;
   std::function<void(benchmark::State&)> base;
+  // Iterations per repetition; 0 lets the library decide. Scenarios that rebuild their
+  // input outside the timed part of every iteration fix a small number.
+  int64_t iterations = 0;
 };
 
 void add(Scenario scenario);

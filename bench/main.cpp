@@ -127,7 +127,11 @@ void add(Scenario scenario) {
                                              state.counters["ops"] = static_cast<double>(ops);
                                            });
     b->Unit(benchmark::kMillisecond);
-    if (quickRun) b->Iterations(1);
+    if (quickRun) {
+      b->Iterations(1);
+    } else if (scenario.iterations > 0) {
+      b->Iterations(scenario.iterations);
+    }
   }
   scenarios().push_back(std::move(scenario));
 }

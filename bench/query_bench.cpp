@@ -150,7 +150,8 @@ void registerSorts(int64_t n) {
            });
            benchmark::DoNotOptimize(order.data());
          }
-       }});
+       },
+       5});
   add({"sortElements by value, random", n, n, 2.0,
        [values](benchmark::State& state) {
          for (auto _ : state) {
@@ -174,7 +175,8 @@ void registerSorts(int64_t n) {
            std::sort(keyed.begin(), keyed.end());
            benchmark::DoNotOptimize(keyed.data());
          }
-       }});
+       },
+       5});
 }
 
 }  // namespace
