@@ -1,0 +1,67 @@
+# Element, key and pair lists, totals, the list delimiter and element sorts.
+new dims=1
+A 9 5
+A 8 "ab"
+A 9 0
+A 8 "c"
+A 8 "it's"
+E 16 ","
+E 17 ","
+E 16 ", "
+E 16 ""
+A 20 "k0" 0
+A 21 7 2
+A 20 "kc" 3
+E 18 ","
+E 19 ","
+E 20 "=" ";"
+E 21 "=" ";"
+E 22
+E 23
+E 24
+E 25
+A 9 -12
+E 23
+E 24
+E 25
+E 51
+A 57 "; "
+E 51
+A 57 ""
+E 51
+# Sorts move keys with their elements; equal texts may swap.
+new dims=1
+A 8 "b"
+A 8 "A"
+A 8 "a"
+A 20 "kb" 0
+A 20 "kA" 1
+A 20 "ka" 2
+A 22
+E 16 ","
+E 18 ","
+A 51
+A 22
+E 16 ","
+A 17
+A 9 3
+A 9 1
+A 9 2
+A 24
+E 16 ","
+A 25
+E 16 ","
+A 17
+A 9 10
+A 9 9
+A 22
+E 16 ","
+A 24
+E 16 ","
+A 23
+E 16 ","
+A 17
+A 9 2147483647
+A 9 1
+E 24
+E 22

@@ -1,0 +1,211 @@
+// Long random sessions through the routine tables, as game logic may drive the module:
+// any action or expression, in any order, with arguments that are often extreme. Each
+// input is a sequence of steps; byte 0 of a step picks what to do. The instances and
+// the private folder are checked after every call (see fuzz_host.h).
+//
+// Bounds, so that a finding is a fault and not legitimate bulk work:
+//  - indexes and boundaries are extreme (-1, INT32_MIN, INT32_MAX, 2147483646, past the
+//    array's cap) or small; a random index is kept only when the array must refuse it.
+//    Sizes that stay under the cap but reach tens of millions of elements are real
+//    work (gigabytes), not faults. The one "large but allowed" boundary is 65536.
+//  - a save that makes the folder's files exceed kMaxFolderBytes ends the input, since
+//    save-then-append-the-file doubles the data with every few input bytes.
+//  - at most kMaxSteps calls per input.
+#include <algorithm>
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "fuzz_host.h"
+#include "fuzz_input.h"
+
+namespace {
+
+using quorrel::ElementArray;
+using quorrel::FuzzInput;
+using namespace quorrel::fuzz;
+namespace abi = quorrel::abi;
+
+constexpr int kMaxSteps = 300;
+constexpr uintmax_t kMaxFolderBytes = 256 << 10;
+
+// An index for an element, row or column of an array of the given size.
+int32_t fuzzIndex(FuzzInput& in, int32_t size) {
+  switch (in.byte() % 12) {
+    case 0:
+      return -1;
+    case 1:
+      return size;
+    case 2:
+      return size - 1;
+    case 3:
+      return size + 1;
+    case 4:
+      return INT32_MAX;
+    case 5:
+      return INT32_MAX - 1;
+    case 6:
+      return INT32_MIN;
+    case 7:
+      return ElementArray::kMaxSize;
+    case 8: {
+      // A random number only where the array must refuse it as an index.
+      const int32_t n = in.int32();
+      return (n >= ElementArray::kMaxSize || n < 0) ? n : n % 64;
+    }
+    default:
+      return in.byte() % 24;
+  }
+}
+
+int32_t fuzzBoundary(FuzzInput& in) {
+  switch (in.byte() % 10) {
+    case 0:
+      return -1;
+    case 1:
+      return INT32_MAX;
+    case 2:
+      return INT32_MIN;
+    case 3:
+      return 65536;
+    case 4:
+      return 1 << 30;
+    default:
+      return in.byte() % 6;
+  }
+}
+
+// A value argument: also a dimension number (-1..12) or a plain number.
+int32_t fuzzNumber(FuzzInput& in, const ElementArray* array) {
+  const int32_t size = array != nullptr ? array->size() : 0;
+  switch (in.byte() % 4) {
+    case 0:
+      return static_cast<int32_t>(in.byte() % 14) - 1;  // dimension numbers
+    case 1:
+      return fuzzBoundary(in);
+    case 2:
+      return in.int32();
+    default:
+      return fuzzIndex(in, size);
+  }
+}
+
+std::string fuzzText(FuzzInput& in) {
+  switch (in.byte() % 12) {
+    case 0:
+      return "";
+    case 1:
+      return ",";
+    case 2:
+      return ";;";
+    case 3:
+      return "*";
+    case 4:
+      return "a?c*";
+    case 5:
+      return std::string(300, 'x');
+    case 6:
+      return "1,2,3";
+    case 7:
+      return "-2147483648";
+    case 8:
+      return "\"q\",\"\"";
+    default:
+      return in.shortText();
+  }
+}
+
+std::string fuzzPath(FuzzInput& in) {
+  static const char* const names[] = {"a.arr", "b.csv", "c.ini", "d.bin", "", "missing/x"};
+  const std::string& folder = FuzzFolder::get().path();
+  const char* name = names[in.byte() % 6];
+  return *name == '\0' ? folder : folder + "/" + name;  // the folder itself as a path
+}
+
+std::vector<unsigned char> fuzzSetup(FuzzInput& in) {
+  std::vector<unsigned char> setup(abi::kSetupRecordSize, 0);
+  using quorrel::host::writeField;
+  writeField<int16_t>(setup.data(), abi::kSetupObjectWidth, static_cast<int16_t>(in.int32()));
+  writeField<int16_t>(setup.data(), abi::kSetupObjectHeight, static_cast<int16_t>(in.int32()));
+  writeField<int32_t>(setup.data(), abi::kSetupDimensionCount,
+                      static_cast<int32_t>(in.byte() % 14) - 1);
+  writeField<int32_t>(setup.data(), abi::kSetupXBoundary, fuzzBoundary(in));
+  writeField<int32_t>(setup.data(), abi::kSetupYBoundary, fuzzBoundary(in));
+  writeField<int32_t>(setup.data(), abi::kSetupCaseSensitive, in.byte() % 3);
+  writeField<int32_t>(setup.data(), abi::kSetupWildcardSearch, in.byte() % 3);
+  writeField<int32_t>(setup.data(), abi::kSetupAutoSelectRows, in.byte() % 3);
+  char* delimiter = reinterpret_cast<char*>(setup.data() + abi::kSetupListDelimiter);
+  if (in.byte() % 8 == 0) {
+    // A field filled to its end without a terminator.
+    std::memset(delimiter, ';', abi::kSetupListDelimiterSize);
+  } else {
+    const std::string text = fuzzText(in);
+    std::memcpy(delimiter, text.data(), std::min(text.size(), abi::kSetupListDelimiterSize - 1));
+  }
+  return setup;
+}
+
+HostArg actionArg(FuzzInput& in, uint16_t type, bool isPath, const ElementArray* array) {
+  HostArg arg;
+  if (type == abi::kActionParamText) {
+    arg.isText = true;
+    arg.text = isPath ? fuzzPath(in) : fuzzText(in);
+  } else if (type == abi::kActionParamNumber) {
+    arg.number = fuzzNumber(in, array);
+  }
+  return arg;
+}
+
+void runAction(FuzzInstance& instance, FuzzInput& in, int code) {
+  const abi::InfoEntry& info = actionInfo(code);
+  const int pathParameter = filePathParameter(code);
+  const HostArg p1 = actionArg(in, info.paramTypes[0], pathParameter == 1, instance.array());
+  const HostArg p2 = actionArg(in, info.paramTypes[1], pathParameter == 2, instance.array());
+  instance.action(code, p1, p2);
+}
+
+void runExpression(FuzzInstance& instance, FuzzInput& in) {
+  const int code = in.byte() % ModuleTables::get().expressionCount;
+  const abi::InfoEntry& info = expressionInfo(code);
+  std::vector<HostArg> params;
+  for (uint16_t type : info.paramTypes) {
+    if (type == 0) break;
+    HostArg arg;
+    arg.isText = type == abi::kExpressionParamText;
+    if (arg.isText) {
+      arg.text = fuzzText(in);
+    } else {
+      arg.number = fuzzNumber(in, instance.array());
+    }
+    params.push_back(std::move(arg));
+  }
+  // The host clears the string bit between calls; an uncleared bit must stay set.
+  const uint16_t flags = (in.byte() % 8 == 0 ? abi::kResultIsString : 0) | 0x0011;
+  instance.expression(code, std::move(params), flags);
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  FuzzFolder& folder = FuzzFolder::get();
+  folder.clear();
+  FuzzInput in(data, size);
+  auto instance = std::make_unique<FuzzInstance>(fuzzSetup(in));
+  for (int step = 0; step < kMaxSteps && !in.empty(); ++step) {
+    const uint8_t what = in.byte();
+    if (what < 8) {
+      instance.reset();
+      instance = std::make_unique<FuzzInstance>(fuzzSetup(in));
+    } else if (what < 140) {
+      const int code = in.byte() % ModuleTables::get().actionCount;
+      runAction(*instance, in, code);
+      if (writesFile(code) && folder.totalBytes() > kMaxFolderBytes) break;
+    } else {
+      runExpression(*instance, in);
+    }
+  }
+  instance.reset();
+  folder.checkWorkingDirectoryUnchanged();
+  return 0;
+}
