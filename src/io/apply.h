@@ -53,12 +53,9 @@ inline void setKeyTextAt(ElementArray& array, const char* data, int32_t held, in
   array.setKeyString(copy.c_str(), index);
 }
 
-// setLabel, except that a column count past kMaxLabelColumns (only a damaged file sets
-// one) leaves the labels alone rather than growing the list to that length.
-inline constexpr int32_t kMaxLabelColumns = 1 << 20;
-
+// setLabel, which leaves the labels of a table past kMaxLabelColumns alone (only a
+// damaged file asks for one that wide).
 inline void applyLabel(ElementArray& array, const std::string& text, int32_t column) {
-  if (array.dimensions() == 2 && array.boundary(1) > kMaxLabelColumns) return;
   setLabel(array, text.c_str(), column);
 }
 

@@ -166,7 +166,7 @@ const char* getLabel(const ElementArray& array, int32_t column) {
 }
 
 void setLabel(ElementArray& array, const char* text, int32_t column) {
-  if (!isTable(array)) return;
+  if (!isTable(array) || numberOfCols(array) > kMaxLabelColumns) return;
   // The list follows the column count only here, so a change of the X boundary shows
   // in the labels at the next setLabel.
   if (!array.labels) array.labels.emplace();

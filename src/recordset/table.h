@@ -64,7 +64,11 @@ void swapRows(ElementArray& array, int32_t a, int32_t b);
 
 // The stored label of column j, owned by the array; null when there is none.
 const char* getLabel(const ElementArray& array, int32_t column);
-// Resizes the label list to the current column count, then stores the label.
+// A table wider than this keeps its labels as they are: a list of one entry per column
+// would take gigabytes for the widest boundaries, which cost nothing while empty.
+inline constexpr int32_t kMaxLabelColumns = 1 << 20;
+// Resizes the label list to the current column count, then stores the label; does
+// nothing on a table wider than kMaxLabelColumns.
 void setLabel(ElementArray& array, const char* text, int32_t column);
 // The first column whose label the name matches (under the case and search modes), or -1.
 int32_t columnOfLabel(const ElementArray& array, const char* name);

@@ -234,6 +234,21 @@ TEST(TableLabels, ListKeepsItsLengthUntilTheNextSetLabel) {
   EXPECT_EQ(columnOfLabel(a, "d"), -1);
 }
 
+TEST(TableLabels, TablesWiderThanTheLabelCapKeepTheirLabels) {
+  ElementArray a = makeTable(2);
+  setLabel(a, "a", 0);
+  a.setBoundary(1, INT32_MAX);
+  setLabel(a, "b", 1);  // would need a list of 2147483647 entries
+  EXPECT_EQ(labelList(a), "a,");
+  a.setBoundary(1, kMaxLabelColumns + 1);
+  setLabel(a, "b", 1);
+  EXPECT_EQ(a.labels->size(), 2u);
+  a.setBoundary(1, kMaxLabelColumns);  // the widest table that still gets its list
+  setLabel(a, "b", 1);
+  EXPECT_EQ(a.labels->size(), static_cast<size_t>(kMaxLabelColumns));
+  EXPECT_EQ(getLabel(a, 1), std::string("b"));
+}
+
 TEST(TableLabels, MissingLabelsNeverMatch) {
   ElementArray a = makeTable(3);
   setLabel(a, "c", 2);
