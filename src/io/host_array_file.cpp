@@ -34,18 +34,22 @@ struct CellText {
 };
 
 // Writes the header, the sizes (0 written and counted as 1) and every cell; textOf(k)
-// gives cell k (length 0 for a cell past the elements).
+// gives cell k (length 0 for a cell past the elements). Nothing when X x Y x Z is past
+// ElementArray::kMaxSize.
 template <class TextOf>
 void writeHostFile(const char* path, uint16_t mode, int32_t x, int32_t y, int32_t z,
                    TextOf&& textOf) {
+  x = atLeastOne(x);
+  y = atLeastOne(y);
+  z = atLeastOne(z);
+  // More cells than any array can hold (a wide boundary, say) would mean gigabytes of
+  // empty cells: such a file is not written at all.
+  if (int64_t{x} * y * z > ElementArray::kMaxSize) return;
   FileHandle file = FileHandle::openForWriting(path, mode);
   if (!file.isOpen()) return;
   BufferedWriter out(file);
   out.text(kHeader);
   out.i32(kVersion);
-  x = atLeastOne(x);
-  y = atLeastOne(y);
-  z = atLeastOne(z);
   out.i32(x);
   out.i32(y);
   out.i32(z);

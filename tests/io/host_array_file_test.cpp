@@ -109,6 +109,25 @@ TEST_F(HostArrayFile, OtherVersionsAndKinds) {
   EXPECT_EQ(a.boundary(1), 2);
 }
 
+TEST_F(HostArrayFile, MoreCellsThanAnArrayHoldsWriteNothing) {
+  ElementArray a;
+  a.setDimensions(3);
+  a.setBoundary(1, INT32_MAX);
+  a.appendString("a");
+  writeBytes(path("wide.arr"), "old");
+  saveHostArrayFile(a, path("wide.arr").c_str(), 0);
+  EXPECT_EQ(readBytes(path("wide.arr")), "old");  // not even truncated
+  a.setBoundary(1, 65536);
+  a.setBoundary(2, 65536);  // 2^32 cells: wraps to 0 in 32 bits
+  saveHostArrayFile(a, path("square.arr").c_str(), 0);
+  EXPECT_FALSE(std::filesystem::exists(path("square.arr")));
+
+  // Wide but within the cap: every empty cell is written, 4 bytes each.
+  a.setBoundary(2, 5);
+  saveHostArrayFile(a, path("wide5.arr").c_str(), 0);
+  EXPECT_EQ(std::filesystem::file_size(path("wide5.arr")), 30u + 4u * 65536 * 5 + 1u);
+}
+
 TEST_F(HostArrayFile, AppendAndFailures) {
   writeBytes(path("h.arr"), kExample);
   ElementArray a;
