@@ -20,6 +20,7 @@ namespace tool = quorrel::tool;
 namespace abi = quorrel::abi;
 
 constexpr int kMaxCalls = 200;
+constexpr int32_t kMaxElements = 65536;
 
 void checkRoundTrip(const std::string& text) {
   if (tool::parseQuoted(tool::quoteText(text)) != text) __builtin_trap();
@@ -60,10 +61,11 @@ bool hostArgs(const tool::Command& command, const abi::InfoEntry& info, uint16_t
 }
 
 // Numbers under the array's cap that would make it materialise millions of elements are
-// legitimate work, not faults: the run skips calls with such numbers.
+// legitimate work, not faults: the run skips calls with such numbers, and stops once
+// the array holds more than kMaxElements (each call can multiply the size by X).
 bool saneNumbers(const tool::Command& command) {
   for (const tool::Argument& arg : command.args) {
-    if (!arg.isText && arg.number > 4096 && arg.number < quorrel::ElementArray::kMaxSize) {
+    if (!arg.isText && arg.number > 1024 && arg.number < quorrel::ElementArray::kMaxSize) {
       return false;
     }
   }
@@ -73,7 +75,7 @@ bool saneNumbers(const tool::Command& command) {
 void run(const tool::Command& command, std::unique_ptr<FuzzInstance>& instance) {
   if (command.kind == tool::CommandKind::New) {
     const tool::SetupFields& s = command.setup;
-    if (s.x > 4096 || s.y > 4096) return;
+    if (s.x > 1024 || s.y > 1024) return;
     instance.reset();
     instance = std::make_unique<FuzzInstance>(setupRecord(s));
     return;
@@ -119,7 +121,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
       if (arg.isText) checkRoundTrip(arg.text);
     }
     checkRoundTrip(command.setup.delimiter);
-    if (command.kind != tool::CommandKind::Empty && calls++ < kMaxCalls) run(command, instance);
+    if (command.kind == tool::CommandKind::Empty || calls++ >= kMaxCalls) continue;
+    run(command, instance);
+    if (instance && instance->array() && instance->array()->size() > kMaxElements) break;
   }
   instance.reset();
   FuzzFolder::get().checkWorkingDirectoryUnchanged();

@@ -3,11 +3,15 @@
 // input is a sequence of steps; byte 0 of a step picks what to do. The instances and
 // the private folder are checked after every call (see fuzz_host.h).
 //
-// Bounds, so that a finding is a fault and not legitimate bulk work:
-//  - indexes and boundaries are extreme (-1, INT32_MIN, INT32_MAX, 2147483646, past the
-//    array's cap) or small; a random index is kept only when the array must refuse it.
-//    Sizes that stay under the cap but reach tens of millions of elements are real
-//    work (gigabytes), not faults. The one "large but allowed" boundary is 65536.
+// Bounds, so that a finding is a fault and not legitimate bulk work. Indexes wrap in 32
+// bits and the array accepts anything under its cap of 67108864 elements, so an
+// allowed index or boundary that is merely large (a row number times a wide X, a
+// resize of many blocks) asks for gigabytes: real work, not a fault. Hence:
+//  - numbers are extreme (-1, INT32_MIN, INT32_MAX, 2147483646, the cap, 1 << 30,
+//    random ones at or past the cap) or small; the one "wide but allowed" boundary is
+//    16, while extreme boundaries stay in.
+//  - an input ends once the array holds more than kMaxElements elements, since each
+//    call can multiply the size by a boundary.
 //  - a save that makes the folder's files exceed kMaxFolderBytes ends the input, since
 //    save-then-append-the-file doubles the data with every few input bytes.
 //  - at most kMaxSteps calls per input.
@@ -29,6 +33,12 @@ namespace abi = quorrel::abi;
 
 constexpr int kMaxSteps = 300;
 constexpr uintmax_t kMaxFolderBytes = 256 << 10;
+constexpr int32_t kMaxElements = 65536;
+
+// A random number only where the array must refuse it as an index.
+int32_t refusedOrSmall(int32_t n) {
+  return (n >= ElementArray::kMaxSize || n < 0) ? n : n % 64;
+}
 
 // An index for an element, row or column of an array of the given size.
 int32_t fuzzIndex(FuzzInput& in, int32_t size) {
@@ -49,11 +59,8 @@ int32_t fuzzIndex(FuzzInput& in, int32_t size) {
       return INT32_MIN;
     case 7:
       return ElementArray::kMaxSize;
-    case 8: {
-      // A random number only where the array must refuse it as an index.
-      const int32_t n = in.int32();
-      return (n >= ElementArray::kMaxSize || n < 0) ? n : n % 64;
-    }
+    case 8:
+      return refusedOrSmall(in.int32());
     default:
       return in.byte() % 24;
   }
@@ -68,7 +75,7 @@ int32_t fuzzBoundary(FuzzInput& in) {
     case 2:
       return INT32_MIN;
     case 3:
-      return 65536;
+      return 16;
     case 4:
       return 1 << 30;
     default:
@@ -85,7 +92,7 @@ int32_t fuzzNumber(FuzzInput& in, const ElementArray* array) {
     case 1:
       return fuzzBoundary(in);
     case 2:
-      return in.int32();
+      return refusedOrSmall(in.int32());
     default:
       return fuzzIndex(in, size);
   }
@@ -201,6 +208,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
       const int code = in.byte() % ModuleTables::get().actionCount;
       runAction(*instance, in, code);
       if (writesFile(code) && folder.totalBytes() > kMaxFolderBytes) break;
+      const ElementArray* array = instance->array();
+      if (array != nullptr && array->size() > kMaxElements) break;
     } else {
       runExpression(*instance, in);
     }
