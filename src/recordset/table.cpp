@@ -120,6 +120,9 @@ std::optional<std::string> labelList(const ElementArray& array) {
 void insertRowFromList(ElementArray& array, const char* list, int32_t n) {
   if (!isTable(array) || n > numberOfRows(array)) return;
   const int32_t columns = numberOfCols(array);
+  // A row goes in whole or not at all: past the array's cap (a table 2147483647 wide)
+  // the inserts would each be refused, after gigabytes of cells and billions of calls.
+  if (int64_t{array.size()} + columns > ElementArray::kMaxSize) return;
   const std::vector<std::string> fields = splitFields(array, list, columns);
   const int32_t base = visibleCellIndex(array, n, 0);
   for (int32_t i = 0; i < columns; ++i) array.insertString(fieldText(fields, i), base + i);

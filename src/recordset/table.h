@@ -54,6 +54,7 @@ std::optional<std::string> labelList(const ElementArray& array);
 
 // Row edits from a list split at the characters of the list delimiter; missing fields
 // become None elements, surplus fields are ignored, every field is stored as a String.
+// A row that would take the array past ElementArray::kMaxSize is not inserted.
 void insertRowFromList(ElementArray& array, const char* list, int32_t n);
 void appendRowFromList(ElementArray& array, const char* list);
 void replaceRowWithList(ElementArray& array, const char* list, int32_t n);

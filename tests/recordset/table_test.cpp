@@ -159,6 +159,21 @@ TEST(TableRows, InsertReplaceAndDeleteByVisibleRow) {
   EXPECT_EQ(a.size(), 8);
 }
 
+TEST(TableRows, RowsPastTheCapAreNotInserted) {
+  ElementArray a = makeTable(INT32_MAX);
+  appendRowFromList(a, "a,b");
+  insertRowFromList(a, "a,b", 0);
+  EXPECT_EQ(a.size(), 0);
+  a.setBoundary(1, ElementArray::kMaxSize);
+  a.appendValue(1);
+  appendRowFromList(a, "x");  // one cell too many
+  EXPECT_EQ(a.size(), 1);
+  a.setBoundary(1, 2);
+  appendRowFromList(a, "x,y");  // the table is one half row: it goes at 0
+  EXPECT_EQ(a.size(), 3);
+  EXPECT_EQ(text(a, 0), "x");
+}
+
 TEST(TableRows, OneDimensionalArrayHasNoTable) {
   ElementArray a;
   a.setBoundary(1, 3);  // refused: dimension 1 is the last one
