@@ -12,6 +12,7 @@
 #include <unistd.h>
 
 #include <cstdint>
+#include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <deque>
@@ -115,10 +116,19 @@ struct HostArg {
   bool isText = false;
   int32_t number = 0;
   std::string text;
+  std::string describe() const {
+    return isText ? "\"" + text.substr(0, 40) + "\"" : std::to_string(number);
+  }
   HostWord word() const {
     return isText ? reinterpret_cast<HostWord>(text.c_str()) : static_cast<HostWord>(number);
   }
 };
+
+// QUORREL_FUZZ_TRACE=1 prints every call, to see what a finding did.
+inline bool tracing() {
+  static const bool on = std::getenv("QUORREL_FUZZ_TRACE") != nullptr;
+  return on;
+}
 
 // One run-time instance with its record and fake run-time header.
 class FuzzInstance {
@@ -147,6 +157,10 @@ class FuzzInstance {
   const ElementArray* array() const { return host::elementArrayOf(record_.data()); }
 
   void action(int code, const HostArg& p1, const HostArg& p2) {
+    if (tracing()) {
+      std::fprintf(stderr, "A %d %s %s (size %d)\n", code, p1.describe().c_str(),
+                   p2.describe().c_str(), array() ? array()->size() : -1);
+    }
     ModuleTables::get().actions[code](record_.data(), p1.word(), p2.word());
     check();
   }
@@ -154,6 +168,7 @@ class FuzzInstance {
   // Calls an expression with the flags the host had before; answers the text result or
   // nothing. A text result must lie in the one buffer allocated for it.
   void expression(int code, std::vector<HostArg> params, uint16_t flagsBefore) {
+    if (tracing()) std::fprintf(stderr, "E %d\n", code);
     params_ = std::move(params);
     next_ = 0;
     buffers_.clear();

@@ -137,6 +137,7 @@ void replaceRowWithList(ElementArray& array, const char* list, int32_t n) {
   const int32_t columns = numberOfCols(array);
   const std::vector<std::string> fields = splitFields(array, list, columns);
   const int32_t base = visibleCellIndex(array, n, 0);
+  if (int64_t{base} + columns > ElementArray::kMaxSize) return;  // as for inserts
   for (int32_t i = 0; i < columns; ++i) array.setString(fieldText(fields, i), base + i);
 }
 
@@ -144,7 +145,10 @@ void deleteRow(ElementArray& array, int32_t n) {
   if (!isTable(array) || n >= numberOfRows(array)) return;
   const int32_t base = visibleCellIndex(array, n, 0);
   // Highest index first, so each delete leaves the lower cells of the row in place.
-  for (int32_t i = numberOfCols(array) - 1; i >= 0; --i) array.deleteAt(base + i);
+  // Cells past the end are not there to delete: a negative n falls back to the row
+  // past the last one, which in a table 2147483647 wide means billions of no-ops.
+  const int32_t last = std::min(numberOfCols(array), array.size() - base) - 1;
+  for (int32_t i = last; i >= 0; --i) array.deleteAt(base + i);
 }
 
 void swapRows(ElementArray& array, int32_t a, int32_t b) {

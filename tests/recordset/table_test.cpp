@@ -172,6 +172,17 @@ TEST(TableRows, RowsPastTheCapAreNotInserted) {
   appendRowFromList(a, "x,y");  // the table is one half row: it goes at 0
   EXPECT_EQ(a.size(), 3);
   EXPECT_EQ(text(a, 0), "x");
+
+  // A negative row falls back to the row past the last complete one, here row 0 at
+  // index 0: in a table too wide for the cap, replace writes nothing, and delete
+  // removes only the cells that are there.
+  ElementArray w = makeTable(INT32_MAX);
+  w.appendString("keep");
+  replaceRowWithList(w, "r", -1);
+  EXPECT_EQ(text(w, 0), "keep");
+  w.appendString("too");
+  deleteRow(w, -1);
+  EXPECT_EQ(w.size(), 0);
 }
 
 TEST(TableRows, OneDimensionalArrayHasNoTable) {
