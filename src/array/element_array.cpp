@@ -219,6 +219,21 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
   refreshAppendRange();
 }
 
+void ElementArray::appendNone(int64_t count) {
+  // Appends past kMaxSize are refused one by one, so only the room below it is used.
+  const int64_t n = std::min<int64_t>(count, int64_t{kMaxSize} - size());
+  if (n <= 0) return;
+  int32_t cap = capacity_;
+  int64_t current = size();
+  for (int64_t i = 0; i < n; ++i, ++current) {
+    cap = rebalancedCapacity(cap, static_cast<int32_t>(current), current + 1);
+  }
+  elements_.growTo(static_cast<std::size_t>(current));
+  capacity_ = cap;
+  syncRowStates();
+  refreshAppendRange();
+}
+
 int32_t ElementArray::dimIndexOfIndex(int32_t d, int32_t index) const {
   if (d < 1 || d > dimensions_) return 0;
   if (d == dimensions_) return divTrunc(index, stride(dimensions_ - 1));

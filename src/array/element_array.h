@@ -81,6 +81,9 @@ class ElementArray {
     }
   }
   void appendFile(ByteBlock block) { insertFile(block, size()); }
+  // The same as `count` appends of a null text, in one step: a file of byteless cells
+  // can declare millions of them.
+  void appendNone(int64_t count);
 
   void setKeyString(const char* text, int32_t index);
   void setKeyValue(int32_t value, int32_t index);

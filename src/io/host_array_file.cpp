@@ -103,7 +103,7 @@ bool parseHost(std::string_view file, Sink& sink) {
       }
     }
   } else if ((kind == 2 || kind == 6) && count <= kMaxByteless) {
-    for (int64_t i = 0; i < count; ++i) sink.text(nullptr, 0);
+    sink.emptyTexts(count);
   }
   return true;
 }
@@ -130,6 +130,9 @@ struct ImageSink {
     r.data = data;
     image.elements.push_back(r);
   }
+  void emptyTexts(int64_t count) {
+    for (int64_t i = 0; i < count; ++i) text(nullptr, 0);
+  }
 };
 
 struct LoadSink {
@@ -148,6 +151,7 @@ struct LoadSink {
   void text(const char* data, int32_t size) {
     io_detail::insertTextAt(array, data, size, array.size());
   }
+  void emptyTexts(int64_t count) { array.appendNone(count); }
 };
 
 }  // namespace

@@ -160,6 +160,33 @@ TEST(Store, KeysTravelWithTheirElementAndDieWithIt) {
   EXPECT_EQ(a.getKeyString(1), nullptr);
 }
 
+// appendNone(n) must leave exactly what n appends of a null text leave: size, capacity
+// (the policy's steps), row states.
+TEST(Store, AppendNoneMatchesSingleAppends) {
+  for (int32_t start : {0, 12, 30, 200}) {
+    for (int64_t n : {1, 2, 13, 100, 1000}) {
+      ElementArray bulk, single;
+      for (ElementArray* a : {&bulk, &single}) {
+        a->setDimensions(2);
+        a->setBoundary(1, 4);
+        a->setAutoSelect(1);
+        for (int32_t i = 0; i < start; ++i) a->appendValue(i + 1);
+        // Deletes leave a sparse array whose next append may shrink the capacity.
+        for (int32_t i = 0; i < start / 2; ++i) a->deleteAt(0);
+      }
+      bulk.appendNone(n);
+      for (int64_t i = 0; i < n; ++i) single.appendString(nullptr);
+      EXPECT_EQ(bulk.size(), single.size());
+      EXPECT_EQ(bulk.capacity(), single.capacity()) << start << " + " << n;
+      EXPECT_EQ(bulk.rowStates, single.rowStates);
+      EXPECT_EQ(bulk.at(bulk.size() - 1).type(), ElementType::None);
+    }
+  }
+  ElementArray capped;
+  capped.appendNone(int64_t{ElementArray::kMaxSize} + 5);
+  EXPECT_EQ(capped.size(), ElementArray::kMaxSize - 1 + 1);
+}
+
 TEST(Store, ClearKeepsSettingsAndDelimiterTakesAnyText) {
   ElementArray a;
   a.setDimensions(2);

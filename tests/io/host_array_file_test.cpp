@@ -128,6 +128,25 @@ TEST_F(HostArrayFile, MoreCellsThanAnArrayHoldsWriteNothing) {
   EXPECT_EQ(std::filesystem::file_size(path("wide5.arr")), 30u + 4u * 65536 * 5 + 1u);
 }
 
+// A 30-byte file may declare up to 16,777,216 byteless cells, and one more reads none.
+TEST_F(HostArrayFile, ByteLessCellsUpToTheLimit) {
+  writeBytes(path("big.arr"), head(1, 4096, 4096, 1, 2));
+  ElementArray a;
+  a.setDimensions(2);
+  a.setBoundary(1, 3);
+  a.appendString("first");
+  loadHostArrayFile(a, path("big.arr").c_str(), 1);
+  ASSERT_EQ(a.size(), 1 + 16777216);
+  EXPECT_STREQ(a.getString(0), "first");
+  EXPECT_EQ(a.at(16777216).type(), ElementType::None);
+  EXPECT_EQ(a.rowStates.size(), static_cast<std::size_t>((1 + 16777216) / 3));
+
+  writeBytes(path("over.arr"), head(1, 4097, 4096, 1, 2));
+  loadHostArrayFile(a, path("over.arr").c_str(), 0);
+  EXPECT_EQ(a.size(), 0);
+  EXPECT_EQ(a.boundary(1), 4097);
+}
+
 TEST_F(HostArrayFile, AppendAndFailures) {
   writeBytes(path("h.arr"), kExample);
   ElementArray a;
