@@ -57,8 +57,6 @@ std::optional<ByteBuffer> readTextFile(const char* path) {
 void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
   array.fileMode = static_cast<int16_t>(mode);
   try {
-    FileHandle file = FileHandle::openForWriting(path, mode);
-    if (!file.isOpen()) return;
     const int64_t size = array.size();
     int64_t columns = size;
     int64_t rows = 1;
@@ -66,6 +64,11 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
       columns = array.boundary(1);
       rows = (size + columns - 1) / columns;
     }
+    // The last row is padded to X cells; past the array's cap (X = 2147483647, say)
+    // that is gigabytes of empty cells, so such a file is not written at all.
+    if (rows * columns > ElementArray::kMaxSize) return;
+    FileHandle file = FileHandle::openForWriting(path, mode);
+    if (!file.isOpen()) return;
     BufferedWriter out(file);
     for (int64_t r = 0; r < rows; ++r) {
       for (int64_t j = 0; j < columns; ++j) {

@@ -64,6 +64,19 @@ TEST_F(CsvFile, SavesOneDimensionAndZeroWidthArraysOnOneLine) {
   EXPECT_EQ(readBytes(path("e2.csv")), "");
 }
 
+TEST_F(CsvFile, RowsWiderThanTheCapWriteNothing) {
+  ElementArray a;
+  a.setDimensions(2);
+  a.setBoundary(1, INT32_MAX);
+  a.appendString("a");
+  writeBytes(path("wide.csv"), "old");
+  saveCsvFile(a, path("wide.csv").c_str(), 0);
+  EXPECT_EQ(readBytes(path("wide.csv")), "old");  // not even truncated
+  a.setBoundary(1, ElementArray::kMaxSize + 1);
+  saveCsvFile(a, path("new.csv").c_str(), 0);
+  EXPECT_FALSE(std::filesystem::exists(path("new.csv")));
+}
+
 TEST_F(CsvFile, CellsAreTakenAsTheyStand) {
   ElementArray a;
   a.appendString("x,y");
