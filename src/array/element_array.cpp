@@ -225,8 +225,18 @@ void ElementArray::appendNone(int64_t count) {
   if (n <= 0) return;
   int32_t cap = capacity_;
   int64_t current = size();
-  for (int64_t i = 0; i < n; ++i, ++current) {
+  const int64_t target = current + n;
+  while (current < target) {
+    // Appends that can neither grow nor shrink the capacity are skipped in one go: up to
+    // half the capacity nothing grows, and no shrink starts while 25 or fewer are in use.
+    const bool shrinks = current > 25 && current + 1 < int64_t{cap} * 25 / 100;
+    const int64_t half = int64_t{cap} * 50 / 100;
+    if (!shrinks && current + 1 <= half) {
+      current = std::min(target, current <= 25 ? std::min<int64_t>(half, 26) : half);
+      continue;
+    }
     cap = rebalancedCapacity(cap, static_cast<int32_t>(current), current + 1);
+    ++current;
   }
   elements_.growTo(static_cast<std::size_t>(current));
   capacity_ = cap;
