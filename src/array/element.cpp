@@ -109,14 +109,28 @@ int32_t Element::textLength() const {
   return 0;
 }
 
-void Element::setKey(const ElementValue& value) {
+ElementValue Element::keyOperand(const ElementValue& value) {
   ElementValue operand = value;
   if (value.type == ElementType::Value) {
     operand.size = 4;
   } else if (value.type == ElementType::String && value.bytes != nullptr) {
-    // The key takes the whole text, whatever size the operand claims.
     operand.size = static_cast<int32_t>(std::strlen(value.bytes) + 1);
   }
+  return operand;
+}
+
+Element Element::keyed(const ElementValue& value, const ElementValue& key) {
+  Element keyElement = of(keyOperand(key));
+  Element e;
+  Record* r = makeRecord(normalised(value), true);
+  *r->key() = std::move(keyElement);
+  r->flags |= kHasKey;
+  e.word_ = recordWord(r);
+  return e;
+}
+
+void Element::setKey(const ElementValue& value) {
+  const ElementValue operand = keyOperand(value);
   if (hasKey()) {
     record()->key()->assign(operand);
     return;

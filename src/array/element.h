@@ -83,6 +83,16 @@ class Element {
   // and the None type all store None. Throws std::bad_alloc and leaves the element
   // unchanged when the copy cannot be made.
   void assign(const ElementValue& value);
+  // A new element holding `value`: the element that assign(value) makes of an empty one.
+  static Element of(const ElementValue& value) {
+    Element e;
+    e.assign(value);
+    return e;
+  }
+  // A new element holding `value` under `key`: the element that assign(value) followed
+  // by setKey(key) makes, built with one record instead of two.
+  static Element keyed(const ElementValue& value, const ElementValue& key);
+
   // assign(ElementValue::ofValue(number)) without the detour.
   void assignValue(int32_t number) {
     if (isRecord()) {
@@ -144,6 +154,9 @@ class Element {
   Record* record() const { return reinterpret_cast<Record*>(static_cast<uintptr_t>(word_)); }
   static uint64_t recordWord(Record* r) { return reinterpret_cast<uintptr_t>(r); }
 
+  // The operand a key stores: a Value is 4 bytes and a text is taken whole, whatever
+  // size the operand claims.
+  static ElementValue keyOperand(const ElementValue& value);
   int32_t recordValue() const;
   const char* numberOrEmptyText(NumberText& scratch) const;
   // A new record holding `value` (already normalised), with a key slot when asked.

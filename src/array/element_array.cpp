@@ -219,13 +219,10 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
   refreshAppendRange();
 }
 
-void ElementArray::appendNone(int64_t count) {
-  // Appends past kMaxSize are refused one by one, so only the room below it is used.
-  const int64_t n = std::min<int64_t>(count, int64_t{kMaxSize} - size());
-  if (n <= 0) return;
+int32_t ElementArray::capacityAfterAppends(int64_t count) const {
   int32_t cap = capacity_;
   int64_t current = size();
-  const int64_t target = current + n;
+  const int64_t target = current + count;
   while (current < target) {
     // Appends that can neither grow nor shrink the capacity are skipped in one go: up to
     // half the capacity nothing grows, and no shrink starts while 25 or fewer are in use.
@@ -238,10 +235,26 @@ void ElementArray::appendNone(int64_t count) {
     cap = rebalancedCapacity(cap, static_cast<int32_t>(current), current + 1);
     ++current;
   }
-  elements_.growTo(static_cast<std::size_t>(current));
+  return cap;
+}
+
+void ElementArray::appendNone(int64_t count) {
+  // Appends past kMaxSize are refused one by one, so only the room below it is used.
+  const int64_t n = std::min<int64_t>(count, int64_t{kMaxSize} - size());
+  if (n <= 0) return;
+  const int32_t cap = capacityAfterAppends(n);
+  elements_.growTo(static_cast<std::size_t>(size() + n));
   capacity_ = cap;
   syncRowStates();
-  refreshAppendRange();
+}
+
+void ElementArray::appendElements(std::span<Element> run) {
+  const int64_t n = std::min<int64_t>(static_cast<int64_t>(run.size()), int64_t{kMaxSize} - size());
+  if (n <= 0) return;
+  const int32_t cap = capacityAfterAppends(n);
+  elements_.appendMoved(run.data(), static_cast<std::size_t>(n));
+  capacity_ = cap;
+  syncRowStates();
 }
 
 int32_t ElementArray::dimIndexOfIndex(int32_t d, int32_t index) const {

@@ -84,6 +84,9 @@ class ElementArray {
   // The same as `count` appends of a null text, in one step: a file of byteless cells
   // can declare millions of them.
   void appendNone(int64_t count);
+  // The same as appending each element in turn (the sources are left empty), in one
+  // step: the loaders hand over their elements in runs.
+  void appendElements(std::span<Element> run);
 
   void setKeyString(const char* text, int32_t index);
   void setKeyValue(int32_t value, int32_t index);
@@ -136,6 +139,8 @@ class ElementArray {
   void insertAt(const ElementValue& value, int32_t index);
   // The capacity that the growth policy reaches for newSize from the current state.
   int32_t rebalancedCapacity(int32_t capacity, int32_t sizeBefore, int64_t newSize) const;
+  // The capacity that `count` single appends reach from the current state.
+  int32_t capacityAfterAppends(int64_t count) const;
   void resizeRowStates(int32_t keep);
 
   // Sizes from which an append neither changes the capacity nor adds a table row, so

@@ -76,13 +76,22 @@ void ElementStore::makeRoomAtFront() {
   moveTo((room_ - count_ + 1) / 2);
 }
 
+// An empty element is the zero word, so a run of them is cleared memory: files of
+// byteless cells can ask for millions.
 void ElementStore::growTo(std::size_t total) {
   if (total <= count_) return;
   reserve(total);
-  while (count_ < total) {
-    new (rawSlots() + count_) Element();
-    ++count_;
-  }
+  std::memset(static_cast<void*>(rawSlots() + count_), 0, (total - count_) * sizeof(Element));
+  count_ = total;
+}
+
+void ElementStore::appendMoved(Element* first, std::size_t count) {
+  if (count == 0) return;
+  reserve(count_ + count);
+  moveElements(rawSlots() + count_, first, count);
+  std::memset(static_cast<void*>(first), 0, count * sizeof(Element));
+  count_ += count;
+  onlyPlainWords_ = false;
 }
 
 Element& ElementStore::insertAt(std::size_t index) {

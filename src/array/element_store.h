@@ -59,6 +59,9 @@ class ElementStore {
     ++count_;
   }
   void pushBack(Element&& element) { pushBack() = std::move(element); }
+  // Moves `count` elements to the back in one step, leaving the sources empty. Throws
+  // std::bad_alloc and changes nothing when the block cannot grow.
+  void appendMoved(Element* first, std::size_t count);
   // Appends empty elements up to `total`.
   void growTo(std::size_t total);
   // Opens an empty element at index (≤ size) and returns it.

@@ -7,6 +7,7 @@
 #include <cstring>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "array/element_array.h"
 #include "recordset/table.h"
@@ -39,19 +40,41 @@ inline void insertTextAt(ElementArray& array, const char* data, int32_t held, in
   array.insertString(copy.c_str(), index);
 }
 
-inline void setKeyTextAt(ElementArray& array, const char* data, int32_t held, int32_t index) {
-  if (data == nullptr) {
-    array.setKeyString(nullptr, index);
-    return;
-  }
+// The String operand of a view's text, as insertString of a zero-terminated copy
+// would store it. A view that ends without a zero byte is copied into `spill`.
+inline ElementValue textOperand(const char* data, int32_t held, std::string& spill) {
+  if (data == nullptr) return {};
   const std::string_view text = textOf({data, static_cast<std::size_t>(held)});
-  if (text.size() < static_cast<std::size_t>(held)) {
-    array.setKeyString(data, index);  // the view carries the text's zero byte
-    return;
+  if (text.size() == static_cast<std::size_t>(held)) {
+    spill.assign(text);
+    data = spill.c_str();
   }
-  const std::string copy(text);
-  array.setKeyString(copy.c_str(), index);
+  return {ElementType::String, 0, data, static_cast<int32_t>(text.size() + 1)};
 }
+
+// Collects loaded elements and appends them in runs, so that the capacity and the
+// row states are brought up to date once per run instead of once per element.
+// flush() before anything else reads the array.
+class AppendRun {
+ public:
+  explicit AppendRun(ElementArray& array) : array_(array) { pending_.reserve(kLength); }
+
+  void add(Element&& element) {
+    pending_.push_back(std::move(element));
+    if (pending_.size() == kLength) flush();
+  }
+  void flush() {
+    array_.appendElements(pending_);
+    pending_.clear();
+  }
+  // The array's size once the pending elements are in.
+  int64_t size() const { return int64_t{array_.size()} + static_cast<int64_t>(pending_.size()); }
+
+ private:
+  static constexpr std::size_t kLength = 4096;
+  ElementArray& array_;
+  std::vector<Element> pending_;
+};
 
 // setLabel, which leaves the labels of a table past kMaxLabelColumns alone (only a
 // damaged file asks for one that wide).

@@ -4,6 +4,7 @@
 #include <new>
 #include <string_view>
 
+#include "io/apply.h"
 #include "io/parsing.h"
 
 namespace quorrel {
@@ -28,19 +29,29 @@ int32_t cellsOfLine(const char* line, std::size_t length) {
   return cells;
 }
 
-// Cuts the line's cells in place (its end must be writable) and hands each to visit;
-// a cell of exactly two double quotes is an empty text.
+// Cuts the line's cells in place (its end must be writable) and hands each to visit
+// with its length; a cell of exactly two double quotes is an empty text.
 template <class Visit>
 void forEachCell(char* line, std::size_t length, Visit&& visit) {
   line[length] = '\0';
-  char* cell = line;
+  std::size_t start = 0;
   for (std::size_t i = 0; i <= length; ++i) {
     if (line[i] != ',' && line[i] != '\0') continue;
     line[i] = '\0';
-    if (std::string_view(cell) == kEmptyCell) cell[0] = '\0';
-    visit(cell);
-    cell = line + i + 1;
+    char* cell = line + start;
+    std::size_t cellLength = i - start;
+    if (std::string_view(cell, cellLength) == kEmptyCell) {
+      cell[0] = '\0';
+      cellLength = 0;
+    }
+    visit(cell, cellLength);
+    start = i + 1;
   }
+}
+
+// appendString of a cut cell (a text file holds no zero bytes before its end).
+Element cellElement(const char* cell, std::size_t length) {
+  return Element::of({ElementType::String, 0, cell, static_cast<int32_t>(length + 1)});
 }
 
 }  // namespace
@@ -105,7 +116,7 @@ std::optional<CsvTable> readCsvFile(const char* path) {
     table.text = std::move(*text);
     io_detail::forEachLine(table.text.data(), table.text.size(), [&](char* line, size_t length) {
       CsvRow& row = table.rows.emplace_back();
-      forEachCell(line, length, [&](const char* cell) { row.cells.push_back(cell); });
+      forEachCell(line, length, [&](const char* cell, std::size_t) { row.cells.push_back(cell); });
     });
     return table;
   } catch (const std::bad_alloc&) {
@@ -126,17 +137,19 @@ void loadCsvFile(ElementArray& array, const char* path, int32_t append) {
     array.setDimensions(2);
     array.setBoundary(1, columns);
     // Past the array's size limit appends change nothing, so the walk stops there.
+    io_detail::AppendRun run(array);
     io_detail::forEachLine(data, size, [&](char* line, size_t length) {
-      if (array.size() >= ElementArray::kMaxSize) return;
+      if (run.size() >= ElementArray::kMaxSize) return;
       int32_t cells = 0;
-      forEachCell(line, length, [&](const char* cell) {
-        array.appendString(cell);
+      forEachCell(line, length, [&](const char* cell, std::size_t cellLength) {
+        run.add(cellElement(cell, cellLength));
         ++cells;
       });
-      for (; cells < columns && array.size() < ElementArray::kMaxSize; ++cells) {
-        array.appendString("");
+      for (; cells < columns && run.size() < ElementArray::kMaxSize; ++cells) {
+        run.add(cellElement("", 0));
       }
     });
+    run.flush();
   } catch (const std::bad_alloc&) {
   }
 }

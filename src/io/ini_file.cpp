@@ -4,6 +4,7 @@
 #include <new>
 #include <string_view>
 
+#include "io/apply.h"
 #include "io/csv_file.h"
 #include "io/parsing.h"
 
@@ -72,12 +73,10 @@ struct DocumentSink {
 };
 
 struct LoadSink {
-  ElementArray& array;
+  io_detail::AppendRun& run;
   void section(const char*) {}
   void entry(const char* key, const char* value) {
-    const int32_t index = array.size();
-    array.appendString(value);
-    array.setKeyString(key, index);
+    run.add(Element::keyed(ElementValue::ofText(value), ElementValue::ofText(key)));
   }
 };
 
@@ -134,8 +133,10 @@ void loadIniFile(ElementArray& array, const char* path, int32_t append) {
     std::optional<ByteBuffer> text = readTextFile(path);
     if (append == 0) array.clear();
     if (!text) return;
-    LoadSink sink{array};
+    io_detail::AppendRun run(array);
+    LoadSink sink{run};
     parseIni(text->data(), text->size(), sink);
+    run.flush();
   } catch (const std::bad_alloc&) {
   }
 }

@@ -154,17 +154,29 @@ struct ImageSink {
   }
 };
 
+// The operand of one half of a record: the value or key that a load stores.
+ElementValue operandOf(uint16_t type, int32_t size, int32_t number, const char* data,
+                       std::string& spill) {
+  if (type == kTypeString) return io_detail::textOperand(data, size, spill);
+  if (type == kTypeValue) return ElementValue::ofValue(number);
+  return ElementValue::ofBytes(data, size);
+}
+
 // Applies the file to the array as it is read, so a load needs no second copy of the
-// file's records; labels wait until every element is in place.
+// file's records; labels wait until every element is in place. Every loaded element
+// has a key, even if only a None one.
 struct LoadSink {
-  LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing) {}
+  LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing), run(target) {}
 
   ElementArray& array;
   bool replace;
+  io_detail::AppendRun run;
   bool headerSeen = false;
   int32_t labelIndex = 0;
   std::vector<std::pair<int32_t, std::string>> pendingLabels;
   std::vector<std::unique_ptr<char[]>> filled;
+  std::string valueSpill;
+  std::string keySpill;
 
   void version(uint16_t) {}
   void expectElements(std::size_t) {}
@@ -181,24 +193,11 @@ struct LoadSink {
         column, std::string(io_detail::textOf({label.text, static_cast<size_t>(label.length)})));
   }
   void element(const ElementRecord& r) {
-    const int32_t index = array.size();
-    if (r.type == kTypeString) {
-      io_detail::insertTextAt(array, r.data, r.size, index);
-    } else if (r.type == kTypeValue) {
-      array.insertValue(r.number, index);
-    } else {
-      array.insertFile({r.data, r.size}, index);
-    }
-    if (r.keyType == kTypeString) {
-      io_detail::setKeyTextAt(array, r.keyData, r.keySize, index);
-    } else if (r.keyType == kTypeValue) {
-      array.setKeyValue(r.keyNumber, index);
-    } else {
-      array.setKeyFile({r.keyData, r.keySize}, index);
-    }
+    run.add(Element::keyed(operandOf(r.type, r.size, r.number, r.data, valueSpill),
+                           operandOf(r.keyType, r.keySize, r.keyNumber, r.keyData, keySpill)));
   }
   const char* zeroFilled(std::string_view held, int32_t size) {
-    filled.clear();  // the previous block is in the array by now
+    filled.clear();  // the previous block is in an element by now
     auto block = std::make_unique<char[]>(static_cast<std::size_t>(size));
     std::copy(held.begin(), held.end(), block.get());
     filled.push_back(std::move(block));
@@ -266,6 +265,7 @@ void loadNativeFile(ElementArray& array, const char* path, int32_t append) {
     if (replace) array.clear();
     LoadSink sink{array, replace};
     if (bytes) parseNative(bytes->view(), sink);
+    sink.run.flush();
     if (replace && !sink.headerSeen) array.setDimensions(0);
     for (const auto& [column, text] : sink.pendingLabels) {
       io_detail::applyLabel(array, text, column);

@@ -3,6 +3,7 @@
 #include <climits>
 #include <cstring>
 #include <string>
+#include <vector>
 
 #include "array/element_array.h"
 
@@ -160,35 +161,59 @@ TEST(Store, KeysTravelWithTheirElementAndDieWithIt) {
   EXPECT_EQ(a.getKeyString(1), nullptr);
 }
 
-// appendNone(n) must leave exactly what n appends of a null text leave: size, capacity
-// (the policy's steps), row states.
-TEST(Store, AppendNoneMatchesSingleAppends) {
+// appendNone(n) and appendElements of n elements must leave exactly what n single
+// appends leave: size, capacity (the policy's steps), row states and the elements.
+TEST(Store, BulkAppendsMatchSingleAppends) {
+  const auto prepare = [](ElementArray& a, int32_t start) {
+    a.setDimensions(2);
+    a.setBoundary(1, 4);
+    a.setAutoSelect(1);
+    for (int32_t i = 0; i < start; ++i) a.appendValue(i + 1);
+    // Deletes leave a sparse array whose next append may shrink the capacity.
+    for (int32_t i = 0; i < start / 2; ++i) a.deleteAt(0);
+    // Down to 20 elements in a large capacity, appends past 25 shrink it again.
+    if (start == 600) {
+      while (a.size() > 20) a.deleteAt(0);
+    }
+  };
   for (int32_t start : {0, 12, 30, 200, 600}) {
     for (int64_t n : {1, 2, 13, 100, 1000}) {
-      ElementArray bulk, single;
-      for (ElementArray* a : {&bulk, &single}) {
-        a->setDimensions(2);
-        a->setBoundary(1, 4);
-        a->setAutoSelect(1);
-        for (int32_t i = 0; i < start; ++i) a->appendValue(i + 1);
-        // Deletes leave a sparse array whose next append may shrink the capacity.
-        for (int32_t i = 0; i < start / 2; ++i) a->deleteAt(0);
-        // Down to 20 elements in a large capacity, appends past 25 shrink it again.
-        if (start == 600) {
-          while (a->size() > 20) a->deleteAt(0);
-        }
-      }
-      bulk.appendNone(n);
+      ElementArray none, run, single, singleKeyed;
+      for (ElementArray* a : {&none, &run, &single, &singleKeyed}) prepare(*a, start);
+      none.appendNone(n);
       for (int64_t i = 0; i < n; ++i) single.appendString(nullptr);
-      EXPECT_EQ(bulk.size(), single.size());
-      EXPECT_EQ(bulk.capacity(), single.capacity()) << start << " + " << n;
-      EXPECT_EQ(bulk.rowStates, single.rowStates);
-      EXPECT_EQ(bulk.at(bulk.size() - 1).type(), ElementType::None);
+      EXPECT_EQ(none.size(), single.size());
+      EXPECT_EQ(none.capacity(), single.capacity()) << start << " + " << n;
+      EXPECT_EQ(none.rowStates, single.rowStates);
+      EXPECT_EQ(none.at(none.size() - 1).type(), ElementType::None);
+
+      std::vector<Element> elements;
+      for (int64_t i = 0; i < n; ++i) {
+        const std::string text = "t" + std::to_string(i);
+        elements.push_back(
+            Element::keyed(ElementValue::ofText(text.c_str()), ElementValue::ofValue(-1)));
+        singleKeyed.appendString(text.c_str());
+        singleKeyed.setKeyValue(-1, singleKeyed.size() - 1);
+      }
+      run.appendElements(elements);
+      EXPECT_EQ(elements.back().type(), ElementType::None);  // moved out
+      ASSERT_EQ(run.size(), singleKeyed.size());
+      EXPECT_EQ(run.capacity(), singleKeyed.capacity()) << start << " + " << n;
+      EXPECT_EQ(run.rowStates, singleKeyed.rowStates);
+      for (int32_t i = 0; i < run.size(); ++i) {
+        EXPECT_STREQ(run.getString(i), singleKeyed.getString(i));
+        EXPECT_EQ(run.getKeyValue(i), singleKeyed.getKeyValue(i));
+      }
     }
   }
   ElementArray capped;
   capped.appendNone(int64_t{ElementArray::kMaxSize} + 5);
-  EXPECT_EQ(capped.size(), ElementArray::kMaxSize - 1 + 1);
+  EXPECT_EQ(capped.size(), ElementArray::kMaxSize);
+  std::vector<Element> more(3);
+  more[0] = Element::of(ElementValue::ofValue(9));
+  capped.appendElements(more);
+  EXPECT_EQ(capped.size(), ElementArray::kMaxSize);
+  EXPECT_EQ(more[0].number(), 9);  // refused, so not taken
 }
 
 TEST(Store, ClearKeepsSettingsAndDelimiterTakesAnyText) {
