@@ -3,7 +3,9 @@
 #include <algorithm>
 #include <cstring>
 
+#include "array/int32.h"
 #include "query/compare.h"
+#include "query/text_probe.h"
 #include "recordset/table.h"
 
 namespace quorrel {
@@ -18,8 +20,10 @@ void applyWhere(ElementArray& array, int32_t column, Test&& passes) {
   if (mode != SelectOr && mode != SelectAnd) return;
   const auto rows = static_cast<int32_t>(array.rowStates.size());
   uint8_t* states = array.rowStates.data();
-  for (int32_t r = 0; r < rows; ++r) {
-    const int32_t index = cellIndex(array, r, column);
+  const int32_t columns = array.boundaryEntry(1);
+  // cellIndex(r, column), stepped one row at a time with the same 32-bit wrap.
+  int32_t index = column;
+  for (int32_t r = 0; r < rows; ++r, index = addWrap(index, columns)) {
     const bool pass = array.inRange(index) && passes(array.at(index));
     if (mode == SelectOr) {
       if (pass) states[r] = RowSelected;
@@ -34,23 +38,20 @@ void applyValueWhere(ElementArray& array, int32_t column, Test&& passes) {
   applyWhere(array, column, [&](const Element& cell) { return passes(cellNumber(cell)); });
 }
 
-bool containsProbe(const ElementArray& array, const char* text, const char* probe) {
-  const auto probeLength = static_cast<int32_t>(std::strlen(probe));
-  const auto textLength = static_cast<int32_t>(std::strlen(text));
-  // Literal mode: a span can only match where its first character does, so most
-  // positions are passed over without a call.
-  const bool literal = !isWildcardSearch(array) && probeLength > 0;
-  const bool folded = !isCaseSensitive(array);
-  const auto head = static_cast<unsigned char>(probe[0]);
-  const unsigned char wanted = folded ? foldByte(head) : head;
-  for (int32_t o = 0; o <= textLength - probeLength; ++o) {
-    if (literal) {
-      const auto c = static_cast<unsigned char>(text[o]);
-      if ((folded ? foldByte(c) : c) != wanted) continue;
-    }
-    if (searchCompareSpan(array, probe, text + o, probeLength) == 0) return true;
+// A cell's text with a bound on its length: a String's stored size (its bytes are
+// readable up to and including that index), else the length of the decimal or empty
+// text.
+struct CellText {
+  const char* text;
+  std::size_t bound;
+};
+
+CellText textOf(const Element& cell, NumberText& scratch) {
+  if (cell.type() == ElementType::String) {
+    return {cell.bytes(), static_cast<std::size_t>(cell.size())};
   }
-  return false;
+  const char* text = cell.asString(scratch);
+  return {text, std::strlen(text)};
 }
 
 }  // namespace
@@ -87,17 +88,20 @@ void startNewWhere(ElementArray& array) {
 }
 
 void selectWhereMatching(ElementArray& array, int32_t column, const char* probe) {
+  const TextProbe prepared(array, probe);
   NumberText scratch;
   applyWhere(array, column, [&](const Element& cell) {
-    return searchCompare(array, probe, cell.asString(scratch)) == 0;
+    const CellText cellText = textOf(cell, scratch);
+    return prepared.matchesWhole(cellText.text, cellText.bound);
   });
 }
 
 void selectWhereContaining(ElementArray& array, int32_t column, const char* probe) {
-  const char* pattern = probe == nullptr ? "" : probe;
+  const TextProbe prepared(array, probe);
   NumberText scratch;
   applyWhere(array, column, [&](const Element& cell) {
-    return containsProbe(array, cell.asString(scratch), pattern);
+    const char* text = cell.asString(scratch);
+    return prepared.occursIn(text, std::strlen(text));
   });
 }
 
