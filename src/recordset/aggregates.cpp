@@ -7,22 +7,30 @@ namespace quorrel {
 
 namespace {
 
-int32_t cellValue(const ElementArray& array, int32_t row, int32_t column) {
-  const int32_t index = cellIndex(array, row, column);
-  return array.inRange(index) ? cellNumber(array.at(index)) : 0;
-}
-
 // Folds the visible rows' values in order: the first value starts the result and every
-// later one is combined into it. No visible row gives 0.
+// later one is combined into it. No visible row gives 0. One tight walk over the states
+// with the cell index stepped a row at a time (the same 32-bit wrap as cellIndex); a
+// cell outside the array reads 0.
 template <typename Combine>
 int32_t foldColumn(const ElementArray& array, int32_t column, Combine&& combine) {
-  bool first = true;
-  int32_t result = 0;
-  forEachVisibleRow(array, [&](int32_t r) {
-    const int32_t v = cellValue(array, r, column);
-    result = first ? v : combine(result, v);
-    first = false;
-  });
+  const auto rows = static_cast<int32_t>(array.rowStates.size());
+  const uint8_t* states = array.rowStates.data();
+  const Element* cells = array.slots().data();
+  const int32_t columns = array.boundaryEntry(1);
+  auto valueAt = [&](int32_t index) {
+    return array.inRange(index) ? cells[static_cast<std::size_t>(index)].asValue() : 0;
+  };
+  int32_t r = 0;
+  int32_t index = column;
+  while (r < rows && states[r] != RowSelected) {
+    ++r;
+    index = addWrap(index, columns);
+  }
+  if (r == rows) return 0;
+  int32_t result = valueAt(index);
+  for (++r, index = addWrap(index, columns); r < rows; ++r, index = addWrap(index, columns)) {
+    if (states[r] == RowSelected) result = combine(result, valueAt(index));
+  }
   return result;
 }
 

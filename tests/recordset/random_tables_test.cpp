@@ -1,0 +1,256 @@
+// Selections and aggregates on many random small tables, against a model of every cell
+// (its text and value, written down when the cell is made) and the plain per-cell
+// comparisons.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <climits>
+#include <cstdint>
+#include <random>
+#include <string>
+#include <vector>
+
+#include "array/element_array.h"
+#include "query/compare.h"
+#include "recordset/aggregates.h"
+#include "recordset/selection.h"
+#include "recordset/table.h"
+
+namespace quorrel {
+namespace {
+
+struct ModelCell {
+  std::string text;
+  int32_t value = 0;
+};
+
+struct RandomTable {
+  ElementArray array;
+  std::vector<ModelCell> cells;
+  int32_t columns = 1;
+};
+
+const std::string kAlphabet = "aAbBzZ@`*?0_\xE1\xC1";
+
+std::string randomWord(std::mt19937& rng, std::size_t maxLength) {
+  std::string s(rng() % (maxLength + 1), ' ');
+  for (char& c : s) c = kAlphabet[rng() % kAlphabet.size()];
+  return s;
+}
+
+// Appends one random cell of every kind the array can hold and records what it reads as.
+void appendRandomCell(std::mt19937& rng, RandomTable& t) {
+  ElementArray& a = t.array;
+  ModelCell cell;
+  switch (rng() % 9) {
+    case 0: {  // a value (0 is stored as None and reads as the empty text)
+      static const int32_t values[] = {0, 1, -1, 7, 12345, -6, INT32_MAX, INT32_MIN, 500};
+      cell.value = values[rng() % 9];
+      cell.text = cell.value == 0 ? "" : std::to_string(cell.value);
+      a.appendValue(cell.value);
+      break;
+    }
+    case 1: {  // a value that lives in a record because it has a key
+      cell.value = static_cast<int32_t>(rng() % 2000) - 1000;
+      cell.text = cell.value == 0 ? "" : std::to_string(cell.value);
+      a.appendValue(cell.value);
+      a.setKeyString("key", a.size() - 1);
+      break;
+    }
+    case 2:  // a text without a leading number
+      cell.text = randomWord(rng, 12);
+      if (!cell.text.empty() && cell.text[0] == '0') cell.text[0] = 'b';
+      a.appendString(cell.text.c_str());
+      break;
+    case 3: {  // a text with a leading number
+      const int n = static_cast<int>(rng() % 100);
+      cell.value = n;
+      cell.text = std::to_string(n) + "a" + randomWord(rng, 4);
+      a.appendString(cell.text.c_str());
+      break;
+    }
+    case 4:  // nothing
+      a.insertElement(ElementValue{}, a.size());
+      break;
+    case 5: {  // file bytes read as the empty text
+      const char bytes[] = "abc";
+      a.appendFile(ByteBlock{bytes, 3});
+      break;
+    }
+    case 6: {  // a text whose stored bytes go on past its zero
+      static const char stored[] = "aB\0zzzz";
+      cell.text = "aB";
+      a.insertElement(ElementValue{ElementType::String, 0, stored, 8}, a.size());
+      break;
+    }
+    case 7: {  // stored bytes without a zero of their own (as from a damaged file)
+      static const char stored[] = "Zab?";
+      cell.text = "Zab?";
+      a.insertElement(ElementValue{ElementType::String, 0, stored, 4}, a.size());
+      break;
+    }
+    default:  // a long text, past the lengths probes are prepared for
+      cell.text = std::string(60 + rng() % 15, 'a') + randomWord(rng, 3);
+      a.appendString(cell.text.c_str());
+      break;
+  }
+  t.cells.push_back(cell);
+}
+
+RandomTable randomTable(std::mt19937& rng) {
+  RandomTable t;
+  t.columns = 1 + static_cast<int32_t>(rng() % 3);
+  t.array.setDimensions(2);
+  t.array.setBoundary(1, t.columns);
+  t.array.setAutoSelect(static_cast<int32_t>(rng() % 2));
+  const auto count = rng() % 14;
+  for (unsigned i = 0; i < count; ++i) appendRandomCell(rng, t);
+  for (uint8_t& state : t.array.rowStates) state = rng() % 2 == 0 ? RowSelected : RowUnselected;
+  return t;
+}
+
+int32_t randomColumn(std::mt19937& rng, int32_t columns) {
+  const int32_t choices[] = {0, 1, columns - 1, columns, columns + 1, -1, INT32_MAX, INT32_MIN};
+  return choices[rng() % 8];
+}
+
+// The cell of table row r, or null when its index falls outside the array.
+const ModelCell* modelCell(const RandomTable& t, int32_t r, int32_t column) {
+  const auto index =
+      static_cast<int32_t>(static_cast<uint32_t>(static_cast<int64_t>(r) * t.columns + column));
+  if (index < 0 || index >= static_cast<int32_t>(t.cells.size())) return nullptr;
+  return &t.cells[static_cast<std::size_t>(index)];
+}
+
+template <typename Test>
+std::vector<uint8_t> expectedStates(const RandomTable& t, int32_t column, Test&& passes) {
+  std::vector<uint8_t> states = t.array.rowStates;
+  for (std::size_t r = 0; r < states.size(); ++r) {
+    const ModelCell* cell = modelCell(t, static_cast<int32_t>(r), column);
+    const bool pass = cell != nullptr && passes(*cell);
+    if (t.array.selectionMode == SelectOr && pass) states[r] = RowSelected;
+    if (t.array.selectionMode == SelectAnd && !pass) states[r] = RowUnselected;
+  }
+  return states;
+}
+
+// The containment test as the plain operations define it.
+bool containsByCompare(const ElementArray& a, const std::string& text, const std::string& probe) {
+  if (text.size() < probe.size()) return false;
+  for (std::size_t o = 0; o + probe.size() <= text.size(); ++o) {
+    if (searchCompareSpan(a, probe.c_str(), text.c_str() + o, static_cast<int32_t>(probe.size())) ==
+        0) {
+      return true;
+    }
+  }
+  return false;
+}
+
+std::string randomProbe(std::mt19937& rng, const RandomTable& t) {
+  if (t.cells.empty() || rng() % 3 == 0) return randomWord(rng, 4);
+  const std::string& text = t.cells[rng() % t.cells.size()].text;
+  std::string probe = text.substr(rng() % (text.size() + 1));
+  probe.resize(std::min<std::size_t>(probe.size(), rng() % 6 == 0 ? 80 : 5));
+  for (char& c : probe) {
+    if (rng() % 4 == 0 && ((c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'))) c ^= 0x20;
+    if (rng() % 10 == 0) c = '*';
+  }
+  return probe;
+}
+
+TEST(RandomTables, TextSelectionsAgreeWithThePlainComparisons) {
+  std::mt19937 rng(99);
+  int passes = 0;
+  int failures = 0;
+  for (int round = 0; round < 20000; ++round) {
+    RandomTable t = randomTable(rng);
+    ElementArray& a = t.array;
+    a.caseMode = static_cast<int16_t>(rng() % 2);
+    a.searchMode = static_cast<int16_t>(rng() % 2);
+    a.selectionMode = static_cast<int32_t>(rng() % 2);
+    const int32_t column = randomColumn(rng, t.columns);
+    const std::string probe = randomProbe(rng, t);
+    const bool missing = rng() % 20 == 0;
+    const char* given = missing ? nullptr : probe.c_str();
+    const std::vector<uint8_t> before = a.rowStates;
+
+    const bool containing = rng() % 2 == 0;
+    std::vector<uint8_t> expected;
+    if (containing) {
+      expected = expectedStates(t, column, [&](const ModelCell& cell) {
+        return containsByCompare(a, cell.text, missing ? std::string() : probe);
+      });
+      selectWhereContaining(a, column, given);
+    } else {
+      expected = expectedStates(t, column, [&](const ModelCell& cell) {
+        return searchCompare(a, given, cell.text.c_str()) == 0;
+      });
+      selectWhereMatching(a, column, given);
+    }
+    ASSERT_EQ(a.rowStates, expected)
+        << "round " << round << (containing ? " containing" : " matching") << " probe «"
+        << (missing ? "(missing)" : probe) << "» column " << column << " case " << a.caseMode
+        << " wildcard " << a.searchMode << " mode " << a.selectionMode;
+    for (std::size_t r = 0; r < before.size(); ++r) {
+      passes += before[r] != expected[r] && expected[r] == RowSelected;
+      failures += before[r] != expected[r] && expected[r] == RowUnselected;
+    }
+  }
+  // Both modes changed many states.
+  EXPECT_GT(passes, 2000);
+  EXPECT_GT(failures, 2000);
+}
+
+TEST(RandomTables, ValueSelectionsAndAggregatesAgreeWithTheModel) {
+  std::mt19937 rng(5);
+  for (int round = 0; round < 20000; ++round) {
+    RandomTable t = randomTable(rng);
+    const int32_t column = randomColumn(rng, t.columns);
+
+    // Aggregates over the visible rows, in row order, a missing cell reading 0.
+    std::vector<int32_t> visible;
+    for (std::size_t r = 0; r < t.array.rowStates.size(); ++r) {
+      if (t.array.rowStates[r] != RowSelected) continue;
+      const ModelCell* cell = modelCell(t, static_cast<int32_t>(r), column);
+      visible.push_back(cell != nullptr ? cell->value : 0);
+    }
+    int32_t max = 0;
+    int32_t min = 0;
+    uint32_t sum = 0;
+    for (std::size_t k = 0; k < visible.size(); ++k) {
+      max = k == 0 || visible[k] > max ? visible[k] : max;
+      min = k == 0 || visible[k] < min ? visible[k] : min;
+      sum += static_cast<uint32_t>(visible[k]);
+    }
+    const auto n = static_cast<int64_t>(visible.size());
+    const int32_t average =
+        n == 0 ? 0 : static_cast<int32_t>(static_cast<int64_t>(static_cast<int32_t>(sum)) / n);
+    ASSERT_EQ(columnMax(t.array, column), max) << "round " << round;
+    ASSERT_EQ(columnMin(t.array, column), min) << "round " << round;
+    ASSERT_EQ(columnSum(t.array, column), static_cast<int32_t>(sum)) << "round " << round;
+    ASSERT_EQ(columnAverage(t.array, column), average) << "round " << round;
+
+    t.array.selectionMode = static_cast<int32_t>(rng() % 2);
+    const int32_t x = static_cast<int32_t>(rng() % 21) - 10;
+    std::vector<uint8_t> expected;
+    switch (rng() % 3) {
+      case 0:
+        expected = expectedStates(t, column, [x](const ModelCell& c) { return c.value == x; });
+        selectWhereEqual(t.array, column, x);
+        break;
+      case 1:
+        expected = expectedStates(t, column, [x](const ModelCell& c) { return c.value > x; });
+        selectWhereGreater(t.array, column, x);
+        break;
+      default:
+        expected = expectedStates(
+            t, column, [x](const ModelCell& c) { return c.value >= x && c.value <= x + 5; });
+        selectBetweenValues(t.array, column, x, x + 5);
+        break;
+    }
+    ASSERT_EQ(t.array.rowStates, expected) << "round " << round << " column " << column;
+  }
+}
+
+}  // namespace
+}  // namespace quorrel
