@@ -77,6 +77,16 @@ class Element {
     return r->type != ElementType::None && r->type != ElementType::Value ? r->payload() : nullptr;
   }
   const Element* key() const { return hasKey() ? record()->key() : nullptr; }
+  // Type, size, number (Value) and bytes (String, File) decoded at once, for readers
+  // that need them all.
+  ElementValue view() const {
+    if (word_ == 0) return {};
+    if (isInlineValue()) return ElementValue::ofValue(inlineNumber());
+    const Record* r = record();
+    if (r->type == ElementType::None) return {};
+    if (r->type == ElementType::Value) return {ElementType::Value, r->number(), nullptr, r->size};
+    return {r->type, 0, r->payload(), r->size};
+  }
   bool hasKey() const { return isRecord() && (record()->flags & kHasKey) != 0; }
 
   // Replaces the value; the key stays. The number 0, a null operand, a size below 1

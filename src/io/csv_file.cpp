@@ -2,7 +2,9 @@
 
 #include <cstring>
 #include <new>
+#include <span>
 #include <string_view>
+#include <utility>
 
 #include "io/apply.h"
 #include "io/parsing.h"
@@ -15,12 +17,17 @@ constexpr std::string_view kEmptyCell = "\"\"";
 constexpr std::string_view kLineEnd = "\r\n";
 
 void writeCell(BufferedWriter& out, int32_t column, const char* text) {
-  if (column > 0) out.text(",");
-  if (text != nullptr && text[0] != '\0') {
-    out.text(text);
-  } else {
-    out.text(kEmptyCell);
+  const std::string_view cell =
+      text != nullptr && text[0] != '\0' ? std::string_view(text) : kEmptyCell;
+  const std::size_t total = cell.size() + (column > 0 ? 1 : 0);
+  if (char* p = out.room(total)) {
+    if (column > 0) *p++ = ',';
+    std::memcpy(p, cell.data(), cell.size());
+    out.commit(total);
+    return;
   }
+  if (column > 0) out.text(",");
+  out.text(cell);
 }
 
 int32_t cellsOfLine(const char* line, std::size_t length) {
@@ -81,11 +88,13 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
     FileHandle file = FileHandle::openForWriting(path, mode);
     if (!file.isOpen()) return;
     BufferedWriter out(file);
+    const std::span<const Element> cells = std::as_const(array).slots();
+    NumberText scratch;
     for (int64_t r = 0; r < rows; ++r) {
       for (int64_t j = 0; j < columns; ++j) {
-        const int64_t index = r * columns + j;
+        const auto index = static_cast<std::size_t>(r * columns + j);
         writeCell(out, static_cast<int32_t>(j),
-                  index < size ? array.getString(static_cast<int32_t>(index)) : nullptr);
+                  index < cells.size() ? cells[index].asString(scratch) : nullptr);
       }
       out.text(kLineEnd);
     }

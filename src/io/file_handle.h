@@ -102,16 +102,40 @@ class BufferedWriter {
   }
   void text(std::string_view s) { bytes(s.data(), s.size()); }
   void u16(uint16_t v) {
-    const char le[2] = {static_cast<char>(v & 0xFF), static_cast<char>(v >> 8)};
+    char le[2];
+    putLE16(le, v);
     bytes(le, 2);
   }
   void i32(int32_t v) {
-    const auto u = static_cast<uint32_t>(v);
-    const char le[4] = {static_cast<char>(u & 0xFF), static_cast<char>((u >> 8) & 0xFF),
-                        static_cast<char>((u >> 16) & 0xFF), static_cast<char>(u >> 24)};
+    char le[4];
+    putLE32(le, static_cast<uint32_t>(v));
     bytes(le, 4);
   }
+  // Room for `count` bytes to be written in place and then kept with commit(count):
+  // small records go into the buffer without a bounds check per field. Null when
+  // `count` is more than the buffer holds; use bytes() then.
+  char* room(std::size_t count) {
+    if (count > kCapacity - used_) {
+      flush();
+      if (count > kCapacity) return nullptr;
+    }
+    return buffer_.get() + used_;
+  }
+  void commit(std::size_t count) { used_ += count; }
   void flush();
+
+  static char* putLE16(char* p, uint16_t v) {
+    p[0] = static_cast<char>(v & 0xFF);
+    p[1] = static_cast<char>(v >> 8);
+    return p + 2;
+  }
+  static char* putLE32(char* p, uint32_t v) {
+    p[0] = static_cast<char>(v & 0xFF);
+    p[1] = static_cast<char>((v >> 8) & 0xFF);
+    p[2] = static_cast<char>((v >> 16) & 0xFF);
+    p[3] = static_cast<char>(v >> 24);
+    return p + 4;
+  }
 
  private:
   void bytesSlow(const char* data, std::size_t count);

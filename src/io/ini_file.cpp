@@ -22,9 +22,21 @@ void writeSectionLine(BufferedWriter& out, const char* name) {
 }
 
 void writeEntry(BufferedWriter& out, const char* key, const char* value) {
-  if (key != nullptr) out.text(key);
+  const std::string_view k = key != nullptr ? key : "";
+  const std::string_view v = value != nullptr ? value : "";
+  const std::size_t total = k.size() + 1 + v.size() + kLineEnd.size();
+  if (char* p = out.room(total)) {
+    std::memcpy(p, k.data(), k.size());
+    p += k.size();
+    *p++ = '=';
+    std::memcpy(p, v.data(), v.size());
+    std::memcpy(p + v.size(), kLineEnd.data(), kLineEnd.size());
+    out.commit(total);
+    return;
+  }
+  out.text(k);
   out.text("=");
-  if (value != nullptr) out.text(value);
+  out.text(v);
   out.text(kLineEnd);
 }
 

@@ -1,6 +1,7 @@
 #include "io/native_file.h"
 
 #include <algorithm>
+#include <cstring>
 #include <new>
 #include <string>
 #include <string_view>
@@ -33,37 +34,59 @@ void writeLabel(BufferedWriter& out, int32_t length, const char* text) {
   if (length > 0 && text != nullptr) out.bytes(text, static_cast<std::size_t>(length));
 }
 
-// A Value's data is its 4-byte number whatever the size says; other data is `size` bytes.
-void writeHalf(BufferedWriter& out, uint16_t type, int32_t size, int32_t number, const char* data) {
-  out.u16(type);
-  out.i32(size);
-  if (type == kTypeValue) {
-    out.i32(number);
-  } else if (size > 0 && data != nullptr) {
-    out.bytes(data, static_cast<std::size_t>(size));
+// One half of an element record as written: a type code (any, for images that carry
+// unknown ones), a size and the data.
+struct Half {
+  uint16_t type = 0;
+  int32_t size = 0;
+  int32_t number = 0;
+  const char* data = nullptr;
+};
+
+// A Value's data is its 4-byte number whatever the size says; other data is `size`
+// bytes, none when there are none to write.
+std::size_t dataLength(const Half& h) {
+  if (h.type == kTypeValue) return 4;
+  return h.size > 0 && h.data != nullptr ? static_cast<std::size_t>(h.size) : 0;
+}
+
+char* putHalf(char* p, const Half& h, std::size_t length) {
+  p = BufferedWriter::putLE16(p, h.type);
+  p = BufferedWriter::putLE32(p, static_cast<uint32_t>(h.size));
+  if (h.type == kTypeValue) return BufferedWriter::putLE32(p, static_cast<uint32_t>(h.number));
+  if (length > 0) std::memcpy(p, h.data, length);
+  return p + length;
+}
+
+void writeRecord(BufferedWriter& out, const Half& value, const Half& key) {
+  const std::size_t valueLength = dataLength(value);
+  const std::size_t keyLength = dataLength(key);
+  const std::size_t total = 12 + valueLength + keyLength;
+  if (char* p = out.room(total)) {
+    putHalf(putHalf(p, value, valueLength), key, keyLength);
+    out.commit(total);
+    return;
+  }
+  for (const Half* h : {&value, &key}) {
+    out.u16(h->type);
+    out.i32(h->size);
+    if (h->type == kTypeValue) {
+      out.i32(h->number);
+    } else {
+      out.bytes(h->data, dataLength(*h));
+    }
   }
 }
 
 void writeRecord(BufferedWriter& out, const ElementRecord& r) {
-  writeHalf(out, r.type, r.size, r.number, r.data);
-  writeHalf(out, r.keyType, r.keySize, r.keyNumber, r.keyData);
+  writeRecord(out, {r.type, r.size, r.number, r.data},
+              {r.keyType, r.keySize, r.keyNumber, r.keyData});
 }
 
-// The record of an element as views into the element itself: saving streams the
-// array without copying its bytes.
-ElementRecord recordOf(const Element& e) {
-  ElementRecord r;
-  r.type = static_cast<uint16_t>(e.type());
-  r.size = e.size();
-  r.number = e.number();
-  r.data = e.bytes();
-  if (const Element* key = e.key()) {
-    r.keyType = static_cast<uint16_t>(key->type());
-    r.keySize = key->size();
-    r.keyNumber = key->number();
-    r.keyData = key->bytes();
-  }
-  return r;
+Half halfOf(const Element* e) {
+  if (e == nullptr) return {};
+  const ElementValue v = e->view();
+  return {static_cast<uint16_t>(v.type), v.size, v.number, v.bytes};
 }
 
 // --- Reading -------------------------------------------------------------------------
@@ -225,7 +248,7 @@ void saveNativeFile(ElementArray& array, const char* path, uint16_t mode) {
                  label ? label->data() : nullptr);
     }
     out.i32(array.size());
-    for (const Element& e : array.slots()) writeRecord(out, recordOf(e));
+    for (const Element& e : array.slots()) writeRecord(out, halfOf(&e), halfOf(e.key()));
   } catch (const std::bad_alloc&) {
   }
 }
