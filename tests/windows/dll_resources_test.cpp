@@ -9,6 +9,7 @@
 #include <set>
 #include <sstream>
 
+#include "editor/expectations.h"
 #include "windows/dll_image.h"
 #include "windows/rc_script.h"
 
@@ -236,66 +237,7 @@ TEST(DllResources, ActionDisplayStrings) {
 }
 
 TEST(DllResources, ExpressionNames) {
-  const char* const names[60] = {"size(",
-                                 "capacity(",
-                                 "get$(",
-                                 "get(",
-                                 "key$(",
-                                 "key(",
-                                 "indexOfKeyStr(",
-                                 "indexOfKeyVal(",
-                                 "keyStr$(",
-                                 "keyStr(",
-                                 "keyVal$(",
-                                 "keyVal(",
-                                 "findStr(",
-                                 "findVal(",
-                                 "containsStr(",
-                                 "containsVal(",
-                                 "list$(",
-                                 "quotedList$(",
-                                 "keyList$(",
-                                 "keyQuotedList$(",
-                                 "pairList$(",
-                                 "pairQuotedList$(",
-                                 "max(",
-                                 "min(",
-                                 "sum(",
-                                 "avg(",
-                                 "dim(",
-                                 "boundary(",
-                                 "boundaryX(",
-                                 "boundaryY(",
-                                 "boundaryZ(",
-                                 "boundaryCol(",
-                                 "boundaryRow(",
-                                 "boundaryPage(",
-                                 "dimIndexOfIndex$(",
-                                 "XOfIndex(",
-                                 "YOfIndex(",
-                                 "ZOfIndex(",
-                                 "indexOfDimIndex(",
-                                 "indexOfXY(",
-                                 "numberOfRows(",
-                                 "rowList$(",
-                                 "numberOfCols(",
-                                 "getLabel$(",
-                                 "labelList$(",
-                                 "getCol(",
-                                 "columnList$(",
-                                 "getFromColumnRow(",
-                                 "getFromColumnRow$(",
-                                 "getFromLabelRow(",
-                                 "getFromLabelRow$(",
-                                 "delimiter$(",
-                                 "colMax(",
-                                 "colMin(",
-                                 "colSum(",
-                                 "colAvg(",
-                                 "labMax(",
-                                 "labMin(",
-                                 "labSum(",
-                                 "labAvg("};
+  const auto& names = editor_test::kExpressionNames;
   const auto strings = dllStrings();
   for (uint32_t code = 0; code < 60; ++code) {
     ASSERT_TRUE(strings.count(28400 + code)) << code;
