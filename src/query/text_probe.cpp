@@ -1,5 +1,6 @@
 #include "query/text_probe.h"
 
+#include <bit>
 #include <cstring>
 #include <string_view>
 
@@ -10,16 +11,19 @@ namespace quorrel {
 
 namespace {
 
-uint64_t loadWord(const unsigned char* bytes) {
-  uint64_t word;
-  std::memcpy(&word, bytes, sizeof word);
-  return word;
-}
-
 uint16_t loadPair(const unsigned char* bytes) {
   uint16_t pair;
   std::memcpy(&pair, bytes, sizeof pair);
   return pair;
+}
+
+// The index of the lowest-addressed non-zero byte of a non-zero word.
+std::size_t firstNonZeroByte(uint64_t word) {
+  if constexpr (std::endian::native == std::endian::little) {
+    return static_cast<std::size_t>(std::countr_zero(word)) / 8;
+  } else {
+    return static_cast<std::size_t>(std::countl_zero(word)) / 8;
+  }
 }
 
 }  // namespace
@@ -37,34 +41,19 @@ TextProbe::TextProbe(const ElementArray& array, const char* probe)
     needle_[i] = caseSensitive_ ? c : foldByte(c);
     mask_[i] = !caseSensitive_ && needle_[i] >= 'a' && needle_[i] <= 'z' ? 0x20 : 0;
   }
-  prepared_ = !wildcard_ && length_ <= kPreparedLength;
+  wholeNeedle_ = length_ <= kPreparedLength;
+  prepared_ = !wildcard_ && wholeNeedle_;
   const auto head = static_cast<unsigned char>(probe[0]);
   literalHead_ = length_ > 0 && (!wildcard_ || (head != '*' && head != '?'));
 }
 
-bool TextProbe::sameAt(const unsigned char* text, std::size_t from, std::size_t to) const {
-  std::size_t i = from;
-  for (; i + 8 <= to; i += 8) {
-    if (((loadWord(text + i) ^ loadWord(needle_ + i)) & ~loadWord(mask_ + i)) != 0) return false;
-  }
-  for (; i < to; ++i) {
-    if (((text[i] ^ needle_[i]) & ~mask_[i] & 0xFF) != 0) return false;
-  }
-  return true;
-}
-
-bool TextProbe::matchesWhole(const char* text, std::size_t bound) const {
+bool TextProbe::matchesWholePlain(const char* text) const {
   if (probe_ == nullptr) return false;
   if (wildcard_) {
     return textops::matchViews(std::string_view(probe_, length_), std::string_view(text),
                                caseSensitive_);
   }
-  if (!prepared_) return compareText(array_, probe_, text) == 0;
-  // Equal texts have equal lengths, and the text is no longer than its bound; the
-  // needle's zero then checks the text ends where the probe does.
-  if (bound < length_) return false;
-  const auto* t = reinterpret_cast<const unsigned char*>(text);
-  return firstMatches(t[0]) && sameAt(t, 1, length_ + 1);
+  return compareText(array_, probe_, text) == 0;
 }
 
 bool TextProbe::occursIn(const char* text, std::size_t length) const {
@@ -107,6 +96,42 @@ bool TextProbe::occursPrepared(const unsigned char* text, std::size_t last) cons
     if (sameAt(text + o, 2, length_)) return true;
   }
   return false;
+}
+
+// 'A'..'Z' to 'a'..'z' in each byte of the word when case insensitive: a byte below
+// 0x80 whose low seven bits lie from 'A' to 'Z' gets the case bit.
+uint64_t TextProbe::foldWord(uint64_t word) const {
+  if (caseSensitive_) return word;
+  constexpr uint64_t kOnes = 0x0101010101010101u;
+  constexpr uint64_t kHigh = kOnes * 0x80;
+  const uint64_t low = word & ~kHigh;
+  const uint64_t atLeastA = low + kOnes * (0x80 - 'A');
+  const uint64_t pastZ = low + kOnes * (0x80 - 'Z' - 1);
+  const uint64_t upper = atLeastA & ~pastZ & ~word & kHigh;
+  return word | (upper >> 2);
+}
+
+int32_t TextProbe::compareTo(const char* text, std::size_t bound) const {
+  if (probe_ == nullptr) return -1;
+  if (!wholeNeedle_) return compareText(array_, probe_, text);
+  // Up to and including the probe's zero: the first difference decides, and the
+  // text's own zero differs from every probe character before the probe's end, so
+  // nothing past it is ever compared (words are only read up to the bound).
+  const auto* t = reinterpret_cast<const unsigned char*>(text);
+  const std::size_t end = length_ + 1;
+  std::size_t i = 0;
+  for (; i + 8 <= end && i + 8 <= bound + 1; i += 8) {
+    const uint64_t diff = foldWord(loadWord(t + i)) ^ loadWord(needle_ + i);
+    if (diff != 0) {
+      i += firstNonZeroByte(diff);
+      break;
+    }
+  }
+  for (; i < end; ++i) {
+    const unsigned char c = caseSensitive_ ? t[i] : foldByte(t[i]);
+    if (c != needle_[i]) return needle_[i] < c ? -1 : 1;
+  }
+  return 0;
 }
 
 }  // namespace quorrel

@@ -130,10 +130,13 @@ void selectWhereLessOrEqual(ElementArray& array, int32_t column, int32_t x) {
 }
 
 void selectBetweenStrings(ElementArray& array, int32_t column, const char* low, const char* high) {
+  const TextProbe lowest(array, low);
+  const TextProbe highest(array, high);
   NumberText scratch;
   applyWhere(array, column, [&](const Element& cell) {
-    const char* text = cell.asString(scratch);
-    return compareText(array, low, text) <= 0 && compareText(array, high, text) >= 0;
+    const CellText cellText = textOf(cell, scratch);
+    return lowest.compareTo(cellText.text, cellText.bound) <= 0 &&
+           highest.compareTo(cellText.text, cellText.bound) >= 0;
   });
 }
 

@@ -83,13 +83,44 @@ std::string probeFor(std::mt19937& rng, const std::string& text, std::size_t max
   std::string piece = text.substr(from, rng() % (maxLength + 1));
   for (char& c : piece) {
     if (rng() % 4 == 0 && ((c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'))) c ^= 0x20;
+    // The case bit of a character that is not a letter makes a different character.
+    if (rng() % 12 == 0) c ^= 0x20;
     if (rng() % 8 == 0) c = '?';
   }
   return piece;
 }
 
-void expectAgreement(const std::string& probe, const std::string& text, int& wholeHits,
-                     int& occursHits) {
+// The literal order of folded texts: unsigned bytes, a text that ends first is smaller.
+int modelOrder(const std::string& probe, const std::string& text, bool caseSensitive) {
+  const std::string p = fold(probe, caseSensitive);
+  const std::string t = fold(text, caseSensitive);
+  for (std::size_t i = 0; i < p.size() && i < t.size(); ++i) {
+    const auto a = static_cast<unsigned char>(p[i]);
+    const auto b = static_cast<unsigned char>(t[i]);
+    if (a != b) return a < b ? -1 : 1;
+  }
+  return p.size() < t.size() ? -1 : p.size() > t.size() ? 1 : 0;
+}
+
+int sign(int32_t v) {
+  return (v > 0) - (v < 0);
+}
+
+struct Hits {
+  int whole = 0;
+  int occurs = 0;
+  int below = 0;
+  int above = 0;
+};
+
+// Checks every mode. The text is stored with up to eight bytes after its zero, as a
+// String element may be, and the bound covers them.
+void expectAgreement(std::mt19937& rng, const std::string& probe, const std::string& text,
+                     Hits& hits) {
+  std::string stored = text + '\0';
+  const std::size_t extra = rng() % 9;
+  for (std::size_t i = 0; i < extra; ++i) stored += kAlphabet[rng() % kAlphabet.size()];
+  const std::size_t bound = text.size() + extra;
   for (int mode = 0; mode < 4; ++mode) {
     const bool wildcard = (mode & 1) != 0;
     const bool caseSensitive = (mode & 2) != 0;
@@ -97,45 +128,53 @@ void expectAgreement(const std::string& probe, const std::string& text, int& who
     const TextProbe prepared(a, probe.c_str());
     const bool whole = modelWhole(probe, text, wildcard, caseSensitive);
     const bool occurs = modelOccurs(probe, text, wildcard, caseSensitive);
-    wholeHits += whole;
-    occursHits += occurs;
-    ASSERT_EQ(prepared.matchesWhole(text.c_str(), text.size()), whole)
+    const int order = modelOrder(probe, text, caseSensitive);
+    hits.whole += whole;
+    hits.occurs += occurs;
+    hits.below += order < 0;
+    hits.above += order > 0;
+    ASSERT_EQ(prepared.matchesWhole(stored.c_str(), bound), whole)
         << "probe «" << probe << "» text «" << text << "» mode " << mode;
     ASSERT_EQ(searchCompare(a, probe.c_str(), text.c_str()) == 0, whole);
     ASSERT_EQ(prepared.occursIn(text.c_str(), text.size()), occurs)
         << "probe «" << probe << "» text «" << text << "» mode " << mode;
+    ASSERT_EQ(sign(prepared.compareTo(stored.c_str(), bound)), order)
+        << "probe «" << probe << "» text «" << text << "» mode " << mode;
+    ASSERT_EQ(sign(compareText(a, probe.c_str(), text.c_str())), order);
   }
 }
 
 TEST(TextProbe, AgreesWithAPlainModelOnRandomShortTexts) {
   std::mt19937 rng(2024);
-  int wholeHits = 0;
-  int occursHits = 0;
+  Hits hits;
   for (int round = 0; round < 30000; ++round) {
     const std::string text = randomText(rng, 20);
     const std::string probe = probeFor(rng, text, 11);
-    expectAgreement(probe, text, wholeHits, occursHits);
+    expectAgreement(rng, probe, text, hits);
     if (HasFatalFailure()) return;
   }
-  // Both outcomes of both tests are well exercised.
-  EXPECT_GT(wholeHits, 5000);
-  EXPECT_GT(occursHits, 40000);
-  EXPECT_LT(occursHits, 100000);
+  // Every outcome of every test is well exercised.
+  EXPECT_GT(hits.whole, 5000);
+  EXPECT_GT(hits.occurs, 40000);
+  EXPECT_LT(hits.occurs, 100000);
+  EXPECT_GT(hits.below, 20000);
+  EXPECT_GT(hits.above, 20000);
 }
 
 TEST(TextProbe, LongProbesAroundThePreparedLength) {
   std::mt19937 rng(77);
-  int wholeHits = 0;
-  int occursHits = 0;
+  Hits hits;
   for (int round = 0; round < 1500; ++round) {
     const std::string text = randomText(rng, 90);
     std::string probe = probeFor(rng, text, 80);
     if (rng() % 2 == 0) probe = text;  // whole-text hits for long texts
-    expectAgreement(probe, text, wholeHits, occursHits);
+    expectAgreement(rng, probe, text, hits);
     if (HasFatalFailure()) return;
   }
-  EXPECT_GT(wholeHits, 2000);
-  EXPECT_GT(occursHits, 2500);
+  EXPECT_GT(hits.whole, 2000);
+  EXPECT_GT(hits.occurs, 2500);
+  EXPECT_GT(hits.below, 500);
+  EXPECT_GT(hits.above, 500);
 }
 
 TEST(TextProbe, ByHand) {
@@ -169,6 +208,27 @@ TEST(TextProbe, ByHand) {
   // In literal mode the wildcard characters are ordinary ones.
   EXPECT_FALSE(TextProbe(literalFolded, "a*").matchesWhole("abc", 3));
   EXPECT_TRUE(TextProbe(literalFolded, "?c").occursIn("b?C", 3));
+}
+
+TEST(TextProbe, OrderByHand) {
+  const ElementArray folded = settings(true, false);  // the order is literal in any mode
+  const ElementArray exact = settings(false, true);
+  EXPECT_EQ(TextProbe(folded, "abc").compareTo("ABC", 3), 0);
+  EXPECT_GT(TextProbe(exact, "abc").compareTo("ABC", 3), 0);
+  // Folding goes to lower case: '_' sorts before the letters only when folded.
+  EXPECT_GT(TextProbe(folded, "A").compareTo("_", 1), 0);
+  EXPECT_LT(TextProbe(exact, "A").compareTo("_", 1), 0);
+  EXPECT_LT(TextProbe(folded, "k000000250").compareTo("K000000251", 10), 0);
+  EXPECT_GT(TextProbe(folded, "k000000250x").compareTo("K000000250", 10), 0);
+  EXPECT_LT(TextProbe(folded, "k000000250").compareTo("K000000250x", 11), 0);
+  EXPECT_GT(TextProbe(folded, "\xE1").compareTo("z", 1), 0);
+  // Characters one case bit apart that are not letters, inside a full word of text.
+  EXPECT_GT(TextProbe(folded, "abcdefg{x").compareTo("ABCDEFG[x", 9), 0);
+  EXPECT_LT(TextProbe(folded, "abcdefg@x").compareTo("ABCDEFG`x", 9), 0);
+  EXPECT_GT(TextProbe(folded, "abcdefg\xE1x").compareTo("ABCDEFG\xC1x", 9), 0);
+  EXPECT_LT(TextProbe(folded, nullptr).compareTo("", 0), 0);
+  EXPECT_LT(TextProbe(folded, "").compareTo("a", 1), 0);
+  EXPECT_EQ(TextProbe(folded, "").compareTo("", 0), 0);
 }
 
 TEST(TextProbe, TheBoundOnlyLimitsWhatIsRead) {

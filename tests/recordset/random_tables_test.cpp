@@ -174,9 +174,19 @@ TEST(RandomTables, TextSelectionsAgreeWithThePlainComparisons) {
     const char* given = missing ? nullptr : probe.c_str();
     const std::vector<uint8_t> before = a.rowStates;
 
-    const bool containing = rng() % 2 == 0;
+    const auto kind = rng() % 3;
+    const char* name = kind == 0 ? " containing" : kind == 1 ? " matching" : " between";
     std::vector<uint8_t> expected;
-    if (containing) {
+    if (kind == 2) {
+      // The probe is the low end; the high end is another random text, sometimes missing.
+      const std::string high = randomProbe(rng, t);
+      const char* highGiven = rng() % 20 == 0 ? nullptr : high.c_str();
+      expected = expectedStates(t, column, [&](const ModelCell& cell) {
+        return compareText(a, given, cell.text.c_str()) <= 0 &&
+               compareText(a, highGiven, cell.text.c_str()) >= 0;
+      });
+      selectBetweenStrings(a, column, given, highGiven);
+    } else if (kind == 0) {
       expected = expectedStates(t, column, [&](const ModelCell& cell) {
         return containsByCompare(a, cell.text, missing ? std::string() : probe);
       });
@@ -188,9 +198,9 @@ TEST(RandomTables, TextSelectionsAgreeWithThePlainComparisons) {
       selectWhereMatching(a, column, given);
     }
     ASSERT_EQ(a.rowStates, expected)
-        << "round " << round << (containing ? " containing" : " matching") << " probe «"
-        << (missing ? "(missing)" : probe) << "» column " << column << " case " << a.caseMode
-        << " wildcard " << a.searchMode << " mode " << a.selectionMode;
+        << "round " << round << name << " probe «" << (missing ? "(missing)" : probe) << "» column "
+        << column << " case " << a.caseMode << " wildcard " << a.searchMode << " mode "
+        << a.selectionMode;
     for (std::size_t r = 0; r < before.size(); ++r) {
       passes += before[r] != expected[r] && expected[r] == RowSelected;
       failures += before[r] != expected[r] && expected[r] == RowUnselected;
