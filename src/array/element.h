@@ -88,6 +88,8 @@ class Element {
     return {r->type, 0, r->payload(), r->size};
   }
   bool hasKey() const { return isRecord() && (record()->flags & kHasKey) != 0; }
+  // True for None and keyless Values: nothing to free, nothing to copy.
+  bool ownsNothing() const { return !isRecord(); }
 
   // Replaces the value; the key stays. The number 0, a null operand, a size below 1
   // and the None type all store None. Throws std::bad_alloc and leaves the element

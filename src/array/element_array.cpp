@@ -82,7 +82,7 @@ void ElementArray::insertAt(const ElementValue& value, int32_t index) {
   Element fresh;
   fresh.assign(value);
   int32_t newCapacity = rebalancedCapacity(capacity_, size(), size());
-  elements_.insertAt(static_cast<std::size_t>(index)) = std::move(fresh);
+  elements_.insertAt(static_cast<std::size_t>(index), std::move(fresh));
   capacity_ = newCapacity;
   syncRowStates();
 }

@@ -58,7 +58,12 @@ class ElementStore {
     buffer_[head_ + count_].assignValue(number);
     ++count_;
   }
-  void pushBack(Element&& element) { pushBack() = std::move(element); }
+  void pushBack(Element&& element) {
+    if (head_ + count_ == room_) makeRoomAtBack(count_ + 1);
+    if (!element.ownsNothing()) onlyPlainWords_ = false;
+    new (buffer_ + head_ + count_) Element(std::move(element));
+    ++count_;
+  }
   // Moves `count` elements to the back in one step, leaving the sources empty. Throws
   // std::bad_alloc and changes nothing when the block cannot grow.
   void appendMoved(Element* first, std::size_t count);
@@ -66,6 +71,11 @@ class ElementStore {
   void growTo(std::size_t total);
   // Opens an empty element at index (≤ size) and returns it.
   Element& insertAt(std::size_t index);
+  void insertAt(std::size_t index, Element&& element) {
+    const bool plain = onlyPlainWords_ && element.ownsNothing();
+    insertAt(index) = std::move(element);
+    onlyPlainWords_ = plain;
+  }
   // Destroys the element at index and closes the gap.
   void eraseAt(std::size_t index);
   void clear() { release(); }
