@@ -14,28 +14,37 @@ namespace {
 
 // One pass over the row states: the cell of each row is tested, a pass marks the row
 // and a failure unmarks it, and the mode decides which of the two can change anything.
-template <typename Test>
-void applyWhere(ElementArray& array, int32_t column, Test&& passes) {
-  const int32_t mode = array.selectionMode;
-  if (mode != SelectOr && mode != SelectAnd) return;
+// Each state is rewritten without a branch (to itself when the mode leaves it alone).
+template <bool kOr, typename Test>
+void walkWhere(ElementArray& array, int32_t column, Test& passes) {
   const auto rows = static_cast<int32_t>(array.rowStates.size());
   uint8_t* states = array.rowStates.data();
+  const Element* cells = array.slots().data();
   const int32_t columns = array.boundaryEntry(1);
   // cellIndex(r, column), stepped one row at a time with the same 32-bit wrap.
   int32_t index = column;
   for (int32_t r = 0; r < rows; ++r, index = addWrap(index, columns)) {
-    const bool pass = array.inRange(index) && passes(array.at(index));
-    if (mode == SelectOr) {
-      if (pass) states[r] = RowSelected;
-    } else if (!pass) {
-      states[r] = RowUnselected;
+    const bool pass = array.inRange(index) && passes(cells[static_cast<std::size_t>(index)]);
+    if constexpr (kOr) {
+      states[r] = pass ? uint8_t{RowSelected} : states[r];
+    } else {
+      states[r] = pass ? states[r] : uint8_t{RowUnselected};
     }
   }
 }
 
 template <typename Test>
+void applyWhere(ElementArray& array, int32_t column, Test&& passes) {
+  if (array.selectionMode == SelectOr) {
+    walkWhere<true>(array, column, passes);
+  } else if (array.selectionMode == SelectAnd) {
+    walkWhere<false>(array, column, passes);
+  }
+}
+
+template <typename Test>
 void applyValueWhere(ElementArray& array, int32_t column, Test&& passes) {
-  applyWhere(array, column, [&](const Element& cell) { return passes(cellNumber(cell)); });
+  applyWhere(array, column, [&](const Element& cell) { return passes(cell.asValue()); });
 }
 
 // A cell's text with a bound on its length: a String's stored size (its bytes are
