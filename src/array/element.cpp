@@ -6,6 +6,17 @@
 
 #include "array/text.h"
 
+#if defined(__SANITIZE_ADDRESS__)
+#define QUORREL_ASAN 1
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define QUORREL_ASAN 1
+#endif
+#endif
+#ifdef QUORREL_ASAN
+#include <sanitizer/asan_interface.h>
+#endif
+
 namespace quorrel {
 
 namespace {
@@ -19,9 +30,50 @@ ElementValue normalised(const ElementValue& value) {
   return value;
 }
 
+struct SlabHeader {
+  uint32_t live;  // records in the block, plus one while the slab still fills it
+};
+
+SlabHeader* headerOf(char* block) {
+  return std::launder(reinterpret_cast<SlabHeader*>(block));
+}
+
+void dropSlabHold(char* block) noexcept {
+  if (--headerOf(block)->live != 0) return;
+#ifdef QUORREL_ASAN
+  ASAN_UNPOISON_MEMORY_REGION(block, RecordSlab::kBlockBytes);
+#endif
+  std::free(block);
+}
+
+constexpr std::size_t roundUp8(std::size_t n) {
+  return (n + 7) & ~std::size_t{7};
+}
+
 }  // namespace
 
-Element::Record* Element::makeRecord(const ElementValue& value, bool keySlot) {
+char* RecordSlab::take(std::size_t bytes, uint16_t& units) {
+  if (bytes > kLargestRecord) return nullptr;
+  if (block_ == nullptr || used_ + bytes > kBlockBytes) {
+    releaseBlock();
+    block_ = static_cast<char*>(std::malloc(kBlockBytes));
+    if (block_ == nullptr) return nullptr;
+    new (block_) SlabHeader{1};
+    used_ = roundUp8(sizeof(SlabHeader));
+  }
+  char* room = block_ + used_;
+  units = static_cast<uint16_t>(used_ / 8);
+  used_ += bytes;
+  ++headerOf(block_)->live;
+  return room;
+}
+
+void RecordSlab::releaseBlock() noexcept {
+  if (block_ != nullptr) dropSlabHold(block_);
+  block_ = nullptr;
+}
+
+Element::Record* Element::makeRecord(const ElementValue& value, bool keySlot, RecordSlab* slab) {
   std::size_t payload = 0;
   if (value.type == ElementType::Value) {
     payload = sizeof(int32_t);
@@ -31,12 +83,19 @@ Element::Record* Element::makeRecord(const ElementValue& value, bool keySlot) {
     payload = static_cast<std::size_t>(value.size) + 1;
   }
   const std::size_t offset = keySlot ? sizeof(Element) : 0;
-  auto* base = static_cast<char*>(std::malloc(offset + sizeof(Record) + payload));
-  if (base == nullptr) throw std::bad_alloc();
+  const std::size_t total = offset + sizeof(Record) + payload;
+  uint16_t flags = keySlot ? kKeySlot : 0;
+  uint16_t units = 0;
+  char* base = slab != nullptr ? slab->take(roundUp8(total), units) : nullptr;
+  if (base != nullptr) {
+    flags |= static_cast<uint16_t>(kInSlab | units << kSlabShift);
+  } else {
+    base = static_cast<char*>(std::malloc(total));
+    if (base == nullptr) throw std::bad_alloc();
+  }
   if (keySlot) new (base) Element();
-  auto* record =
-      new (base + offset) Record{value.type == ElementType::None ? 0 : value.size, value.type,
-                                 static_cast<uint16_t>(keySlot ? kKeySlot : 0)};
+  auto* record = new (base + offset)
+      Record{value.type == ElementType::None ? 0 : value.size, value.type, flags};
   if (value.type == ElementType::Value) {
     std::memcpy(record->payload(), &value.number, sizeof(int32_t));
   } else if (payload > 0) {
@@ -53,18 +112,29 @@ void Element::destroyRecord() noexcept {
     r->key()->~Element();
     base -= sizeof(Element);
   }
-  std::free(base);
+  if ((r->flags & kInSlab) == 0) {
+    std::free(base);
+    return;
+  }
+  char* block = base - std::size_t{8} * (r->flags >> kSlabShift);
+#ifdef QUORREL_ASAN
+  // The block outlives the record; poisoned, a use after this still shows up.
+  std::size_t payload = 0;
+  if (r->type == ElementType::Value) {
+    payload = sizeof(int32_t);
+  } else if (r->type != ElementType::None) {
+    payload = static_cast<std::size_t>(r->size) + 1;
+  }
+  ASAN_POISON_MEMORY_REGION(base,
+                            roundUp8(reinterpret_cast<char*>(r) - base + sizeof(Record) + payload));
+#endif
+  dropSlabHold(block);
 }
 
 void Element::assign(const ElementValue& value) {
   const ElementValue v = normalised(value);
   if (!hasKey()) {
-    uint64_t next = 0;
-    if (v.type == ElementType::Value && v.size == 4) {
-      next = inlineWord(v.number);
-    } else if (v.type != ElementType::None) {
-      next = recordWord(makeRecord(v, false));
-    }
+    const uint64_t next = wordFor(v, nullptr);
     if (isRecord()) destroyRecord();
     word_ = next;
     return;
@@ -119,10 +189,22 @@ ElementValue Element::keyOperand(const ElementValue& value) {
   return operand;
 }
 
-Element Element::keyed(const ElementValue& value, const ElementValue& key) {
-  Element keyElement = of(keyOperand(key));
+uint64_t Element::wordFor(const ElementValue& value, RecordSlab* slab) {
+  if (value.type == ElementType::Value && value.size == 4) return inlineWord(value.number);
+  if (value.type == ElementType::None) return 0;
+  return recordWord(makeRecord(value, false, slab));
+}
+
+Element Element::of(const ElementValue& value, RecordSlab* slab) {
   Element e;
-  Record* r = makeRecord(normalised(value), true);
+  e.word_ = wordFor(normalised(value), slab);
+  return e;
+}
+
+Element Element::keyed(const ElementValue& value, const ElementValue& key, RecordSlab* slab) {
+  Element keyElement = of(keyOperand(key), slab);
+  Element e;
+  Record* r = makeRecord(normalised(value), true, slab);
   *r->key() = std::move(keyElement);
   r->flags |= kHasKey;
   e.word_ = recordWord(r);

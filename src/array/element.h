@@ -2,6 +2,7 @@
 // zero-terminated text, or an owned block of file bytes.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <cstring>
 #include <memory>  // kept for files that relied on it through this header
@@ -27,6 +28,31 @@ struct ElementValue {
   static ElementValue ofBytes(const char* bytes, int32_t size) {
     return {ElementType::File, 0, bytes, size};
   }
+};
+
+// Hands out element records from shared blocks, for code that builds many elements in
+// one go (the loaders): one allocation per block instead of one per element. Each
+// record still belongs to its element alone; a block is freed with its last record.
+class RecordSlab {
+ public:
+  static constexpr std::size_t kBlockBytes = std::size_t{1} << 16;
+  static constexpr std::size_t kLargestRecord = 512;
+
+  RecordSlab() = default;
+  ~RecordSlab() { releaseBlock(); }
+  RecordSlab(const RecordSlab&) = delete;
+  RecordSlab& operator=(const RecordSlab&) = delete;
+
+ private:
+  friend class Element;
+
+  // `bytes` (a multiple of 8) of the current block and their distance from its start in
+  // 8-byte units; null for large records or when no block can be had.
+  char* take(std::size_t bytes, uint16_t& units);
+  void releaseBlock() noexcept;
+
+  char* block_ = nullptr;
+  std::size_t used_ = 0;
 };
 
 // Scratch space for the decimal text of a number (sign, ten digits, terminator).
@@ -95,15 +121,13 @@ class Element {
   // and the None type all store None. Throws std::bad_alloc and leaves the element
   // unchanged when the copy cannot be made.
   void assign(const ElementValue& value);
-  // A new element holding `value`: the element that assign(value) makes of an empty one.
-  static Element of(const ElementValue& value) {
-    Element e;
-    e.assign(value);
-    return e;
-  }
+  // A new element holding `value`: the element that assign(value) makes of an empty
+  // one. Its record, if it needs one, comes from `slab` when one is given.
+  static Element of(const ElementValue& value, RecordSlab* slab = nullptr);
   // A new element holding `value` under `key`: the element that assign(value) followed
   // by setKey(key) makes, built with one record instead of two.
-  static Element keyed(const ElementValue& value, const ElementValue& key);
+  static Element keyed(const ElementValue& value, const ElementValue& key,
+                       RecordSlab* slab = nullptr);
 
   // assign(ElementValue::ofValue(number)) without the detour.
   void assignValue(int32_t number) {
@@ -138,6 +162,8 @@ class Element {
  private:
   static constexpr uint16_t kHasKey = 1;   // a live key element precedes the header
   static constexpr uint16_t kKeySlot = 2;  // the allocation starts with a key slot
+  static constexpr uint16_t kInSlab = 4;   // a slab block holds the allocation; the
+  static constexpr int kSlabShift = 3;     // bits above say where, in 8-byte units
 
   struct Record {
     int32_t size;
@@ -171,8 +197,11 @@ class Element {
   static ElementValue keyOperand(const ElementValue& value);
   int32_t recordValue() const;
   const char* numberOrEmptyText(NumberText& scratch) const;
-  // A new record holding `value` (already normalised), with a key slot when asked.
-  static Record* makeRecord(const ElementValue& value, bool keySlot);
+  // A new record holding `value` (already normalised), with a key slot when asked,
+  // taken from `slab` when one is given and can hold it.
+  static Record* makeRecord(const ElementValue& value, bool keySlot, RecordSlab* slab = nullptr);
+  // The word of a keyless element holding `value` (already normalised).
+  static uint64_t wordFor(const ElementValue& value, RecordSlab* slab);
   void destroyRecord() noexcept;
 
   uint64_t word_ = 0;

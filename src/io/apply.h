@@ -67,12 +67,15 @@ class AppendRun {
     array_.appendElements(pending_);
     pending_.clear();
   }
+  // Where the elements' records come from.
+  RecordSlab* slab() { return &slab_; }
   // The array's size once the pending elements are in.
   int64_t size() const { return int64_t{array_.size()} + static_cast<int64_t>(pending_.size()); }
 
  private:
   static constexpr std::size_t kLength = 4096;
   ElementArray& array_;
+  RecordSlab slab_;
   std::vector<Element> pending_;
 };
 

@@ -40,25 +40,27 @@ int32_t cellsOfLine(const char* line, std::size_t length) {
 // with its length; a cell of exactly two double quotes is an empty text.
 template <class Visit>
 void forEachCell(char* line, std::size_t length, Visit&& visit) {
-  line[length] = '\0';
-  std::size_t start = 0;
-  for (std::size_t i = 0; i <= length; ++i) {
-    if (line[i] != ',' && line[i] != '\0') continue;
-    line[i] = '\0';
-    char* cell = line + start;
-    std::size_t cellLength = i - start;
+  char* const stop = line + length;
+  *stop = '\0';
+  char* cell = line;
+  for (;;) {
+    auto* comma = static_cast<char*>(std::memchr(cell, ',', static_cast<std::size_t>(stop - cell)));
+    char* const cellEnd = comma != nullptr ? comma : stop;
+    *cellEnd = '\0';
+    auto cellLength = static_cast<std::size_t>(cellEnd - cell);
     if (std::string_view(cell, cellLength) == kEmptyCell) {
       cell[0] = '\0';
       cellLength = 0;
     }
     visit(cell, cellLength);
-    start = i + 1;
+    if (comma == nullptr) return;
+    cell = comma + 1;
   }
 }
 
 // appendString of a cut cell (a text file holds no zero bytes before its end).
-Element cellElement(const char* cell, std::size_t length) {
-  return Element::of({ElementType::String, 0, cell, static_cast<int32_t>(length + 1)});
+Element cellElement(const char* cell, std::size_t length, RecordSlab* slab) {
+  return Element::of({ElementType::String, 0, cell, static_cast<int32_t>(length + 1)}, slab);
 }
 
 }  // namespace
@@ -151,11 +153,11 @@ void loadCsvFile(ElementArray& array, const char* path, int32_t append) {
       if (run.size() >= ElementArray::kMaxSize) return;
       int32_t cells = 0;
       forEachCell(line, length, [&](const char* cell, std::size_t cellLength) {
-        run.add(cellElement(cell, cellLength));
+        run.add(cellElement(cell, cellLength, run.slab()));
         ++cells;
       });
       for (; cells < columns && run.size() < ElementArray::kMaxSize; ++cells) {
-        run.add(cellElement("", 0));
+        run.add(cellElement("", 0, run.slab()));
       }
     });
     run.flush();

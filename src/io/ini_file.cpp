@@ -88,7 +88,7 @@ struct LoadSink {
   io_detail::AppendRun& run;
   void section(const char*) {}
   void entry(const char* key, const char* value) {
-    run.add(Element::keyed(ElementValue::ofText(value), ElementValue::ofText(key)));
+    run.add(Element::keyed(ElementValue::ofText(value), ElementValue::ofText(key), run.slab()));
   }
 };
 

@@ -217,7 +217,8 @@ struct LoadSink {
   }
   void element(const ElementRecord& r) {
     run.add(Element::keyed(operandOf(r.type, r.size, r.number, r.data, valueSpill),
-                           operandOf(r.keyType, r.keySize, r.keyNumber, r.keyData, keySpill)));
+                           operandOf(r.keyType, r.keySize, r.keyNumber, r.keyData, keySpill),
+                           run.slab()));
   }
   const char* zeroFilled(std::string_view held, int32_t size) {
     filled.clear();  // the previous block is in an element by now

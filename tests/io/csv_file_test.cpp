@@ -114,6 +114,11 @@ TEST_F(CsvFile, AnyLineBreakSeparatesAndBlankLinesVanish) {
     loadCsvFile(a, path("l.csv").c_str(), 0);
     EXPECT_EQ(textsOf(a), (Texts{"a", "b", "c", "d"}));
   }
+  // Several lone CRs before the first LF, then LFs past the last CR.
+  writeBytes(path("m.csv"), "x\ry\rz\nw,v\nu");
+  ElementArray m;
+  loadCsvFile(m, path("m.csv").c_str(), 0);
+  EXPECT_EQ(textsOf(m), (Texts{"x", "", "y", "", "z", "", "w", "v", "u", ""}));
 }
 
 TEST_F(CsvFile, AppendAndFailedOpens) {
