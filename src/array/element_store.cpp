@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdlib>
 #include <cstring>
+#include <new>
 
 namespace quorrel {
 
@@ -14,13 +15,27 @@ void moveElements(Element* to, const Element* from, std::size_t count) {
   std::memmove(static_cast<void*>(to), static_cast<const void*>(from), count * sizeof(Element));
 }
 
+static_assert(sizeof(Element) == sizeof(uint64_t), "an element is one word");
+
+// Destroys the elements, passing over runs of empty words eight at a time: files of
+// byteless cells leave millions of them.
+void destroyElements(Element* slots, std::size_t count) noexcept {
+  std::size_t i = 0;
+  for (; i + 8 <= count; i += 8) {
+    uint64_t words[8];
+    std::memcpy(words, static_cast<const void*>(slots + i), sizeof words);
+    uint64_t any = 0;
+    for (uint64_t w : words) any |= w;
+    if (any == 0) continue;
+    for (std::size_t k = i; k < i + 8; ++k) slots[k].~Element();
+  }
+  for (; i < count; ++i) slots[i].~Element();
+}
+
 }  // namespace
 
 void ElementStore::release() noexcept {
-  if (!onlyPlainWords_) {
-    Element* slots = rawSlots();
-    for (std::size_t i = 0; i < count_; ++i) slots[i].~Element();
-  }
+  if (!onlyPlainWords_) destroyElements(rawSlots(), count_);
   std::free(buffer_);
   buffer_ = nullptr;
   head_ = count_ = room_ = 0;
@@ -77,9 +92,21 @@ void ElementStore::makeRoomAtFront() {
 }
 
 // An empty element is the zero word, so a run of them is cleared memory: files of
-// byteless cells can ask for millions.
+// byteless cells can ask for millions. A run that outgrows the block by far gets a
+// fresh zeroed block, whose pages the system hands out already cleared.
 void ElementStore::growTo(std::size_t total) {
   if (total <= count_) return;
+  if (head_ + total > room_ && total / 2 > room_) {
+    void* block = std::calloc(total, sizeof(Element));
+    if (block == nullptr) throw std::bad_alloc();
+    if (count_ > 0)
+      std::memcpy(block, static_cast<const void*>(rawSlots()), count_ * sizeof(Element));
+    std::free(static_cast<void*>(buffer_));
+    buffer_ = static_cast<Element*>(block);
+    head_ = 0;
+    room_ = count_ = total;
+    return;
+  }
   reserve(total);
   std::memset(static_cast<void*>(rawSlots() + count_), 0, (total - count_) * sizeof(Element));
   count_ = total;
