@@ -44,7 +44,9 @@ void writeHostFile(const char* path, uint16_t mode, int32_t x, int32_t y, int32_
   z = atLeastOne(z);
   // More cells than any array can hold (a wide boundary, say) would mean gigabytes of
   // empty cells: such a file is not written at all.
-  if (int64_t{x} * y * z > ElementArray::kMaxSize) return;
+  // (X × Y is checked first: with all three near 2^31 the product passes 64 bits.)
+  const int64_t layer = int64_t{x} * y;
+  if (layer > ElementArray::kMaxSize || layer * z > ElementArray::kMaxSize) return;
   FileHandle file = FileHandle::openForWriting(path, mode);
   if (!file.isOpen()) return;
   BufferedWriter out(file);

@@ -121,11 +121,19 @@ TEST_F(HostArrayFile, MoreCellsThanAnArrayHoldsWriteNothing) {
   a.setBoundary(2, 65536);  // 2^32 cells: wraps to 0 in 32 bits
   saveHostArrayFile(a, path("square.arr").c_str(), 0);
   EXPECT_FALSE(std::filesystem::exists(path("square.arr")));
+  a.appendString("b");
+  a.appendString("c");
+  a.setBoundary(1, INT32_MAX);
+  a.setBoundary(2, INT32_MAX);  // X × Y wraps to 1, so Z = size + 1 = 4: X × Y × Z > 2^63
+  saveHostArrayFile(a, path("huge.arr").c_str(), 0);
+  EXPECT_FALSE(std::filesystem::exists(path("huge.arr")));
 
   // Wide but within the cap: every empty cell is written, 4 bytes each.
+  a.setBoundary(1, 65536);
   a.setBoundary(2, 5);
   saveHostArrayFile(a, path("wide5.arr").c_str(), 0);
-  EXPECT_EQ(std::filesystem::file_size(path("wide5.arr")), 30u + 4u * 65536 * 5 + 1u);
+  EXPECT_EQ(std::filesystem::file_size(path("wide5.arr")),
+            30u + 4u * 65536 * 5 + 3u);  // "a" "b" "c"
 }
 
 // A 30-byte file may declare up to 16,777,216 byteless cells, and one more reads none.
