@@ -23,23 +23,6 @@ inline std::string_view textOf(std::string_view bytes) {
                    0, static_cast<std::size_t>(static_cast<const char*>(zero) - bytes.data()));
 }
 
-// insertString of the view's text; a null view inserts no text (a None element).
-inline void insertTextAt(ElementArray& array, const char* data, int32_t held, int32_t index) {
-  if (data == nullptr) {
-    array.insertString(nullptr, index);
-    return;
-  }
-  const std::string_view text = textOf({data, static_cast<std::size_t>(held)});
-  if (text.size() < static_cast<std::size_t>(held)) {
-    // The view carries the text's zero byte: no copy needed.
-    const auto size = static_cast<int32_t>(text.size() + 1);
-    array.insertElement(ElementValue{ElementType::String, 0, data, size}, index);
-    return;
-  }
-  const std::string copy(text);
-  array.insertString(copy.c_str(), index);
-}
-
 // The String operand of a view's text, as insertString of a zero-terminated copy
 // would store it. A view that ends without a zero byte is copied into `spill`.
 inline ElementValue textOperand(const char* data, int32_t held, std::string& spill) {
@@ -50,6 +33,12 @@ inline ElementValue textOperand(const char* data, int32_t held, std::string& spi
     data = spill.c_str();
   }
   return {ElementType::String, 0, data, static_cast<int32_t>(text.size() + 1)};
+}
+
+// insertString of the view's text; a null view inserts no text (a None element).
+inline void insertTextAt(ElementArray& array, const char* data, int32_t held, int32_t index) {
+  std::string spill;
+  array.insertElement(textOperand(data, held, spill), index);
 }
 
 // Collects loaded elements and appends them in runs, so that the capacity and the
