@@ -145,8 +145,9 @@ class Element {
     return numberOrEmptyText(scratch);
   }
   int32_t asValue() const {
-    if (isInlineValue()) return inlineNumber();
-    return isRecord() ? recordValue() : 0;
+    if (isInlineValue()) [[likely]]
+      return inlineNumber();
+    return word_ != 0 ? recordValue() : 0;
   }
   int32_t textLength() const;
 

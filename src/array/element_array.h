@@ -41,7 +41,10 @@ class ElementArray {
   // The slot count of the growth policy (25, 37, 55, 82, ...). Only the elements in
   // use are materialised; spare slots are a number.
   int32_t capacity() const { return capacity_; }
-  bool inRange(int32_t index) const { return index >= 0 && index < size(); }
+  // One unsigned comparison: a negative index wraps past every size.
+  bool inRange(int32_t index) const {
+    return static_cast<uint32_t>(index) < static_cast<uint32_t>(elements_.size());
+  }
 
   // Unchecked access to the elements in use, for the query, recordset and file code.
   std::span<Element> slots() { return elements_.span(); }
