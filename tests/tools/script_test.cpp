@@ -33,6 +33,8 @@ TEST(ScriptLiterals, StringEscapes) {
   EXPECT_EQ(parseQuoted(R"("\x41\xfF\x01")"), "A\xff\x01");
   EXPECT_EQ(parseQuoted(R"("")"), "");
   EXPECT_EQ(what([] { parseQuoted(R"("\x00")"); }), "\\x00 is not allowed in a string");
+  EXPECT_EQ(what([] { parseQuoted(std::string_view("\"a\0b\"", 5)); }),
+            "a zero byte is not allowed in a string");
   EXPECT_EQ(what([] { parseQuoted(R"("\x0")"); }), "\\x needs two hex digits");
   EXPECT_EQ(what([] { parseQuoted(R"("\a")"); }), "unknown escape \\a in string");
   EXPECT_EQ(what([] { parseQuoted(R"("ab)"); }), "unterminated string");

@@ -142,6 +142,9 @@ std::string parseQuoted(std::string_view token) {
   while (i + 1 < end) {
     if (token[i] == '\\') {
       text += decodeEscape(token, i);
+    } else if (token[i] == '\0') {
+      // A text reaches the extension as a zero-terminated string, so it would stop here.
+      throw ScriptError("a zero byte is not allowed in a string");
     } else {
       text += token[i++];
     }
