@@ -41,8 +41,9 @@ void writeEntry(BufferedWriter& out, const char* key, const char* value) {
 }
 
 // Walks the lines of an INI text, cutting names, keys and values in place, and hands
-// sections and entries to the sink. Lines of 0 or 1 characters, "//" comments (after
-// leading blanks) and entry lines before the first section are skipped.
+// sections and entries to the sink (a key without "=" has a value with no data). Lines of 0 or 1
+// characters, "//" comments (after leading blanks) and entry lines before the first section are
+// skipped.
 template <class Sink>
 void parseIni(char* text, std::size_t size, Sink& sink) {
   bool inSection = false;
@@ -68,27 +69,35 @@ void parseIni(char* text, std::size_t size, Sink& sink) {
     *end = '\0';
     char* equals = static_cast<char*>(std::memchr(p, '=', static_cast<std::size_t>(end - p)));
     if (equals == nullptr) {
-      sink.entry(p, nullptr);
+      sink.entry({p, static_cast<std::size_t>(end - p)}, {});
       return;
     }
     *equals = '\0';
-    sink.entry(p, equals + 1);
+    sink.entry({p, static_cast<std::size_t>(equals - p)},
+               {equals + 1, static_cast<std::size_t>(end - equals - 1)});
   });
+}
+
+// The String operand of a cut text (zero-terminated in place, no zero byte inside: a
+// text file is read up to its first one); none for a missing value.
+ElementValue cutText(std::string_view text) {
+  if (text.data() == nullptr) return {};
+  return {ElementType::String, 0, text.data(), static_cast<int32_t>(text.size() + 1)};
 }
 
 struct DocumentSink {
   IniDocument& document;
   void section(const char* name) { document.sections.push_back({name, {}}); }
-  void entry(const char* key, const char* value) {
-    document.sections.back().entries.push_back({key, value});
+  void entry(std::string_view key, std::string_view value) {
+    document.sections.back().entries.push_back({key.data(), value.data()});
   }
 };
 
 struct LoadSink {
   io_detail::AppendRun& run;
   void section(const char*) {}
-  void entry(const char* key, const char* value) {
-    run.add(Element::keyed(ElementValue::ofText(value), ElementValue::ofText(key), run.slab()));
+  void entry(std::string_view key, std::string_view value) {
+    run.add(Element::keyed(cutText(value), cutText(key), run.slab()));
   }
 };
 
