@@ -22,13 +22,20 @@ class FuzzInput {
   // An integer that is often extreme: near 0, the given size, -1 or INT32_MAX.
   int32_t index(int32_t size) {
     switch (byte() % 8) {
-      case 0: return -1;
-      case 1: return size;
-      case 2: return size - 1;
-      case 3: return INT32_MAX;
-      case 4: return INT32_MIN;
-      case 5: return int32();
-      default: return byte() % 16;
+      case 0:
+        return -1;
+      case 1:
+        return size;
+      case 2:
+        return size - 1;
+      case 3:
+        return INT32_MAX;
+      case 4:
+        return INT32_MIN;
+      case 5:
+        return int32();
+      default:
+        return byte() % 16;
     }
   }
   std::string text(size_t length) {

@@ -74,9 +74,12 @@ std::optional<std::string> parseQuoted(const std::string& line, std::size_t& pos
       continue;
     }
     char e = line[++pos];
-    if (e == 'n') out += '\n';
-    else if (e == 'r') out += '\r';
-    else if (e == 't') out += '\t';
+    if (e == 'n')
+      out += '\n';
+    else if (e == 'r')
+      out += '\r';
+    else if (e == 't')
+      out += '\t';
     else if (e == 'x' && pos + 2 < line.size()) {
       out += static_cast<char>(std::stoi(line.substr(pos + 1, 2), nullptr, 16));
       pos += 2;
@@ -161,7 +164,7 @@ std::map<std::string, Description> parseDescriptions(const std::string& path) {
 
 // The information entries, read through the module's exported entry points.
 struct InfoTables {
-  std::vector<std::vector<int>> actionParams;      // per code: parameter types
+  std::vector<std::vector<int>> actionParams;  // per code: parameter types
   std::vector<std::vector<int>> expressionParams;
 };
 
@@ -184,8 +187,7 @@ InfoTables readInfos(const std::string& modulePath, int actions, int expressions
     tables.actionParams.push_back(params(actionInfos(nullptr, code)));
   }
   for (int code = 0; code < expressions; ++code) {
-    tables.expressionParams.push_back(
-        params(expressionInfos(nullptr, code)));
+    tables.expressionParams.push_back(params(expressionInfos(nullptr, code)));
   }
   return tables;  // the module stays loaded until exit; nothing else runs in it
 }
@@ -194,11 +196,20 @@ std::string escape(const std::string& text) {
   std::string out;
   for (char c : text) {
     switch (c) {
-      case '&': out += "&amp;"; break;
-      case '<': out += "&lt;"; break;
-      case '>': out += "&gt;"; break;
-      case '"': out += "&quot;"; break;
-      default: out += c;
+      case '&':
+        out += "&amp;";
+        break;
+      case '<':
+        out += "&lt;";
+        break;
+      case '>':
+        out += "&gt;";
+        break;
+      case '"':
+        out += "&quot;";
+        break;
+      default:
+        out += c;
     }
   }
   return out;
@@ -206,18 +217,23 @@ std::string escape(const std::string& text) {
 
 std::string typeName(int type) {
   switch (type) {
-    case 22: return "number";
-    case 45: return "text";
-    case 1: return "integer";
-    case 3: return "text";
-    default: return "type " + std::to_string(type);
+    case 22:
+      return "number";
+    case 45:
+      return "text";
+    case 1:
+      return "integer";
+    case 3:
+      return "text";
+    default:
+      return "type " + std::to_string(type);
   }
 }
 
 struct Kind {
-  char letter;          // 'A' or 'E'
-  const char* anchor;   // "a" or "e"
-  int firstId;          // command id of code 0
+  char letter;         // 'A' or 'E'
+  const char* anchor;  // "a" or "e"
+  int firstId;         // command id of code 0
   int count;
 };
 
@@ -261,17 +277,18 @@ Generated render(const Kind& kind, const std::vector<MenuNode>& menu,
     const Description& d = found->second;
     const std::vector<int>& types = params[static_cast<std::size_t>(code)];
     if (d.params.size() != types.size()) {
-      fail(key + " describes " + std::to_string(d.params.size()) + " parameters, the module declares " +
-           std::to_string(types.size()));
+      fail(key + " describes " + std::to_string(d.params.size()) +
+           " parameters, the module declares " + std::to_string(types.size()));
     }
     auto s = strings.find(code);
     if (s == strings.end()) fail("no display string for " + key);
-    out.body += "<div class=\"entry\" id=\"" + std::string(kind.anchor) + std::to_string(code) + "\">\n";
+    out.body +=
+        "<div class=\"entry\" id=\"" + std::string(kind.anchor) + std::to_string(code) + "\">\n";
     out.body += "<h5>" + escape(node.text) + "</h5>\n";
     out.body += "<div class=\"meta\">" + std::string(kind.letter == 'A' ? "Action" : "Expression") +
-                " " + std::to_string(code) + " · menu: " + escape(group) + " › " + escape(node.text) +
-                " · " + (kind.letter == 'A' ? "display string " : "name ") + "<code>" +
-                escape(s->second.display) + "</code></div>\n";
+                " " + std::to_string(code) + " · menu: " + escape(group) + " › " +
+                escape(node.text) + " · " + (kind.letter == 'A' ? "display string " : "name ") +
+                "<code>" + escape(s->second.display) + "</code></div>\n";
     if (!types.empty()) {
       out.body += "<ol class=\"params\">\n";
       for (std::size_t i = 0; i < types.size(); ++i) {
@@ -318,11 +335,13 @@ void replace(std::string& text, const std::string& placeholder, const std::strin
 // Every internal link of the page must name an id that exists.
 void checkLinks(const std::string& page) {
   std::vector<std::string> ids;
-  for (std::size_t at = page.find(" id=\""); at != std::string::npos; at = page.find(" id=\"", at + 1)) {
+  for (std::size_t at = page.find(" id=\""); at != std::string::npos;
+       at = page.find(" id=\"", at + 1)) {
     std::size_t start = at + 5;
     ids.push_back(page.substr(start, page.find('"', start) - start));
   }
-  for (std::size_t at = page.find("href=\"#"); at != std::string::npos; at = page.find("href=\"#", at + 1)) {
+  for (std::size_t at = page.find("href=\"#"); at != std::string::npos;
+       at = page.find("href=\"#", at + 1)) {
     std::size_t start = at + 7;
     std::string target = page.substr(start, page.find('"', start) - start);
     bool found = false;
@@ -336,8 +355,9 @@ void checkLinks(const std::string& page) {
 int main(int argc, char** argv) {
   std::map<std::string, std::string> args;
   for (int i = 1; i + 1 < argc; i += 2) args[argv[i]] = argv[i + 1];
-  for (const char* required : {"--module", "--descriptions", "--template", "--out", "--menu-actions",
-                               "--menu-expressions", "--strings-actions", "--strings-expressions"}) {
+  for (const char* required :
+       {"--module", "--descriptions", "--template", "--out", "--menu-actions", "--menu-expressions",
+        "--strings-actions", "--strings-expressions"}) {
     if (!args.count(required)) fail(std::string("missing ") + required);
   }
   constexpr int kActions = 79;
@@ -345,8 +365,9 @@ int main(int argc, char** argv) {
   auto descriptions = parseDescriptions(args["--descriptions"]);
   checkNoStrayDescriptions(descriptions, kActions, kExpressions);
   InfoTables infos = readInfos(args["--module"], kActions, kExpressions);
-  Generated actions = render({'A', "a", 25000, kActions}, parseMenu(args["--menu-actions"]),
-                             parseStrings(args["--strings-actions"]), infos.actionParams, descriptions);
+  Generated actions =
+      render({'A', "a", 25000, kActions}, parseMenu(args["--menu-actions"]),
+             parseStrings(args["--strings-actions"]), infos.actionParams, descriptions);
   Generated expressions =
       render({'E', "e", 27000, kExpressions}, parseMenu(args["--menu-expressions"]),
              parseStrings(args["--strings-expressions"]), infos.expressionParams, descriptions);

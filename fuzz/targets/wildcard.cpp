@@ -23,8 +23,9 @@ bool referenceMatch(const std::string& p, const std::string& t, bool caseSensiti
     for (size_t j = T + 1; j-- > 0;) {
       if (p[i] == '*') {
         matches[i][j] = matches[i + 1][j] || (j < T && matches[i][j + 1]);
-      } else if (j < T && (p[i] == '?' || fold(static_cast<unsigned char>(p[i]), caseSensitive) ==
-                                              fold(static_cast<unsigned char>(t[j]), caseSensitive))) {
+      } else if (j < T &&
+                 (p[i] == '?' || fold(static_cast<unsigned char>(p[i]), caseSensitive) ==
+                                     fold(static_cast<unsigned char>(t[j]), caseSensitive))) {
         matches[i][j] = matches[i + 1][j + 1];
       }
     }
