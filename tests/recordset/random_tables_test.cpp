@@ -1,20 +1,14 @@
 // Selections and aggregates on many random small tables, against a model of every cell
 // (its text and value, written down when the cell is made) and the plain per-cell
 // comparisons.
-#include <gtest/gtest.h>
-
 #include <algorithm>
 #include <climits>
-#include <cstdint>
 #include <random>
-#include <string>
-#include <vector>
 
-#include "array/element_array.h"
 #include "query/compare.h"
 #include "recordset/aggregates.h"
 #include "recordset/selection.h"
-#include "recordset/table.h"
+#include "table_test_support.h"
 
 namespace quorrel {
 namespace {
@@ -40,59 +34,37 @@ std::string randomWord(std::mt19937& rng, std::size_t maxLength) {
 
 // Appends one random cell of every kind the array can hold and records what it reads as.
 void appendRandomCell(std::mt19937& rng, RandomTable& t) {
+  static const int32_t kValues[] = {0, 1, -1, 7, 12345, -6, INT32_MAX, INT32_MIN, 500};
+  static const char kPastZero[] = "aB\0zzzz";  // stored bytes go on past the text's zero
+  static const char kNoZero[] = "Zab?";        // no zero of their own, as from a damaged file
   ElementArray& a = t.array;
   ModelCell cell;
-  switch (rng() % 9) {
-    case 0: {  // a value (0 is stored as None and reads as the empty text)
-      static const int32_t values[] = {0, 1, -1, 7, 12345, -6, INT32_MAX, INT32_MIN, 500};
-      cell.value = values[rng() % 9];
-      cell.text = cell.value == 0 ? "" : std::to_string(cell.value);
-      a.appendValue(cell.value);
-      break;
-    }
-    case 1: {  // a value that lives in a record because it has a key
-      cell.value = static_cast<int32_t>(rng() % 2000) - 1000;
-      cell.text = cell.value == 0 ? "" : std::to_string(cell.value);
-      a.appendValue(cell.value);
-      a.setKeyString("key", a.size() - 1);
-      break;
-    }
-    case 2:  // a text without a leading number
-      cell.text = randomWord(rng, 12);
-      if (!cell.text.empty() && cell.text[0] == '0') cell.text[0] = 'b';
-      a.appendString(cell.text.c_str());
-      break;
-    case 3: {  // a text with a leading number
-      const int n = static_cast<int>(rng() % 100);
-      cell.value = n;
-      cell.text = std::to_string(n) + "a" + randomWord(rng, 4);
-      a.appendString(cell.text.c_str());
-      break;
-    }
-    case 4:  // nothing
-      a.insertElement(ElementValue{}, a.size());
-      break;
-    case 5: {  // file bytes read as the empty text
-      const char bytes[] = "abc";
-      a.appendFile(ByteBlock{bytes, 3});
-      break;
-    }
-    case 6: {  // a text whose stored bytes go on past its zero
-      static const char stored[] = "aB\0zzzz";
-      cell.text = "aB";
-      a.insertElement(ElementValue{ElementType::String, 0, stored, 8}, a.size());
-      break;
-    }
-    case 7: {  // stored bytes without a zero of their own (as from a damaged file)
-      static const char stored[] = "Zab?";
-      cell.text = "Zab?";
-      a.insertElement(ElementValue{ElementType::String, 0, stored, 4}, a.size());
-      break;
-    }
-    default:  // a long text, past the lengths probes are prepared for
-      cell.text = std::string(60 + rng() % 15, 'a') + randomWord(rng, 3);
-      a.appendString(cell.text.c_str());
-      break;
+  const auto kind = rng() % 9;
+  if (kind <= 1) {  // a value (0 is None and reads as ""); keyed, it lives in a record
+    cell.value = kind == 0 ? kValues[rng() % 9] : static_cast<int32_t>(rng() % 2000) - 1000;
+    cell.text = cell.value == 0 ? "" : std::to_string(cell.value);
+    a.appendValue(cell.value);
+    if (kind == 1) a.setKeyString("key", a.size() - 1);
+  } else if (kind == 2) {  // a text without a leading number
+    cell.text = randomWord(rng, 12);
+    if (!cell.text.empty() && cell.text[0] == '0') cell.text[0] = 'b';
+    a.appendString(cell.text.c_str());
+  } else if (kind == 3) {  // a text with a leading number
+    cell.value = static_cast<int32_t>(rng() % 100);
+    cell.text = std::to_string(cell.value) + "a" + randomWord(rng, 4);
+    a.appendString(cell.text.c_str());
+  } else if (kind == 4) {  // nothing
+    a.insertElement(ElementValue{}, a.size());
+  } else if (kind == 5) {  // file bytes read as the empty text
+    a.appendFile(ByteBlock{"abc", 3});
+  } else if (kind <= 7) {
+    cell.text = kind == 6 ? "aB" : kNoZero;
+    a.insertElement(
+        ElementValue{ElementType::String, 0, kind == 6 ? kPastZero : kNoZero, kind == 6 ? 8 : 4},
+        a.size());
+  } else {  // a long text, past the lengths probes are prepared for
+    cell.text = std::string(60 + rng() % 15, 'a') + randomWord(rng, 3);
+    a.appendString(cell.text.c_str());
   }
   t.cells.push_back(cell);
 }
@@ -136,12 +108,9 @@ std::vector<uint8_t> expectedStates(const RandomTable& t, int32_t column, Test&&
 
 // The containment test as the plain operations define it.
 bool containsByCompare(const ElementArray& a, const std::string& text, const std::string& probe) {
-  if (text.size() < probe.size()) return false;
+  const auto n = static_cast<int32_t>(probe.size());
   for (std::size_t o = 0; o + probe.size() <= text.size(); ++o) {
-    if (searchCompareSpan(a, probe.c_str(), text.c_str() + o, static_cast<int32_t>(probe.size())) ==
-        0) {
-      return true;
-    }
+    if (searchCompareSpan(a, probe.c_str(), text.c_str() + o, n) == 0) return true;
   }
   return false;
 }
@@ -173,12 +142,19 @@ TEST(RandomTables, TextSelectionsAgreeWithThePlainComparisons) {
     const bool missing = rng() % 20 == 0;
     const char* given = missing ? nullptr : probe.c_str();
     const std::vector<uint8_t> before = a.rowStates;
-
-    const auto kind = rng() % 3;
-    const char* name = kind == 0 ? " containing" : kind == 1 ? " matching" : " between";
     std::vector<uint8_t> expected;
-    if (kind == 2) {
-      // The probe is the low end; the high end is another random text, sometimes missing.
+    const auto kind = rng() % 3;
+    if (kind == 0) {
+      expected = expectedStates(t, column, [&](const ModelCell& cell) {
+        return containsByCompare(a, cell.text, missing ? std::string() : probe);
+      });
+      selectWhereContaining(a, column, given);
+    } else if (kind == 1) {
+      expected = expectedStates(t, column, [&](const ModelCell& cell) {
+        return searchCompare(a, given, cell.text.c_str()) == 0;
+      });
+      selectWhereMatching(a, column, given);
+    } else {  // the probe is the low end, another random text (or none) the high end
       const std::string high = randomProbe(rng, t);
       const char* highGiven = rng() % 20 == 0 ? nullptr : high.c_str();
       expected = expectedStates(t, column, [&](const ModelCell& cell) {
@@ -186,21 +162,11 @@ TEST(RandomTables, TextSelectionsAgreeWithThePlainComparisons) {
                compareText(a, highGiven, cell.text.c_str()) >= 0;
       });
       selectBetweenStrings(a, column, given, highGiven);
-    } else if (kind == 0) {
-      expected = expectedStates(t, column, [&](const ModelCell& cell) {
-        return containsByCompare(a, cell.text, missing ? std::string() : probe);
-      });
-      selectWhereContaining(a, column, given);
-    } else {
-      expected = expectedStates(t, column, [&](const ModelCell& cell) {
-        return searchCompare(a, given, cell.text.c_str()) == 0;
-      });
-      selectWhereMatching(a, column, given);
     }
     ASSERT_EQ(a.rowStates, expected)
-        << "round " << round << name << " probe «" << (missing ? "(missing)" : probe) << "» column "
-        << column << " case " << a.caseMode << " wildcard " << a.searchMode << " mode "
-        << a.selectionMode;
+        << "round " << round << " kind " << kind << " probe «" << (missing ? "(none)" : probe)
+        << "» column " << column << " case " << a.caseMode << " wildcard " << a.searchMode
+        << " mode " << a.selectionMode;
     for (std::size_t r = 0; r < before.size(); ++r) {
       passes += before[r] != expected[r] && expected[r] == RowSelected;
       failures += before[r] != expected[r] && expected[r] == RowUnselected;
@@ -216,25 +182,21 @@ TEST(RandomTables, ValueSelectionsAndAggregatesAgreeWithTheModel) {
   for (int round = 0; round < 20000; ++round) {
     RandomTable t = randomTable(rng);
     const int32_t column = randomColumn(rng, t.columns);
-
     // Aggregates over the visible rows, in row order, a missing cell reading 0.
-    std::vector<int32_t> visible;
-    for (std::size_t r = 0; r < t.array.rowStates.size(); ++r) {
-      if (t.array.rowStates[r] != RowSelected) continue;
-      const ModelCell* cell = modelCell(t, static_cast<int32_t>(r), column);
-      visible.push_back(cell != nullptr ? cell->value : 0);
-    }
     int32_t max = 0;
     int32_t min = 0;
     uint32_t sum = 0;
-    for (std::size_t k = 0; k < visible.size(); ++k) {
-      max = k == 0 || visible[k] > max ? visible[k] : max;
-      min = k == 0 || visible[k] < min ? visible[k] : min;
-      sum += static_cast<uint32_t>(visible[k]);
+    int64_t n = 0;
+    for (std::size_t r = 0; r < t.array.rowStates.size(); ++r) {
+      if (t.array.rowStates[r] != RowSelected) continue;
+      const ModelCell* cell = modelCell(t, static_cast<int32_t>(r), column);
+      const int32_t v = cell != nullptr ? cell->value : 0;
+      max = n == 0 || v > max ? v : max;
+      min = n == 0 || v < min ? v : min;
+      sum += static_cast<uint32_t>(v);
+      ++n;
     }
-    const auto n = static_cast<int64_t>(visible.size());
-    const int32_t average =
-        n == 0 ? 0 : static_cast<int32_t>(static_cast<int64_t>(static_cast<int32_t>(sum)) / n);
+    const int32_t average = n == 0 ? 0 : static_cast<int32_t>(static_cast<int32_t>(sum) / n);
     ASSERT_EQ(columnMax(t.array, column), max) << "round " << round;
     ASSERT_EQ(columnMin(t.array, column), min) << "round " << round;
     ASSERT_EQ(columnSum(t.array, column), static_cast<int32_t>(sum)) << "round " << round;
@@ -242,22 +204,13 @@ TEST(RandomTables, ValueSelectionsAndAggregatesAgreeWithTheModel) {
 
     t.array.selectionMode = static_cast<int32_t>(rng() % 2);
     const int32_t x = static_cast<int32_t>(rng() % 21) - 10;
-    std::vector<uint8_t> expected;
-    switch (rng() % 3) {
-      case 0:
-        expected = expectedStates(t, column, [x](const ModelCell& c) { return c.value == x; });
-        selectWhereEqual(t.array, column, x);
-        break;
-      case 1:
-        expected = expectedStates(t, column, [x](const ModelCell& c) { return c.value > x; });
-        selectWhereGreater(t.array, column, x);
-        break;
-      default:
-        expected = expectedStates(
-            t, column, [x](const ModelCell& c) { return c.value >= x && c.value <= x + 5; });
-        selectBetweenValues(t.array, column, x, x + 5);
-        break;
-    }
+    const auto kind = rng() % 3;
+    const auto expected = expectedStates(t, column, [&](const ModelCell& c) {
+      return kind == 0 ? c.value == x : kind == 1 ? c.value > x : c.value >= x && c.value <= x + 5;
+    });
+    if (kind == 0) selectWhereEqual(t.array, column, x);
+    if (kind == 1) selectWhereGreater(t.array, column, x);
+    if (kind == 2) selectBetweenValues(t.array, column, x, x + 5);
     ASSERT_EQ(t.array.rowStates, expected) << "round " << round << " column " << column;
   }
 }

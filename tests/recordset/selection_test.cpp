@@ -1,40 +1,18 @@
-#include <gtest/gtest.h>
-
-#include <vector>
-
-#include "array/element_array.h"
 #include "recordset/selection.h"
-#include "recordset/table.h"
+
+#include "table_test_support.h"
 
 namespace quorrel {
 namespace {
 
-constexpr uint8_t S = RowSelected;
-constexpr uint8_t U = RowUnselected;
-
-using States = std::vector<uint8_t>;
-
 // Two columns of values, one row per pair.
 ElementArray pairs(std::initializer_list<std::pair<int32_t, int32_t>> rows,
                    int32_t autoSelect = 1) {
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 2);
-  a.setAutoSelect(autoSelect);
+  ElementArray a = makeTable(2, {}, autoSelect);
   for (auto [x, y] : rows) {
     a.appendValue(x);
     a.appendValue(y);
   }
-  return a;
-}
-
-// One column of strings.
-ElementArray column(std::initializer_list<const char*> cells) {
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 1);
-  a.setAutoSelect(1);
-  for (const char* cell : cells) a.appendString(cell);
   return a;
 }
 
@@ -43,94 +21,106 @@ TEST(Selection, OrAddsRowsAndAndNarrowsThem) {
   startNewWhere(a);
   EXPECT_EQ(a.selectionMode, SelectOr);
   EXPECT_EQ(numberOfRows(a), 0);
-  EXPECT_EQ(rowList(a, 0), std::nullopt);
   selectWhereEqual(a, 0, 5);
   selectWhereEqual(a, 1, 7);
   EXPECT_EQ(a.rowStates, (States{S, S, S, U}));
-
   selectAllRows(a);
   a.selectionMode = SelectAnd;
   selectWhereEqual(a, 0, 5);
   selectWhereEqual(a, 1, 7);
   EXPECT_EQ(a.rowStates, (States{S, U, U, U}));
-  // In AND mode a passing row is never selected again.
-  selectWhereEqual(a, 0, 2);
+  selectWhereEqual(a, 0, 2);  // in AND mode a passing row is never selected again
   EXPECT_EQ(a.rowStates, (States{U, U, U, U}));
+
+  ElementArray b = pairs({{1, 10}, {2, 20}, {3, 30}, {4, 40}});
+  startNewWhere(b);
+  selectWhereLess(b, 0, 2);
+  selectWhereGreaterOrEqual(b, 1, 40);
+  EXPECT_EQ(b.rowStates, (States{S, U, U, S}));
+  selectWhereNotEqual(b, 0, 1);  // adds rows 1 and 2, never removes row 0
+  EXPECT_EQ(b.rowStates, (States{S, S, S, S}));
+  b.selectionMode = SelectAnd;
+  selectWhereGreater(b, 1, 10);
+  selectWhereLessOrEqual(b, 0, 3);
+  EXPECT_EQ(b.rowStates, (States{U, S, S, U}));
+  selectBetweenValues(b, 1, 20, 25);
+  EXPECT_EQ(b.rowStates, (States{U, S, U, U}));
+
+  // Value tests read the leading number of texts; None reads 0.
+  ElementArray c = makeTable(1, {"abc", "12x", " -3"});
+  c.appendValue(0);
+  startNewWhere(c);
+  selectWhereEqual(c, 0, 0);
+  EXPECT_EQ(c.rowStates, (States{S, U, U, S}));
+  startNewWhere(c);
+  selectWhereGreater(c, 0, -1);
+  EXPECT_EQ(c.rowStates, (States{S, S, U, S}));
 }
 
-TEST(Selection, MixedTestsFollowTheMode) {
-  ElementArray a = pairs({{1, 10}, {2, 20}, {3, 30}, {4, 40}});
-  startNewWhere(a);
-  selectWhereLess(a, 0, 2);             // row 0
-  selectWhereGreaterOrEqual(a, 1, 40);  // row 3
-  EXPECT_EQ(a.rowStates, (States{S, U, U, S}));
-  selectWhereNotEqual(a, 0, 1);  // OR: adds rows 1, 2, never removes row 0
-  EXPECT_EQ(a.rowStates, (States{S, S, S, S}));
-  a.selectionMode = SelectAnd;
-  selectWhereGreater(a, 1, 10);     // drops row 0
-  selectWhereLessOrEqual(a, 0, 3);  // drops row 3
-  EXPECT_EQ(a.rowStates, (States{U, S, S, U}));
-  selectBetweenValues(a, 1, 20, 25);
-  EXPECT_EQ(a.rowStates, (States{U, S, U, U}));
-}
-
-TEST(Selection, InvertTwiceRestoresAndResetsAreModeFree) {
+TEST(Selection, InvertResetsAndMarksByMode) {
   ElementArray a = pairs({{1, 0}, {2, 0}, {3, 0}});
   a.rowStates = {S, U, S};
   invertSelection(a);
   EXPECT_EQ(a.rowStates, (States{U, S, U}));
-  invertSelection(a);
-  EXPECT_EQ(a.rowStates, (States{S, U, S}));
   a.selectionMode = SelectAnd;
   selectAllRows(a);
   EXPECT_EQ(a.rowStates, (States{S, S, S}));
   clearSelection(a);
   EXPECT_EQ(a.rowStates, (States{U, U, U}));
   EXPECT_EQ(a.selectionMode, SelectAnd);
-}
 
-TEST(Selection, MarkAndUnmarkOnlyActInTheirMode) {
-  ElementArray a = pairs({{1, 0}, {2, 0}});
-  a.rowStates = {U, S};
-  a.selectionMode = SelectAnd;
+  // Mark only selects in OR mode, unmark only unselects in AND mode.
+  a.rowStates = {U, S, S};
   markRow(a, 0);
-  EXPECT_EQ(a.rowStates, (States{U, S}));
   unmarkRow(a, 1);
-  EXPECT_EQ(a.rowStates, (States{U, U}));
+  EXPECT_EQ(a.rowStates, (States{U, U, S}));
   a.selectionMode = SelectOr;
-  unmarkRow(a, 0);
+  unmarkRow(a, 2);
   markRow(a, 1);
-  markRow(a, 2);
+  markRow(a, 3);
   markRow(a, -1);
-  EXPECT_EQ(a.rowStates, (States{U, S}));
+  EXPECT_EQ(a.rowStates, (States{U, S, S}));
 }
 
-TEST(Selection, ValueTestsReadLeadingNumbers) {
-  ElementArray a = column({"abc", "12x", " -3"});
-  a.appendValue(0);  // a None cell
-  startNewWhere(a);
-  selectWhereEqual(a, 0, 0);
-  EXPECT_EQ(a.rowStates, (States{S, U, U, S}));
-  startNewWhere(a);
-  selectWhereGreater(a, 0, -1);
-  EXPECT_EQ(a.rowStates, (States{S, S, U, S}));
-  startNewWhere(a);
-  selectWhereGreater(a, 0, 0);
-  EXPECT_EQ(a.rowStates, (States{U, S, U, U}));
-}
+TEST(Selection, TextTestsUnderCaseAndWildcardModes) {
+  enum Kind { Containing, Matching, Between };
+  ElementArray a = makeTable(1);
+  for (const char* cell : {"1234", "abc", "", "a"}) a.appendString(cell);
+  a.appendValue(1234);
+  ElementArray b = makeTable(1);
+  for (const char* cell : {"b", "c", "cz", "d1", "a", "B", "d", "b*"}) b.appendString(cell);
+  const struct {
+    ElementArray& array;
+    int16_t caseMode, searchMode;
+    Kind kind;
+    const char* probe;
+    States expected;
+  } cases[] = {
+      {a, 0, 0, Containing, "23", {S, U, U, U, S}},
+      {a, 0, 0, Containing, "", {S, S, S, S, S}},
+      {a, 0, 0, Containing, "ABC", {U, S, U, U, U}},
+      {a, 1, 0, Containing, "Bc", {U, U, U, U, U}},
+      {a, 0, 1, Matching, "a*", {U, S, U, S, U}},
+      {a, 0, 1, Containing, "b?", {U, S, U, U, U}},
+      {a, 0, 1, Matching, "*", {S, S, S, S, S}},
+      {a, 0, 0, Matching, "A", {U, U, U, S, U}},
+      {a, 1, 0, Matching, "A", {U, U, U, U, U}},
+      // Between "b" and "d", both included, literal even in wildcard mode.
+      {b, 1, 1, Between, "b", {S, S, S, U, U, U, S, S}},
+      {b, 0, 1, Between, "b", {S, S, S, U, U, S, S, S}},
+  };
+  for (const auto& c : cases) {
+    c.array.caseMode = c.caseMode;
+    c.array.searchMode = c.searchMode;
+    startNewWhere(c.array);
+    if (c.kind == Containing) selectWhereContaining(c.array, 0, c.probe);
+    if (c.kind == Matching) selectWhereMatching(c.array, 0, c.probe);
+    if (c.kind == Between) selectBetweenStrings(c.array, 0, c.probe, "d");
+    EXPECT_EQ(c.array.rowStates, c.expected)
+        << c.kind << " «" << c.probe << "» case " << c.caseMode << " wildcard " << c.searchMode;
+  }
 
-TEST(Selection, BetweenBoundsAreIncludedAndLiteral) {
-  ElementArray a = column({"b", "c", "cz", "d1", "a", "B", "d", "b*"});
-  a.caseMode = 1;
-  a.searchMode = 1;  // ignored by the between test
-  startNewWhere(a);
-  selectBetweenStrings(a, 0, "b", "d");
-  EXPECT_EQ(a.rowStates, (States{S, S, S, U, U, U, S, S}));
-  a.caseMode = 0;
-  startNewWhere(a);
-  selectBetweenStrings(a, 0, "b", "d");
-  EXPECT_EQ(a.rowStates, (States{S, S, S, U, U, S, S, S}));
-
+  // Reversed value bounds pass nothing, in either mode.
   ElementArray v = pairs({{5, 0}, {1, 0}, {3, 0}});
   startNewWhere(v);
   selectBetweenValues(v, 0, 5, 1);
@@ -141,82 +131,24 @@ TEST(Selection, BetweenBoundsAreIncludedAndLiteral) {
   EXPECT_EQ(v.rowStates, (States{U, U, U}));
 }
 
-TEST(Selection, ContainingAndMatching) {
-  ElementArray a = column({"1234", "abc", "", "a"});
-  a.appendValue(1234);
-  startNewWhere(a);
-  selectWhereContaining(a, 0, "23");
-  EXPECT_EQ(a.rowStates, (States{S, U, U, U, S}));
-  startNewWhere(a);
-  selectWhereContaining(a, 0, "");
-  EXPECT_EQ(a.rowStates, (States{S, S, S, S, S}));
-  startNewWhere(a);
-  selectWhereContaining(a, 0, "ABC");  // case insensitive by default
-  EXPECT_EQ(a.rowStates, (States{U, S, U, U, U}));
-  startNewWhere(a);
-  selectWhereContaining(a, 0, "Bc");
-  EXPECT_EQ(a.rowStates, (States{U, S, U, U, U}));
-  a.caseMode = 1;
-  startNewWhere(a);
-  selectWhereContaining(a, 0, "Bc");
-  EXPECT_EQ(a.rowStates, (States{U, U, U, U, U}));
-  selectWhereContaining(a, 0, "34");
-  EXPECT_EQ(a.rowStates, (States{S, U, U, U, S}));
-  a.caseMode = 0;
-
-  a.searchMode = 1;
-  startNewWhere(a);
-  selectWhereMatching(a, 0, "a*");
-  EXPECT_EQ(a.rowStates, (States{U, S, U, S, U}));
-  startNewWhere(a);
-  selectWhereContaining(a, 0, "b?");
-  EXPECT_EQ(a.rowStates, (States{U, S, U, U, U}));
-  startNewWhere(a);
-  selectWhereMatching(a, 0, "*");
-  EXPECT_EQ(a.rowStates, (States{S, S, S, S, S}));
-
-  a.searchMode = 0;
-  startNewWhere(a);
-  selectWhereMatching(a, 0, "A");
-  EXPECT_EQ(a.rowStates, (States{U, U, U, S, U}));
-  a.caseMode = 1;
-  startNewWhere(a);
-  selectWhereMatching(a, 0, "A");
-  EXPECT_EQ(a.rowStates, (States{U, U, U, U, U}));
-}
-
+// The random tables check every column against the model; these pin the neighbours read.
 TEST(Selection, ColumnsAreNotRangeChecked) {
-  // Rows (1, 2), (3, 4), (5, 6) and a partial row holding 7.
   ElementArray a = pairs({{1, 2}, {3, 4}, {5, 6}});
-  a.appendValue(7);
+  a.appendValue(7);  // a partial row
   startNewWhere(a);
-  // Column 2 reads the next row's first cell: 3, 5 and the partial row's 7.
-  selectWhereGreater(a, 2, 4);
+  selectWhereGreater(a, 2, 4);  // the next row's first cell: 3, 5 and the partial 7
   EXPECT_EQ(a.rowStates, (States{U, S, S}));
   startNewWhere(a);
-  // Column -1 reads the previous row's last cell; row 0 has none and fails even a
-  // test that 0 would pass.
+  // The previous row's last cell; row 0 has none and fails even a test 0 would pass.
   selectWhereLessOrEqual(a, -1, 4);
   EXPECT_EQ(a.rowStates, (States{U, S, S}));
-  startNewWhere(a);
-  selectWhereEqual(a, 3, 0);  // row 2 reads index 7, outside the array
-  EXPECT_EQ(a.rowStates, (States{U, U, U}));
-  selectWhereEqual(a, 3, 4);
-  EXPECT_EQ(a.rowStates, (States{S, U, U}));
-  // In AND mode a missing cell unselects.
-  selectAllRows(a);
-  a.selectionMode = SelectAnd;
-  selectWhereNotEqual(a, 3, 999);
-  EXPECT_EQ(a.rowStates, (States{S, S, U}));
 }
 
 TEST(Selection, NewRowsTakeTheStartingStateAndStatesStayPut) {
   ElementArray a = pairs({{1, 1}, {2, 2}}, 0);
+  appendRowFromList(a, "3,3");  // no visible row: "append" lands at table row 0
   EXPECT_EQ(numberOfRows(a), 0);
-  // With no visible row, "append" lands at table row 0.
-  appendRowFromList(a, "3,3");
-  EXPECT_EQ(numberOfRows(a), 0);
-  EXPECT_EQ(a.getValue(0), 3);
+  EXPECT_EQ(dump(a), "3|3|#1|#1|#2|#2");
   startNewWhere(a);
   selectWhereGreater(a, 0, 1);
   EXPECT_EQ(a.rowStates, (States{S, U, S}));
@@ -224,11 +156,10 @@ TEST(Selection, NewRowsTakeTheStartingStateAndStatesStayPut) {
   a.setAutoSelect(1);
   a.rowStates = {U, S, S};
   insertRowFromList(a, "0,0", 0);  // visible row 0 is table row 1
-  EXPECT_EQ(a.getValue(2), 0);
-  EXPECT_EQ(a.getValue(4), 1);
+  EXPECT_EQ(dump(a), "3|3|0|0|#1|#1|#2|#2");
   EXPECT_EQ(a.rowStates, (States{U, S, S, S}));
   deleteRow(a, 0);
-  EXPECT_EQ(a.getValue(2), 1);
+  EXPECT_EQ(dump(a), "3|3|#1|#1|#2|#2");
   EXPECT_EQ(a.rowStates, (States{U, S, S}));
 }
 

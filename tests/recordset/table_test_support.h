@@ -1,0 +1,50 @@
+// Shared helpers of the table tests: building small tables and reading them back.
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "array/element_array.h"
+#include "recordset/table.h"
+
+namespace quorrel {
+
+inline constexpr uint8_t S = RowSelected;
+inline constexpr uint8_t U = RowUnselected;
+using States = std::vector<uint8_t>;
+using Texts = std::vector<std::string>;
+
+// A two-dimensional table of the given width, filled from delimited lists.
+inline ElementArray makeTable(int32_t columns, std::initializer_list<const char*> rows = {},
+                              int32_t autoSelect = 1) {
+  ElementArray a;
+  a.setDimensions(2);
+  a.setBoundary(1, columns);
+  a.setAutoSelect(autoSelect);
+  for (const char* row : rows) appendRowFromList(a, row);
+  return a;
+}
+
+// The texts of column j, one per table row.
+inline Texts columnTexts(ElementArray& a, int32_t j) {
+  Texts out;
+  for (int32_t r = 0; r < a.tableRowCount(); ++r) out.emplace_back(a.getString(cellIndex(a, r, j)));
+  return out;
+}
+
+// Every element in one text: strings as they are, "~" for None, "#n" for values.
+inline std::string dump(ElementArray& a) {
+  std::string out;
+  for (int32_t i = 0; i < a.size(); ++i) {
+    const ElementType type = a.at(i).type();
+    out += i == 0 ? "" : "|";
+    out += type == ElementType::None    ? "~"
+           : type == ElementType::Value ? "#" + std::to_string(a.getValue(i))
+                                        : std::string(a.getString(i));
+  }
+  return out;
+}
+
+}  // namespace quorrel
