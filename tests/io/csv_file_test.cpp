@@ -6,9 +6,10 @@ namespace quorrel {
 namespace {
 
 using CsvFile = IoTest;
+using Texts = std::vector<std::string>;
 
-std::vector<std::string> textsOf(ElementArray& a) {
-  std::vector<std::string> texts;
+Texts textsOf(ElementArray& a) {
+  Texts texts;
   for (int32_t i = 0; i < a.size(); ++i) {
     EXPECT_EQ(a.at(i).type(), ElementType::String) << "element " << i;
     texts.emplace_back(a.getString(i));
@@ -16,119 +17,86 @@ std::vector<std::string> textsOf(ElementArray& a) {
   return texts;
 }
 
-using Texts = std::vector<std::string>;
-
 TEST_F(CsvFile, SavesTableRowsWithEmptyCellsAsTwoQuotes) {
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 2);
+  ElementArray a = shaped(2, 2);
   a.appendString("name");
   a.appendString("age");
   a.appendValue(7);
-  saveCsvFile(a, path("t.csv").c_str(), 0);
-  EXPECT_EQ(readBytes(path("t.csv")), "name,age\r\n7,\"\"\r\n");
-
+  EXPECT_EQ(saved(saveCsvFile, a), "name,age\r\n7,\"\"\r\n");
   ElementArray b;
-  loadCsvFile(b, path("t.csv").c_str(), 0);
+  loadCsvFile(b, path("out").c_str(), 0);
   EXPECT_EQ(b.dimensions(), 2);
   EXPECT_EQ(b.boundary(1), 2);
   EXPECT_EQ(textsOf(b), (Texts{"name", "age", "7", ""}));
   EXPECT_EQ(b.at(3).size(), 1);
-}
 
-TEST_F(CsvFile, SavesOneDimensionAndZeroWidthArraysOnOneLine) {
-  ElementArray a;
-  saveCsvFile(a, path("e1.csv").c_str(), 0);
-  EXPECT_EQ(readBytes(path("e1.csv")), "\r\n");
-  a.appendString("a");
-  a.appendValue(0);
-  a.appendValue(-5);
-  a.appendFile({"bin", 3});
-  saveCsvFile(a, path("one.csv").c_str(), 0);
-  EXPECT_EQ(readBytes(path("one.csv")), "a,\"\",-5,\"\"\r\n");
-  a.setDimensions(2);  // X boundary still 0
-  saveCsvFile(a, path("x0.csv").c_str(), 1);
-  EXPECT_EQ(a.fileMode, 1);
-  EXPECT_EQ(readBytes(path("x0.csv")), "a,\"\",-5,\"\"\r\n");
-  a.setDimensions(3);
-  a.setBoundary(1, 3);
-  saveCsvFile(a, path("x3.csv").c_str(), 0);
-  EXPECT_EQ(readBytes(path("x3.csv")), "a,\"\",-5\r\n\"\",\"\",\"\"\r\n");
+  // One dimension, or a zero width, is one line; an empty table is an empty file.
+  ElementArray c;
+  EXPECT_EQ(saved(saveCsvFile, c), "\r\n");
+  c.appendString("a");
+  c.appendValue(0);
+  c.appendValue(-5);
+  c.appendFile({"bin", 3});
+  EXPECT_EQ(saved(saveCsvFile, c), "a,\"\",-5,\"\"\r\n");
+  c.setDimensions(2);  // X boundary still 0
+  EXPECT_EQ(saved(saveCsvFile, c, 1), "a,\"\",-5,\"\"\r\na,\"\",-5,\"\"\r\n");
+  EXPECT_EQ(c.fileMode, 1);
+  c.setDimensions(3);
+  c.setBoundary(1, 3);
+  EXPECT_EQ(saved(saveCsvFile, c), "a,\"\",-5\r\n\"\",\"\",\"\"\r\n");
+  ElementArray empty = shaped(2, 3);
+  EXPECT_EQ(saved(saveCsvFile, empty), "");
+  EXPECT_TRUE(exists(path("out")));
 
-  ElementArray empty2;
-  empty2.setDimensions(2);
-  empty2.setBoundary(1, 3);
-  writeBytes(path("e2.csv"), "old");
-  saveCsvFile(empty2, path("e2.csv").c_str(), 0);
-  EXPECT_TRUE(exists(path("e2.csv")));
-  EXPECT_EQ(readBytes(path("e2.csv")), "");
+  // Cells are taken as they stand: delimiters and line breaks inside them are not quoted.
+  ElementArray s;
+  s.appendString("x,y");
+  s.appendString("l1\nl2");
+  EXPECT_EQ(saved(saveCsvFile, s), "x,y,l1\nl2\r\n");
 }
 
 TEST_F(CsvFile, RowsWiderThanTheCapWriteNothing) {
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, INT32_MAX);
+  ElementArray a = shaped(2, INT32_MAX);
   a.appendString("a");
-  writeBytes(path("wide.csv"), "old");
-  saveCsvFile(a, path("wide.csv").c_str(), 0);
-  EXPECT_EQ(readBytes(path("wide.csv")), "old");  // not even truncated
+  writeBytes(path("out"), "old");
+  EXPECT_EQ(saved(saveCsvFile, a), "old");  // not even truncated
   a.setBoundary(1, ElementArray::kMaxSize + 1);
   saveCsvFile(a, path("new.csv").c_str(), 0);
-  EXPECT_FALSE(std::filesystem::exists(path("new.csv")));
+  EXPECT_FALSE(exists(path("new.csv")));
 }
 
-TEST_F(CsvFile, CellsAreTakenAsTheyStand) {
-  ElementArray a;
-  a.appendString("x,y");
-  a.appendString("l1\nl2");
-  saveCsvFile(a, path("s.csv").c_str(), 0);
-  EXPECT_EQ(readBytes(path("s.csv")), "x,y,l1\nl2\r\n");
-  ElementArray b;
-  loadCsvFile(b, path("s.csv").c_str(), 0);
-  EXPECT_EQ(b.boundary(1), 3);
-  EXPECT_EQ(textsOf(b), (Texts{"x", "y", "l1", "l2", "", ""}));
-
-  writeBytes(path("q.csv"), "\"x,y\", a ,12,,\"\"\"\",\r\n");
-  ElementArray c;
-  loadCsvFile(c, path("q.csv").c_str(), 0);
-  EXPECT_EQ(textsOf(c), (Texts{"\"x", "y\"", " a ", "12", "", "\"\"\"\"", ""}));
-  EXPECT_EQ(c.getValue(3), 12);
-}
-
-TEST_F(CsvFile, RowsOfUnequalLengthArePadded) {
-  writeBytes(path("u.csv"), "a\r\nb,c,d\r\ne,f\r\n");
-  ElementArray a;
-  loadCsvFile(a, path("u.csv").c_str(), 0);
-  EXPECT_EQ(a.dimensions(), 2);
-  EXPECT_EQ(a.boundary(1), 3);
-  EXPECT_EQ(textsOf(a), (Texts{"a", "", "", "b", "c", "d", "e", "f", ""}));
-}
-
-TEST_F(CsvFile, AnyLineBreakSeparatesAndBlankLinesVanish) {
-  for (const std::string& text :
-       Texts{"a,b\r\nc,d\r\n", "a,b\nc,d", "a,b\rc,d\r", "\r\n\na,b\n\n\r\rc,d\n\n",
-             std::string("a,b\nc,d\n\0e,f\n", 13)}) {
-    SCOPED_TRACE(text);
-    writeBytes(path("l.csv"), text);
-    ElementArray a;
-    loadCsvFile(a, path("l.csv").c_str(), 0);
-    EXPECT_EQ(textsOf(a), (Texts{"a", "b", "c", "d"}));
+TEST_F(CsvFile, LoadsRowsPaddedToTheWidestAtAnyLineBreak) {
+  const Texts abcd = {"a", "b", "c", "d"};
+  const struct {
+    std::string bytes;
+    int32_t width;
+    Texts texts;
+  } cases[] = {
+      {"x,y,l1\nl2\r\n", 3, {"x", "y", "l1", "l2", "", ""}},
+      {"\"x,y\", a ,12,,\"\"\"\",\r\n", 7, {"\"x", "y\"", " a ", "12", "", "\"\"\"\"", ""}},
+      {"a\r\nb,c,d\r\ne,f\r\n", 3, {"a", "", "", "b", "c", "d", "e", "f", ""}},
+      {"a,b\r\nc,d\r\n", 2, abcd},
+      {"a,b\nc,d", 2, abcd},
+      {"a,b\rc,d\r", 2, abcd},
+      {"\r\n\na,b\n\n\r\rc,d\n\n", 2, abcd},  // blank lines vanish
+      {std::string("a,b\nc,d\n\0e,f\n", 13), 2, abcd},
+      // Several lone CRs before the first LF, then LFs past the last CR.
+      {"x\ry\rz\nw,v\nu", 2, {"x", "", "y", "", "z", "", "w", "v", "u", ""}},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.bytes);
+    ElementArray a = loaded(loadCsvFile, c.bytes);
+    EXPECT_EQ(a.dimensions(), 2);
+    EXPECT_EQ(a.boundary(1), c.width);
+    EXPECT_EQ(textsOf(a), c.texts);
   }
-  // Several lone CRs before the first LF, then LFs past the last CR.
-  writeBytes(path("m.csv"), "x\ry\rz\nw,v\nu");
-  ElementArray m;
-  loadCsvFile(m, path("m.csv").c_str(), 0);
-  EXPECT_EQ(textsOf(m), (Texts{"x", "", "y", "", "z", "", "w", "v", "u", ""}));
 }
 
 TEST_F(CsvFile, AppendAndFailedOpens) {
-  writeBytes(path("a.csv"), "p,q\r\n");
   ElementArray a;
-  a.appendValue(1);
-  a.appendValue(2);
-  a.appendValue(3);
+  for (int32_t v : {1, 2, 3}) a.appendValue(v);
   a.setKeyString("k", 0);
-  loadCsvFile(a, path("a.csv").c_str(), 1);
+  a = loaded(loadCsvFile, "p,q\r\n", std::move(a), 1);
   ASSERT_EQ(a.size(), 5);
   EXPECT_EQ(a.dimensions(), 2);
   EXPECT_EQ(a.boundary(1), 2);
@@ -137,9 +105,7 @@ TEST_F(CsvFile, AppendAndFailedOpens) {
   EXPECT_STREQ(a.getString(4), "q");
 
   for (const std::string& file : {path("missing.csv"), dir_.string()}) {
-    ElementArray b;
-    b.setDimensions(3);
-    b.setBoundary(1, 4);
+    ElementArray b = shaped(3, 4);
     b.appendValue(9);
     loadCsvFile(b, file.c_str(), 1);
     EXPECT_EQ(b.size(), 1);
@@ -150,14 +116,10 @@ TEST_F(CsvFile, AppendAndFailedOpens) {
     EXPECT_EQ(b.boundary(1), 4);
     EXPECT_FALSE(readCsvFile(file.c_str()).has_value());
   }
-  writeBytes(path("empty.csv"), "");
   ElementArray c;
   c.appendValue(1);
-  loadCsvFile(c, path("empty.csv").c_str(), 0);
-  EXPECT_EQ(c.size(), 0);
-  auto table = readCsvFile(path("empty.csv").c_str());
-  ASSERT_TRUE(table.has_value());
-  EXPECT_EQ(table->rowCount(), 0);
+  EXPECT_EQ(loaded(loadCsvFile, "", std::move(c)).size(), 0);
+  EXPECT_EQ(readCsvFile(path("in").c_str()).value().rowCount(), 0);
 }
 
 TEST_F(CsvFile, TableReadAndWrite) {
@@ -184,21 +146,13 @@ TEST_F(CsvFile, TableReadAndWrite) {
 
 TEST_F(CsvFile, TruncatedFileLoadsItsPrefix) {
   const std::string full = "a,b\r\nc\r\n";
-  const Texts expected[] = {{},
-                            {"a"},
-                            {"a", ""},
-                            {"a", "b"},
-                            {"a", "b"},
-                            {"a", "b"},
-                            {"a", "b", "c", ""},
-                            {"a", "b", "c", ""},
-                            {"a", "b", "c", ""}};
+  const Texts ab = {"a", "b"};
+  const Texts abc = {"a", "b", "c", ""};
+  const Texts expected[] = {{}, {"a"}, {"a", ""}, ab, ab, ab, abc, abc, abc};
   ASSERT_EQ(full.size() + 1, std::size(expected));
   for (size_t n = 0; n <= full.size(); ++n) {
     SCOPED_TRACE(n);
-    writeBytes(path("t.csv"), full.substr(0, n));
-    ElementArray a;
-    loadCsvFile(a, path("t.csv").c_str(), 0);
+    ElementArray a = loaded(loadCsvFile, full.substr(0, n));
     EXPECT_EQ(textsOf(a), expected[n]);
     EXPECT_EQ(a.dimensions(), 2);
   }

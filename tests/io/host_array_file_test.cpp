@@ -7,10 +7,8 @@ namespace {
 
 using HostArrayFile = IoTest;
 
-const std::string kHeader("CNC ARRAY\0", 10);
-
 std::string head(int32_t version, int32_t x, int32_t y, int32_t z, int32_t kind) {
-  return kHeader + le32(version) + le32(x) + le32(y) + le32(z) + le32(kind);
+  return std::string("CNC ARRAY\0", 10) + le32(version) + le32(x) + le32(y) + le32(z) + le32(kind);
 }
 
 // Three-dimensional, X 2, Y 2: the string a, the value 5, an empty string.
@@ -19,47 +17,35 @@ const std::string kExample =
 
 TEST_F(HostArrayFile, WritesTheExampleByteForByte) {
   ASSERT_EQ(kExample.size(), 48u);
-  ElementArray a;
-  a.setDimensions(3);
-  a.setBoundary(1, 2);
-  a.setBoundary(2, 2);
+  ElementArray a = shaped(3, 2, 2);
   a.appendString("a");
   a.appendValue(5);
   a.appendString("");
   a.setKeyString("key", 0);
-  saveHostArrayFile(a, path("h.arr").c_str(), 0);
-  EXPECT_EQ(readBytes(path("h.arr")), kExample);
+  EXPECT_EQ(saved(saveHostArrayFile, a), kExample);
   EXPECT_EQ(a.fileMode, 0);
-
   // Exactly X x Y elements still get a further, empty layer.
   a.appendFile({"bin", 3});
-  saveHostArrayFile(a, path("full.arr").c_str(), 0);
-  EXPECT_EQ(readBytes(path("full.arr")), head(2, 2, 2, 2, 2) + le32(1) + "a" + le32(1) + "5" +
-                                             le32(0) + le32(0) + le32(0) + le32(0) + le32(0) +
-                                             le32(0));
-}
+  EXPECT_EQ(saved(saveHostArrayFile, a),
+            head(2, 2, 2, 2, 2) + le32(1) + "a" + le32(1) + "5" + std::string(24, '\0'));
 
-TEST_F(HostArrayFile, ZeroSizesCountAsOne) {
-  ElementArray a;  // one dimension: X and Y are 0
-  a.appendValue(-12);
-  a.appendString("xy");
-  saveHostArrayFile(a, path("one.arr").c_str(), 0);
-  EXPECT_EQ(readBytes(path("one.arr")),
+  // Zero sizes count as one.
+  ElementArray b;  // one dimension: X and Y are 0
+  b.appendValue(-12);
+  b.appendString("xy");
+  EXPECT_EQ(saved(saveHostArrayFile, b),
             head(2, 1, 1, 3, 2) + le32(3) + "-12" + le32(2) + "xy" + le32(0));
-  ElementArray empty;
-  empty.setDimensions(2);
-  empty.setBoundary(1, 3);
+  ElementArray empty = shaped(2, 3);
   saveHostArrayFile(empty, path("empty.arr").c_str(), 1);
   EXPECT_EQ(empty.fileMode, 1);
   EXPECT_EQ(readBytes(path("empty.arr")), head(2, 3, 1, 1, 2) + le32(0) + le32(0) + le32(0));
 }
 
 TEST_F(HostArrayFile, LoadsTextAndNumberCells) {
-  writeBytes(path("h.arr"), kExample);
-  ElementArray a;
-  a.appendString("old");
-  a.labels = LabelList{"keep"};
-  loadHostArrayFile(a, path("h.arr").c_str(), 0);
+  ElementArray old;
+  old.appendString("old");
+  old.labels = LabelList{"keep"};
+  ElementArray a = loaded(loadHostArrayFile, kExample, std::move(old));
   ASSERT_EQ(a.size(), 4);
   EXPECT_EQ(a.dimensions(), 3);
   EXPECT_EQ(a.boundary(1), 2);
@@ -72,96 +58,67 @@ TEST_F(HostArrayFile, LoadsTextAndNumberCells) {
   EXPECT_FALSE(a.at(0).hasKey());
   EXPECT_EQ(a.labels, LabelList{"keep"});
 
-  writeBytes(path("n.arr"), head(2, 2, 1, 1, 1) + le32(7) + le32(0));
-  ElementArray n;
-  loadHostArrayFile(n, path("n.arr").c_str(), 0);
+  ElementArray n = loaded(loadHostArrayFile, head(2, 2, 1, 1, 1) + le32(7) + le32(0));
   ASSERT_EQ(n.size(), 2);
   EXPECT_EQ(n.at(0).type(), ElementType::Value);
   EXPECT_EQ(n.getValue(0), 7);
   EXPECT_EQ(n.at(1).type(), ElementType::None);
-  EXPECT_EQ(n.boundary(1), 2);
   EXPECT_EQ(n.boundary(2), 1);
-
   // Kind 5 reads numbers and kind 6 texts, like 1 and 2.
-  writeBytes(path("n5.arr"), head(2, 1, 1, 1, 5) + le32(-9));
-  ElementArray n5;
-  loadHostArrayFile(n5, path("n5.arr").c_str(), 0);
-  EXPECT_EQ(n5.getValue(0), -9);
-  writeBytes(path("t6.arr"), head(2, 1, 1, 1, 6) + le32(2) + "hi");
-  ElementArray t6;
-  loadHostArrayFile(t6, path("t6.arr").c_str(), 0);
-  EXPECT_STREQ(t6.getString(0), "hi");
-}
+  EXPECT_EQ(loaded(loadHostArrayFile, head(2, 1, 1, 1, 5) + le32(-9)).getValue(0), -9);
+  EXPECT_STREQ(loaded(loadHostArrayFile, head(2, 1, 1, 1, 6) + le32(2) + "hi").getString(0), "hi");
 
-TEST_F(HostArrayFile, OtherVersionsAndKinds) {
   // Text cells of a version other than 2 carry no bytes.
-  writeBytes(path("v1.arr"), head(1, 2, 1, 2, 2) + le32(1) + "a");
-  ElementArray a;
-  loadHostArrayFile(a, path("v1.arr").c_str(), 0);
-  EXPECT_EQ(a.size(), 4);
+  a = loaded(loadHostArrayFile, head(1, 2, 1, 2, 2) + le32(1) + "a");
+  ASSERT_EQ(a.size(), 4);
   for (int32_t i = 0; i < 4; ++i) EXPECT_EQ(a.at(i).type(), ElementType::None);
   // An unknown kind loads nothing, yet the replacing load still clears and takes X, Y.
-  writeBytes(path("k3.arr"), head(2, 2, 1, 1, 3) + le32(1) + "a");
-  a.appendValue(1);
-  loadHostArrayFile(a, path("k3.arr").c_str(), 0);
+  a = loaded(loadHostArrayFile, head(2, 2, 1, 1, 3) + le32(1) + "a", std::move(a));
   EXPECT_EQ(a.size(), 0);
   EXPECT_EQ(a.dimensions(), 3);
   EXPECT_EQ(a.boundary(1), 2);
 }
 
 TEST_F(HostArrayFile, MoreCellsThanAnArrayHoldsWriteNothing) {
-  ElementArray a;
-  a.setDimensions(3);
-  a.setBoundary(1, INT32_MAX);
+  ElementArray a = shaped(3, INT32_MAX);
   a.appendString("a");
-  writeBytes(path("wide.arr"), "old");
-  saveHostArrayFile(a, path("wide.arr").c_str(), 0);
-  EXPECT_EQ(readBytes(path("wide.arr")), "old");  // not even truncated
+  writeBytes(path("out"), "old");
+  EXPECT_EQ(saved(saveHostArrayFile, a), "old");  // not even truncated
   a.setBoundary(1, 65536);
   a.setBoundary(2, 65536);  // 2^32 cells: wraps to 0 in 32 bits
   saveHostArrayFile(a, path("square.arr").c_str(), 0);
-  EXPECT_FALSE(std::filesystem::exists(path("square.arr")));
+  EXPECT_FALSE(exists(path("square.arr")));
   a.appendString("b");
   a.appendString("c");
   a.setBoundary(1, INT32_MAX);
   a.setBoundary(2, INT32_MAX);  // X × Y wraps to 1, so Z = size + 1 = 4: X × Y × Z > 2^63
   saveHostArrayFile(a, path("huge.arr").c_str(), 0);
-  EXPECT_FALSE(std::filesystem::exists(path("huge.arr")));
+  EXPECT_FALSE(exists(path("huge.arr")));
 
   // Wide but within the cap: every empty cell is written, 4 bytes each.
   a.setBoundary(1, 65536);
   a.setBoundary(2, 5);
-  saveHostArrayFile(a, path("wide5.arr").c_str(), 0);
-  EXPECT_EQ(std::filesystem::file_size(path("wide5.arr")),
-            30u + 4u * 65536 * 5 + 3u);  // "a" "b" "c"
+  EXPECT_EQ(saved(saveHostArrayFile, a).size(), 30u + 4u * 65536 * 5 + 3u);  // "a" "b" "c"
 }
 
 // A 30-byte file may declare up to 16,777,216 byteless cells, and one more reads none.
 TEST_F(HostArrayFile, ByteLessCellsUpToTheLimit) {
-  writeBytes(path("big.arr"), head(1, 4096, 4096, 1, 2));
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 3);
+  ElementArray a = shaped(2, 3);
   a.appendString("first");
-  loadHostArrayFile(a, path("big.arr").c_str(), 1);
+  a = loaded(loadHostArrayFile, head(1, 4096, 4096, 1, 2), std::move(a), 1);
   ASSERT_EQ(a.size(), 1 + 16777216);
   EXPECT_STREQ(a.getString(0), "first");
   EXPECT_EQ(a.at(16777216).type(), ElementType::None);
   EXPECT_EQ(a.rowStates.size(), static_cast<std::size_t>((1 + 16777216) / 3));
-
-  writeBytes(path("over.arr"), head(1, 4097, 4096, 1, 2));
-  loadHostArrayFile(a, path("over.arr").c_str(), 0);
+  a = loaded(loadHostArrayFile, head(1, 4097, 4096, 1, 2), std::move(a));
   EXPECT_EQ(a.size(), 0);
   EXPECT_EQ(a.boundary(1), 4097);
 }
 
 TEST_F(HostArrayFile, AppendAndFailures) {
-  writeBytes(path("h.arr"), kExample);
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 7);
+  ElementArray a = shaped(2, 7);
   a.appendValue(1);
-  loadHostArrayFile(a, path("h.arr").c_str(), 1);
+  a = loaded(loadHostArrayFile, kExample, std::move(a), 1);
   ASSERT_EQ(a.size(), 5);
   EXPECT_EQ(a.dimensions(), 2);
   EXPECT_EQ(a.boundary(1), 7);
@@ -173,8 +130,7 @@ TEST_F(HostArrayFile, AppendAndFailures) {
   for (const std::string& file :
        {path("missing.arr"), path("bad.arr"), path("zero.arr"), dir_.string()}) {
     SCOPED_TRACE(file);
-    ElementArray b;
-    b.setDimensions(2);
+    ElementArray b = shaped(2);
     b.appendValue(3);
     loadHostArrayFile(b, file.c_str(), 1);
     EXPECT_EQ(b.size(), 1);
@@ -200,9 +156,8 @@ TEST_F(HostArrayFile, ImageReadAndWrite) {
   EXPECT_EQ(readBytes(path("copy.arr")), kExample);
   // Number cells are written as their decimal text.
   writeBytes(path("n.arr"), head(2, 2, 1, 1, 1) + le32(-7) + le32(40));
-  auto numbers = readHostArrayFile(path("n.arr").c_str());
-  ASSERT_TRUE(numbers.has_value());
-  writeHostArrayFile(path("ncopy.arr").c_str(), *numbers, 0);
+  writeHostArrayFile(path("ncopy.arr").c_str(), readHostArrayFile(path("n.arr").c_str()).value(),
+                     0);
   EXPECT_EQ(readBytes(path("ncopy.arr")), head(2, 2, 1, 1, 2) + le32(2) + "-7" + le32(2) + "40");
 }
 
@@ -212,17 +167,15 @@ TEST_F(HostArrayFile, ImageReadAndWrite) {
 TEST_F(HostArrayFile, TruncatedExampleLoadsWhatItHolds) {
   for (size_t n = 0; n <= kExample.size(); ++n) {
     SCOPED_TRACE(n);
-    writeBytes(path("t.arr"), kExample.substr(0, n));
-    ElementArray a;
-    loadHostArrayFile(a, path("t.arr").c_str(), 0);
+    ElementArray a = loaded(loadHostArrayFile, kExample.substr(0, n));
     EXPECT_EQ(a.dimensions(), n < 10 ? 0 : 3);
     EXPECT_EQ(a.boundaryEntry(1), n >= 15 ? 2 : 0);
     EXPECT_EQ(a.boundaryEntry(2), n >= 19 ? 2 : 0);
     const int32_t cells = n < 27 ? 0 : (n > 30) + (n > 35) + (n > 40) + (n > 44);
     ASSERT_EQ(a.size(), cells);
     if (cells >= 1) {
-      EXPECT_STREQ(a.getString(0), n < 35 ? "" : "a");
       EXPECT_EQ(a.at(0).type(), ElementType::String);
+      EXPECT_STREQ(a.getString(0), n < 35 ? "" : "a");
     }
     if (cells >= 2) {
       EXPECT_STREQ(a.getString(1), n < 40 ? "" : "5");
@@ -235,34 +188,24 @@ TEST_F(HostArrayFile, TruncatedExampleLoadsWhatItHolds) {
 
 TEST_F(HostArrayFile, HostileSizesReadNoCellsOrOnlyWhatIsThere) {
   const std::string cells = le32(1) + "a" + le32(1) + "b";
-  const std::string noCells[] = {head(2, -1, 1, 1, 2) + cells,
-                                 head(2, 1, -5, 1, 1) + cells,
-                                 head(2, 1, 1, INT32_MIN, 2) + cells,
-                                 head(2, 65536, 65536, 1, 2) + cells,
-                                 head(2, 2, 1 << 20, 1 << 20, 1) + cells,
-                                 head(1, 4097, 4096, 1, 2),
-                                 head(2, 0, 5, 5, 2) + cells};
-  for (const std::string& bytes : noCells) {
-    writeBytes(path("x.arr"), bytes);
-    ElementArray a;
-    loadHostArrayFile(a, path("x.arr").c_str(), 0);
+  for (const std::string& bytes :
+       {head(2, -1, 1, 1, 2) + cells, head(2, 1, -5, 1, 1) + cells,
+        head(2, 1, 1, INT32_MIN, 2) + cells, head(2, 65536, 65536, 1, 2) + cells,
+        head(2, 2, 1 << 20, 1 << 20, 1) + cells, head(1, 4097, 4096, 1, 2),
+        head(2, 0, 5, 5, 2) + cells}) {
+    ElementArray a = loaded(loadHostArrayFile, bytes);
     EXPECT_EQ(a.size(), 0);
     EXPECT_EQ(a.dimensions(), 3);
   }
   // A huge but valid count reads only the cells the file holds.
-  writeBytes(path("n.arr"), head(2, INT32_MAX, 1, 1, 1) + le32(4) + le32(5) + "\x06");
-  ElementArray n;
-  loadHostArrayFile(n, path("n.arr").c_str(), 0);
+  ElementArray n =
+      loaded(loadHostArrayFile, head(2, INT32_MAX, 1, 1, 1) + le32(4) + le32(5) + "\x06");
   ASSERT_EQ(n.size(), 3);
   EXPECT_EQ(n.getValue(2), 6);
-  writeBytes(path("t.arr"), head(2, 3, 1, 1, 2) + le32(INT32_MAX) + "abc");
-  ElementArray t;
-  loadHostArrayFile(t, path("t.arr").c_str(), 0);
+  ElementArray t = loaded(loadHostArrayFile, head(2, 3, 1, 1, 2) + le32(INT32_MAX) + "abc");
   ASSERT_EQ(t.size(), 1);
   EXPECT_STREQ(t.getString(0), "abc");
-  writeBytes(path("neg.arr"), head(2, 2, 1, 1, 2) + le32(-1) + le32(-1));
-  ElementArray g;
-  loadHostArrayFile(g, path("neg.arr").c_str(), 0);
+  ElementArray g = loaded(loadHostArrayFile, head(2, 2, 1, 1, 2) + le32(-1) + le32(-1));
   ASSERT_EQ(g.size(), 2);
   EXPECT_EQ(g.at(0).type(), ElementType::None);
 }

@@ -20,10 +20,8 @@ class IoTest : public ::testing::Test {
  protected:
   void SetUp() override {
     std::string pattern = (std::filesystem::temp_directory_path() / "quorrel-io-XXXXXX").string();
-    std::vector<char> buffer(pattern.begin(), pattern.end());
-    buffer.push_back('\0');
-    ASSERT_NE(mkdtemp(buffer.data()), nullptr);
-    dir_ = buffer.data();
+    ASSERT_NE(mkdtemp(pattern.data()), nullptr);
+    dir_ = pattern;
   }
   void TearDown() override {
     std::error_code ignored;
@@ -39,13 +37,48 @@ class IoTest : public ::testing::Test {
     return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
   }
   static void writeBytes(const std::string& file, const std::string& bytes) {
-    std::ofstream out(file, std::ios::binary | std::ios::trunc);
-    out.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
+    std::ofstream(file, std::ios::binary | std::ios::trunc) << bytes;
   }
   static bool exists(const std::string& file) { return std::filesystem::exists(file); }
 
+  // The array after loading the bytes into it from a file.
+  template <typename Load>
+  ElementArray loaded(Load load, const std::string& bytes, ElementArray a = {},
+                      int32_t append = 0) {
+    writeBytes(path("in"), bytes);
+    load(a, path("in").c_str(), append);
+    return a;
+  }
+  // The bytes of the file "out" after saving the array into it.
+  template <typename Save>
+  std::string saved(Save save, ElementArray& a, uint16_t mode = 0) {
+    save(a, path("out").c_str(), mode);
+    return readBytes(path("out"));
+  }
+  // Saving into a folder, a missing folder or a read-only folder creates nothing.
+  template <typename Save>
+  void expectNothingSavedToUnusablePaths(Save save) {
+    save(dir_.string().c_str());
+    save(path("no/such/file").c_str());
+    EXPECT_FALSE(exists(path("no")));
+    if (geteuid() == 0) GTEST_SKIP() << "running as root: a read-only folder is still writable";
+    std::filesystem::permissions(
+        dir_, std::filesystem::perms::owner_read | std::filesystem::perms::owner_exec);
+    save(path("ro").c_str());
+    EXPECT_FALSE(exists(path("ro")));
+  }
+
   std::filesystem::path dir_;
 };
+
+// An array of the given dimensions and first boundaries.
+inline ElementArray shaped(int32_t dimensions, int32_t x = 0, int32_t y = 0) {
+  ElementArray a;
+  a.setDimensions(dimensions);
+  if (x != 0) a.setBoundary(1, x);
+  if (y != 0) a.setBoundary(2, y);
+  return a;
+}
 
 // Little-endian field builders for hand-made files.
 inline std::string le16(uint16_t v) {
@@ -53,8 +86,7 @@ inline std::string le16(uint16_t v) {
 }
 inline std::string le32(int32_t v) {
   const auto u = static_cast<uint32_t>(v);
-  return {static_cast<char>(u & 0xFF), static_cast<char>((u >> 8) & 0xFF),
-          static_cast<char>((u >> 16) & 0xFF), static_cast<char>(u >> 24)};
+  return le16(static_cast<uint16_t>(u & 0xFFFF)) + le16(static_cast<uint16_t>(u >> 16));
 }
 inline std::string bytesOf(std::initializer_list<int> values) {
   std::string s;
@@ -66,6 +98,11 @@ inline std::string bytesOf(std::initializer_list<int> values) {
 inline std::string contentOf(const Element& e) {
   return e.bytes() == nullptr ? std::string()
                               : std::string(e.bytes(), static_cast<size_t>(e.size()));
+}
+// Type, size, number and bytes in one text, for whole-element comparisons.
+inline std::string describe(const Element& e) {
+  return std::to_string(static_cast<int>(e.type())) + "/" + std::to_string(e.size()) + "/" +
+         std::to_string(e.number()) + "/" + contentOf(e);
 }
 
 }  // namespace quorrel
