@@ -24,25 +24,12 @@ inline constexpr const char* kExpressionParams[60] = {
     "--", "I-", "--", "I-", "--", "T-", "I-", "II", "II", "TI",   // 40-49
     "TI", "--", "I-", "I-", "I-", "I-", "T-", "T-", "T-", "T-"};  // 50-59
 
+// The information entries' codes of those types.
 inline uint16_t typeCode(char c) {
-  switch (c) {
-    case 'N':
-      return 22;
-    case 'T':
-      return 45;
-    default:
-      return 0;
-  }
+  return c == 'N' ? 22 : c == 'T' ? 45 : 0;
 }
 inline uint16_t expressionTypeCode(char c) {
-  switch (c) {
-    case 'I':
-      return 1;
-    case 'T':
-      return 3;
-    default:
-      return 0;
-  }
+  return c == 'I' ? 1 : c == 'T' ? 3 : 0;
 }
 
 }  // namespace testhost

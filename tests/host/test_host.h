@@ -28,46 +28,42 @@ void writeAt(void* base, std::size_t offset, T value) {
   std::memcpy(static_cast<char*>(base) + offset, &value, sizeof value);
 }
 
-// The module, loaded once for the whole test program.
-class Module {
- public:
+// The module, loaded once for the whole test program, and its entry points by name.
+struct Module {
+  void* handle = dlopen(QUORREL_MODULE_PATH, RTLD_NOW | RTLD_LOCAL);
+  std::string error = handle ? "" : dlerror();
+  std::vector<unsigned char> runInfo = std::vector<unsigned char>(64, 0xCC);
   static Module& get() {
     static Module module;
     return module;
   }
-  void* symbol(const char* name) const { return handle_ ? dlsym(handle_, name) : nullptr; }
-  template <typename Fn>
-  Fn entry(const char* name) const {
-    void* address = symbol(name);
-    Fn fn = nullptr;
-    std::memcpy(&fn, &address, sizeof fn);
-    return fn;
-  }
-  bool loaded() const { return handle_ != nullptr; }
-  const char* error() const { return error_.c_str(); }
-
-  // Filled by GetRunObjectInfos.
-  std::vector<unsigned char> runInfo;
-  const ActionRoutine* actions() const {
-    return readAt<const ActionRoutine*>(runInfo.data(), kInfoActionRoutines);
-  }
-  const ExpressionRoutine* expressions() const {
-    return readAt<const ExpressionRoutine*>(runInfo.data(), kInfoExpressionRoutines);
-  }
-
- private:
-  Module() {
-    handle_ = dlopen(QUORREL_MODULE_PATH, RTLD_NOW | RTLD_LOCAL);
-    if (handle_ == nullptr) {
-      error_ = dlerror();
-      return;
-    }
-    runInfo.assign(64, 0xCC);
-    entry<GetRunObjectInfosFn>("GetRunObjectInfos")(0, runInfo.data());
-  }
-  void* handle_ = nullptr;
-  std::string error_;
 };
+inline void* symbol(const char* name) {
+  return Module::get().handle ? dlsym(Module::get().handle, name) : nullptr;
+}
+template <typename Fn>
+Fn entry(const char* name) {
+  void* address = symbol(name);
+  Fn fn = nullptr;
+  std::memcpy(&fn, &address, sizeof fn);
+  return fn;
+}
+// The routine tables, from the RunInfo the module fills in once.
+inline const unsigned char* runInfo() {
+  static const bool filled =
+      symbol("GetRunObjectInfos") &&
+      entry<GetRunObjectInfosFn>("GetRunObjectInfos")(0, Module::get().runInfo.data());
+  (void)filled;
+  return Module::get().runInfo.data();
+}
+inline const ActionRoutine* actionRoutines() {
+  return readAt<const ActionRoutine*>(runInfo(), kInfoActionRoutines);
+}
+inline const ExpressionRoutine* expressionRoutines() {
+  return readAt<const ExpressionRoutine*>(runInfo(), kInfoExpressionRoutines);
+}
+
+#define ASSERT_MODULE_LOADED() ASSERT_NE(Module::get().handle, nullptr) << Module::get().error
 
 // A setup record as the host stores it, starting from the editor's defaults.
 struct SetupRecord {
@@ -75,9 +71,7 @@ struct SetupRecord {
   SetupRecord() {
     writeAt<int16_t>(bytes.data(), kSetupObjectWidth, 32);
     writeAt<int16_t>(bytes.data(), kSetupObjectHeight, 32);
-    set(kSetupDimensionCount, 2);
-    set(kSetupXBoundary, 10);
-    set(kSetupYBoundary, 10);
+    set(kSetupDimensionCount, 2).set(kSetupXBoundary, 10).set(kSetupYBoundary, 10);
     delimiter(",");
   }
   SetupRecord& set(std::size_t offset, int32_t value) {
@@ -91,6 +85,9 @@ struct SetupRecord {
   }
   void* data() { return bytes.data(); }
 };
+inline SetupRecord oneD() {
+  return SetupRecord().set(kSetupDimensionCount, 1);
+}
 
 // An action or expression argument: a number or a text.
 struct Arg {
@@ -118,8 +115,7 @@ class Instance {
  public:
   explicit Instance(SetupRecord setup = SetupRecord(), bool createNow = true)
       : setup_(std::move(setup)) {
-    Module& module = Module::get();
-    const auto dataSize = module.entry<GetRunObjectDataSizeFn>("GetRunObjectDataSize")(0, 0);
+    const auto dataSize = entry<GetRunObjectDataSizeFn>("GetRunObjectDataSize")(0, 0);
     record_.assign(static_cast<std::size_t>(dataSize), 0);
     header_.assign(kRunHeaderMinSize, 0);
     writeAt<Instance*>(record_.data(), 0, this);  // host-owned bytes: find the instance back
@@ -131,10 +127,10 @@ class Instance {
   }
   void create() {
     created_ = true;
-    Module::get().entry<CreateRunObjectFn>("CreateRunObject")(record_.data(), setup_.data(), 0);
+    entry<CreateRunObjectFn>("CreateRunObject")(record_.data(), setup_.data(), 0);
   }
   ~Instance() {
-    if (created_) Module::get().entry<DestroyRunObjectFn>("DestroyRunObject")(record_.data(), 0);
+    if (created_) entry<DestroyRunObjectFn>("DestroyRunObject")(record_.data(), 0);
   }
   Instance(const Instance&) = delete;
   Instance& operator=(const Instance&) = delete;
@@ -146,14 +142,14 @@ class Instance {
   int32_t betweenColumn() const { return readAt<int32_t>(record_.data(), kRunBetweenColumn); }
 
   int16_t action(int code, const Arg& p1 = Arg(), const Arg& p2 = Arg()) {
-    return Module::get().actions()[code](record_.data(), p1.word(), p2.word());
+    return actionRoutines()[code](record_.data(), p1.word(), p2.word());
   }
   HostWord expression(int code, std::vector<Arg> params = {}) {
     params_ = std::move(params);
     next_ = 0;
     fetches.clear();
     allocations.clear();
-    return Module::get().expressions()[code](record_.data(), kToken);
+    return expressionRoutines()[code](record_.data(), kToken);
   }
   // A number result: the string flag must stay as it was.
   int32_t number(int code, std::vector<Arg> params = {}) {
@@ -188,9 +184,8 @@ class Instance {
  private:
   static Instance* owner(void* record) { return readAt<Instance*>(record, 0); }
   static HostWord QUORREL_CALL fetchFirst(void* record, int32_t flag, HostWord token) {
-    Instance* self = owner(record);
-    self->next_ = 0;
-    return self->fetch(true, flag, token);
+    owner(record)->next_ = 0;
+    return owner(record)->fetch(true, flag, token);
   }
   static HostWord QUORREL_CALL fetchNext(void* record, int32_t flag, HostWord token) {
     return owner(record)->fetch(false, flag, token);
@@ -206,19 +201,26 @@ class Instance {
     fetches.push_back({first, flag, token});
     if (next_ >= params_.size()) return 0;
     const Arg& arg = params_[next_++];
-    if (flag == kFetchText) {
-      return reinterpret_cast<HostWord>(arg.isText ? arg.text.c_str() : "");
-    }
+    if (flag == kFetchText) return reinterpret_cast<HostWord>(arg.isText ? arg.text.c_str() : "");
     return static_cast<HostWord>(arg.number);
   }
 
   SetupRecord setup_;
   bool created_ = false;
-  std::vector<unsigned char> record_;
-  std::vector<unsigned char> header_;
+  std::vector<unsigned char> record_, header_;
   std::vector<Arg> params_;
   std::size_t next_ = 0;
   std::deque<std::vector<char>> buffers_;
 };
+
+// Arguments for an expression's declared parameter types.
+inline std::vector<Arg> argsFor(const char* types, int32_t number, const char* text) {
+  std::vector<Arg> args;
+  for (int i = 0; i < 2; ++i) {
+    if (types[i] == 'I') args.emplace_back(number);
+    if (types[i] == 'T') args.emplace_back(text);
+  }
+  return args;
+}
 
 }  // namespace testhost
