@@ -4,10 +4,10 @@
 
 #include <cstring>
 #include <map>
-#include <set>
 #include <sstream>
 #include <string>
-#include <vector>
+#include <tuple>
+#include <utility>
 
 #include "expectations.h"
 #include "host/entry_points.h"
@@ -19,10 +19,8 @@ namespace {
 // One line per item: two spaces per level, ID "Text", "Text" for a submenu, - for a
 // separator. Every command must be plain (no check, no grey).
 std::string dump(HMENU menu, int depth = 0) {
-  std::string out;
-  std::string indent(static_cast<std::size_t>(depth) * 2, ' ');
-  int count = GetMenuItemCount(menu);
-  for (int position = 0; position < count; ++position) {
+  std::string out, indent(static_cast<std::size_t>(depth) * 2, ' ');
+  for (int position = 0; position < GetMenuItemCount(menu); ++position) {
     UINT id = GetMenuItemID(menu, position);
     UINT state = GetMenuState(menu, static_cast<UINT>(position), MF_BYPOSITION);
     if (id == 0) {
@@ -44,16 +42,15 @@ std::string dump(HMENU menu, int depth = 0) {
   return out;
 }
 
-// The documented tree's command texts by id.
-std::map<int, std::string> commandTexts(const char* tree) {
-  std::map<int, std::string> texts;
+// The written-out tree's commands: id and text.
+std::multimap<int, std::string> commands(const char* tree) {
+  std::multimap<int, std::string> texts;
   std::istringstream lines(tree);
-  std::string line;
-  while (std::getline(lines, line)) {
+  for (std::string line; std::getline(lines, line);) {
     std::size_t start = line.find_first_not_of(' ');
     if (line[start] < '0' || line[start] > '9') continue;
     std::size_t quote = line.find('"');
-    texts[std::stoi(line.substr(start))] = line.substr(quote + 1, line.size() - quote - 2);
+    texts.emplace(std::stoi(line.substr(start)), line.substr(quote + 1, line.size() - quote - 2));
   }
   return texts;
 }
@@ -66,82 +63,10 @@ struct OwnedMenu {
   }
 };
 
-HMENU submenuNamed(HMENU menu, const char* text) {
-  for (int position = 0; position < GetMenuItemCount(menu); ++position) {
-    char buffer[128];
-    GetMenuStringA(menu, static_cast<UINT>(position), buffer, sizeof buffer, MF_BYPOSITION);
-    if (std::strcmp(buffer, text) == 0) return GetSubMenu(menu, position);
-  }
-  return nullptr;
-}
-
-std::string textAt(HMENU menu, int position) {
-  char buffer[128] = "";
-  GetMenuStringA(menu, static_cast<UINT>(position), buffer, sizeof buffer, MF_BYPOSITION);
-  return buffer;
-}
-
-TEST(EditorMenus, ActionMenuIsTheDocumentedTree) {
-  OwnedMenu action(GetActionMenu(0, 0, 0));
-  ASSERT_NE(action.menu, nullptr);
-  EXPECT_EQ(dump(action.menu), kActionMenuTree);
-
-  // First and last items: the submenus "File" and "Settings"; "Settings" ends with
-  // the command 25057.
-  int count = GetMenuItemCount(action.menu);
-  ASSERT_EQ(count, 10);
-  EXPECT_EQ(textAt(action.menu, 0), "File");
-  EXPECT_NE(GetSubMenu(action.menu, 0), nullptr);
-  EXPECT_EQ(textAt(action.menu, count - 1), "Settings");
-  HMENU settings = GetSubMenu(action.menu, count - 1);
-  ASSERT_NE(settings, nullptr);
-  int last = GetMenuItemCount(settings) - 1;
-  EXPECT_EQ(GetMenuItemID(settings, last), 25057u);
-  EXPECT_EQ(textAt(settings, last), "Set list delimiter");
-
-  // "Between": 25015, 25038, a separator, 25049, 25026.
-  HMENU between = submenuNamed(
-      submenuNamed(
-          submenuNamed(submenuNamed(action.menu, "Recordset (2D Array)"), "Rows (Records)"),
-          "Select"),
-      "Between");
-  ASSERT_NE(between, nullptr);
-  std::vector<UINT> ids;
-  for (int position = 0; position < GetMenuItemCount(between); ++position) {
-    ids.push_back(GetMenuItemID(between, position));
-  }
-  EXPECT_EQ(ids, (std::vector<UINT>{25015, 25038, 0, 25049, 25026}));
-}
-
-TEST(EditorMenus, ExpressionMenuIsTheDocumentedTree) {
+TEST(EditorMenus, MenusAreTheWrittenOutTreesAndEveryCallIsFresh) {
   OwnedMenu expression(GetExpressionMenu(0, 0, 0));
   ASSERT_NE(expression.menu, nullptr);
   EXPECT_EQ(dump(expression.menu), kExpressionMenuTree);
-
-  EXPECT_EQ(GetMenuItemID(expression.menu, 0), 27000u);
-  EXPECT_EQ(textAt(expression.menu, 0), "Get size");
-  EXPECT_EQ(GetMenuItemID(expression.menu, 1), 27001u);
-  EXPECT_EQ(textAt(expression.menu, 1), "Get capacity");
-  int last = GetMenuItemCount(expression.menu) - 1;
-  EXPECT_EQ(textAt(expression.menu, last), "Recordset (2D Array)");
-}
-
-TEST(EditorMenus, EveryCodeHasExactlyOneCommand) {
-  for (auto [tree, base, count] :
-       {std::tuple{kActionMenuTree, 25000, 79}, std::tuple{kExpressionMenuTree, 27000, 60}}) {
-    std::multiset<int> ids;
-    std::istringstream lines(tree);
-    std::string line;
-    while (std::getline(lines, line)) {
-      std::size_t start = line.find_first_not_of(' ');
-      if (line[start] >= '0' && line[start] <= '9') ids.insert(std::stoi(line.substr(start)));
-    }
-    ASSERT_EQ(ids.size(), static_cast<std::size_t>(count));
-    for (int code = 0; code < count; ++code) EXPECT_EQ(ids.count(base + code), 1u) << code;
-  }
-}
-
-TEST(EditorMenus, ConditionMenuIsNullAndEveryMenuIsFresh) {
   EXPECT_EQ(GetConditionMenu(0, 0, 0), nullptr);
 
   // Each call builds its own popup; the caller may destroy one and keep the other.
@@ -150,31 +75,39 @@ TEST(EditorMenus, ConditionMenuIsNullAndEveryMenuIsFresh) {
   ASSERT_NE(first.menu, nullptr);
   ASSERT_NE(second.menu, nullptr);
   ASSERT_NE(second.menu, first.menu);
+  EXPECT_EQ(dump(first.menu), kActionMenuTree);
   EXPECT_EQ(DestroyMenu(first.menu), TRUE);
   first.menu = nullptr;
   EXPECT_EQ(dump(second.menu), kActionMenuTree);
+
+  // The written-out trees hold every code exactly once.
+  for (auto [tree, base, count] :
+       {std::tuple{kActionMenuTree, 25000, 79}, std::tuple{kExpressionMenuTree, 27000, 60}}) {
+    const auto ids = commands(tree);
+    ASSERT_EQ(ids.size(), static_cast<std::size_t>(count));
+    for (int code = 0; code < count; ++code) EXPECT_EQ(ids.count(base + code), 1u) << code;
+  }
 }
 
 TEST(EditorMenus, CodesFromMenuCommands) {
-  EXPECT_EQ(GetActionCodeFromMenu(nullptr, 24999), -1);
-  EXPECT_EQ(GetActionCodeFromMenu(nullptr, 25000), 0);
-  EXPECT_EQ(GetActionCodeFromMenu(nullptr, 25057), 57);
-  EXPECT_EQ(GetActionCodeFromMenu(nullptr, 25078), 78);
-  EXPECT_EQ(GetActionCodeFromMenu(nullptr, 25079), -1);
-  EXPECT_EQ(GetActionCodeFromMenu(nullptr, 27000), -1);
   // Only the low 16 bits of the id count.
-  EXPECT_EQ(GetActionCodeFromMenu(nullptr, 0x10000 + 25006), 6);
-
-  EXPECT_EQ(GetExpressionCodeFromMenu(nullptr, 26999), -1);
-  EXPECT_EQ(GetExpressionCodeFromMenu(nullptr, 27000), 0);
-  EXPECT_EQ(GetExpressionCodeFromMenu(nullptr, 27059), 59);
-  EXPECT_EQ(GetExpressionCodeFromMenu(nullptr, 27060), -1);
-  EXPECT_EQ(GetExpressionCodeFromMenu(nullptr, 25000), -1);
-
+  for (auto [id, code] : {std::pair{24999, -1},
+                          {25000, 0},
+                          {25057, 57},
+                          {25078, 78},
+                          {25079, -1},
+                          {27000, -1},
+                          {0x10000 + 25006, 6}}) {
+    EXPECT_EQ(GetActionCodeFromMenu(nullptr, id), code) << id;
+  }
+  for (auto [id, code] :
+       {std::pair{26999, -1}, {27000, 0}, {27059, 59}, {27060, -1}, {25000, -1}}) {
+    EXPECT_EQ(GetExpressionCodeFromMenu(nullptr, id), code) << id;
+  }
   for (int id : {0, 25000, 26000, 27000, -1}) EXPECT_EQ(GetConditionCodeFromMenu(nullptr, id), -1);
 }
 
-TEST(EditorTitles, ActionTitlesAreTheMenuTextsForBothParameters) {
+TEST(EditorTitles, TitlesAreTheMenuTexts) {
   for (int code = 0; code < 79; ++code) {
     for (int param = 0; param < 2; ++param) {
       char buffer[256];
@@ -183,76 +116,42 @@ TEST(EditorTitles, ActionTitlesAreTheMenuTextsForBothParameters) {
       EXPECT_STREQ(buffer, kActionMenuTexts[code]) << code << " " << param;
     }
   }
-  char buffer[64];
-  GetActionTitle(nullptr, 44, 1, buffer, sizeof buffer);
-  EXPECT_STREQ(buffer, "Sort rows by label value ascending");
-  GetActionTitle(nullptr, 6, 0, buffer, sizeof buffer);
-  EXPECT_STREQ(buffer, "Insert string at");
-
-  // Cut to the buffer, terminator included.
-  GetActionTitle(nullptr, 44, 0, buffer, 5);
-  EXPECT_STREQ(buffer, "Sort");
-}
-
-TEST(EditorTitles, ExpressionTitlesAreTheMenuTexts) {
-  std::map<int, std::string> texts = commandTexts(kExpressionMenuTree);
+  const auto texts = commands(kExpressionMenuTree);
   for (int code = 0; code < 60; ++code) {
     char buffer[256] = "";
     EXPECT_NE(GetExpressionTitle(nullptr, code, buffer, sizeof buffer), 0);
-    EXPECT_EQ(buffer, texts[27000 + code]) << code;
+    EXPECT_EQ(buffer, texts.find(27000 + code)->second) << code;
   }
-  char buffer[64];
-  GetExpressionTitle(nullptr, 39, buffer, sizeof buffer);
-  EXPECT_STREQ(buffer, "Get index from X,Y");
-}
-
-TEST(EditorTitles, ConditionTitleFindsNoTextButAnswers) {
   char buffer[16] = "untouched";
-  EXPECT_NE(GetConditionTitle(nullptr, 0, 0, buffer, sizeof buffer), 0);
+  EXPECT_NE(GetConditionTitle(nullptr, 0, 0, buffer, sizeof buffer), 0);  // no text, answers
   EXPECT_STREQ(buffer, "untouched");
+  GetActionTitle(nullptr, 44, 0, buffer, 5);  // cut to the buffer, terminator included
+  EXPECT_STREQ(buffer, "Sort");
 }
 
 TEST(EditorStrings, EveryDisplayStringAndName) {
+  char buffer[256];
   for (int code = 0; code < 79; ++code) {
-    char buffer[256];
-    int copied = GetActionString(nullptr, code, buffer, sizeof buffer);
+    EXPECT_EQ(GetActionString(nullptr, code, buffer, sizeof buffer),
+              static_cast<int>(std::strlen(kActionStrings[code])));
     EXPECT_STREQ(buffer, kActionStrings[code]) << code;
-    EXPECT_EQ(copied, static_cast<int>(std::strlen(kActionStrings[code])));
-    // "10" for the actions without parameters, "11" for the others.
-    EXPECT_EQ(std::strncmp(buffer, "10%s: ", 6) == 0 || std::strncmp(buffer, "11%s: ", 6) == 0,
-              true)
-        << code;
   }
   for (int code = 0; code < 60; ++code) {
-    char buffer[256];
-    int copied = GetExpressionString(nullptr, code, buffer, sizeof buffer);
+    EXPECT_EQ(GetExpressionString(nullptr, code, buffer, sizeof buffer),
+              static_cast<int>(std::strlen(kExpressionNames[code])));
     EXPECT_STREQ(buffer, kExpressionNames[code]) << code;
-    EXPECT_EQ(copied, static_cast<int>(std::strlen(kExpressionNames[code])));
   }
-
-  char buffer[64];
-  EXPECT_EQ(GetActionString(nullptr, 17, buffer, sizeof buffer), 16);
-  EXPECT_STREQ(buffer, "10%s: Delete all");
-  EXPECT_EQ(GetActionString(nullptr, 6, buffer, sizeof buffer), 28);
-  EXPECT_STREQ(buffer, "11%s: Insert string %s at %s");
-  EXPECT_EQ(GetExpressionString(nullptr, 0, buffer, sizeof buffer), 5);
-  EXPECT_STREQ(buffer, "size(");
-
   // No conditions, so no condition strings; nor strings past the tables.
   EXPECT_EQ(GetConditionString(nullptr, 0, buffer, sizeof buffer), 0);
   EXPECT_EQ(GetActionString(nullptr, 79, buffer, sizeof buffer), 0);
   EXPECT_EQ(GetExpressionString(nullptr, 60, buffer, sizeof buffer), 0);
-}
 
-TEST(EditorStrings, SmallBuffersAndSixteenBitArguments) {
-  char buffer[32];
   EXPECT_EQ(GetActionString(nullptr, 6, buffer, 10), 9);
   EXPECT_STREQ(buffer, "11%s: Ins");
   EXPECT_EQ(GetActionString(nullptr, 6, buffer, 1), 0);
   EXPECT_STREQ(buffer, "");
   EXPECT_EQ(GetExpressionString(nullptr, 39, buffer, 6), 5);
   EXPECT_STREQ(buffer, "index");
-
   // The size counts in 16 bits, the code in its low 16 bits.
   EXPECT_EQ(GetActionString(nullptr, 6, buffer, 0x1000A), 9);
   EXPECT_STREQ(buffer, "11%s: Ins");

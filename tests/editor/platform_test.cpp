@@ -14,10 +14,8 @@ namespace quorrel::editor_test {
 namespace {
 
 TEST(PortableMenus, BuildReadAndRelease) {
-  HMENU top = CreatePopupMenu();
-  HMENU sub = CreatePopupMenu();
-  ASSERT_NE(top, nullptr);
-  ASSERT_NE(sub, nullptr);
+  HMENU top = CreatePopupMenu(), sub = CreatePopupMenu();
+  ASSERT_TRUE(top && sub);
   EXPECT_TRUE(AppendMenuA(top, MF_CHECKED | MF_GRAYED, 501, "First"));
   EXPECT_TRUE(AppendMenuA(top, MF_SEPARATOR, 0, nullptr));
   EXPECT_TRUE(AppendMenuA(sub, MF_STRING, 601, "Inner"));
@@ -86,8 +84,6 @@ TEST(PortableMenus, ResourceMenus) {
 
 TEST(PortableStrings, LoadStringCountsAndCuts) {
   char text[32];
-  EXPECT_EQ(LoadStringA(nullptr, 128, text, sizeof text), 14);
-  EXPECT_STREQ(text, "Quorrel object");
   EXPECT_EQ(LoadStringA(nullptr, 1, text, sizeof text), 3);
   EXPECT_STREQ(text, "MF2");
   EXPECT_EQ(LoadStringA(nullptr, 2, text, 5), 4);
@@ -100,7 +96,7 @@ TEST(PortableStrings, LoadStringCountsAndCuts) {
 
   auto* block = static_cast<unsigned char*>(LocalAlloc(LPTR, 80));
   ASSERT_NE(block, nullptr);
-  for (int i = 0; i < 80; ++i) EXPECT_EQ(block[i], 0) << i;
+  EXPECT_EQ(std::vector<unsigned char>(block, block + 80), std::vector<unsigned char>(80, 0));
   EXPECT_EQ(LocalFree(block), nullptr);
 }
 

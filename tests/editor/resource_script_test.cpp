@@ -3,9 +3,9 @@
 // control, read back from the compiler's binary .res output.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cctype>
 #include <cstdint>
-#include <cstring>
 #include <fstream>
 #include <iterator>
 #include <map>
@@ -29,26 +29,22 @@ Bytes readFile(const std::string& path) {
 }
 
 // Little-endian reads with a moving position; a read past the end fails the test.
-class Reader {
- public:
-  Reader(const Bytes& bytes, std::size_t begin, std::size_t end)
-      : bytes_(bytes), pos_(begin), end_(end) {}
+struct Reader {
+  const Bytes& bytes;
+  std::size_t pos, end;
 
-  bool done() const { return pos_ >= end_; }
-  std::size_t position() const { return pos_; }
-  void align(std::size_t to) { pos_ = (pos_ + to - 1) / to * to; }
-  void skip(std::size_t n) { pos_ += n; }
-
+  bool done() const { return pos >= end; }
+  void align(std::size_t to) { pos = (pos + to - 1) / to * to; }
   uint16_t word() {
-    if (pos_ + 2 > end_) {
-      ADD_FAILURE() << "read past the end at " << pos_;
-      pos_ = end_;
+    if (pos + 2 > end) {
+      ADD_FAILURE() << "read past the end at " << pos;
+      pos = end;
       return 0;
     }
-    uint16_t value = static_cast<uint16_t>(bytes_[pos_] | bytes_[pos_ + 1] << 8);
-    pos_ += 2;
-    return value;
+    pos += 2;
+    return static_cast<uint16_t>(bytes[pos - 2] | bytes[pos - 1] << 8);
   }
+  int16_t signedWord() { return static_cast<int16_t>(word()); }
   uint32_t dword() {
     uint32_t low = word();
     return low | static_cast<uint32_t>(word()) << 16;
@@ -62,32 +58,25 @@ class Reader {
   // A name or an ordinal: 0xFFFF and a number, or a text.
   std::string nameOrOrdinal(uint16_t& ordinal) {
     ordinal = 0;
-    if (pos_ + 2 <= end_ && bytes_[pos_] == 0xFF && bytes_[pos_ + 1] == 0xFF) {
+    if (pos + 2 <= end && bytes[pos] == 0xFF && bytes[pos + 1] == 0xFF) {
       word();
       ordinal = word();
       return {};
     }
     return text();
   }
-
- private:
-  const Bytes& bytes_;
-  std::size_t pos_;
-  std::size_t end_;
 };
 
 struct Resource {
-  uint16_t type;
-  uint16_t id;
-  uint16_t language;
+  uint16_t type, id, language;
   std::size_t begin, end;
 };
 
 std::vector<Resource> resourcesOf(const Bytes& file) {
   std::vector<Resource> out;
-  Reader reader(file, 0, file.size());
+  Reader reader{file, 0, file.size()};
   while (!reader.done()) {
-    std::size_t start = reader.position();
+    std::size_t start = reader.pos;
     uint32_t dataSize = reader.dword();
     uint32_t headerSize = reader.dword();
     Resource resource{};
@@ -100,72 +89,54 @@ std::vector<Resource> resourcesOf(const Bytes& file) {
     resource.begin = start + headerSize;
     resource.end = resource.begin + dataSize;
     if (resource.type != 0) out.push_back(resource);
-    reader.skip(resource.end - reader.position());
+    reader.pos = resource.end;
     reader.align(4);
   }
   return out;
 }
 
-struct CompiledItem {
-  uint16_t flags, id;
-  std::string text;
-};
-
-std::vector<CompiledItem> compiledMenu(const Bytes& file, const Resource& r) {
-  Reader reader(file, r.begin, r.end);
+void expectSameMenu(const Bytes& file, const Resource& r,
+                    const quorrel::platform::MenuResource& generated) {
+  Reader reader{file, r.begin, r.end};
   EXPECT_EQ(reader.dword(), 0u);  // menu header: version and size 0
-  std::vector<CompiledItem> items;
-  while (!reader.done()) {
-    CompiledItem item{};
-    item.flags = reader.word();
-    if (!(item.flags & 0x10)) item.id = reader.word();
-    item.text = reader.text();
-    items.push_back(item);
+  std::size_t i = 0;
+  for (; !reader.done() && i < generated.items.size(); ++i) {
+    const auto& item = generated.items[i];
+    const uint16_t flags = reader.word();
+    EXPECT_EQ(flags, item.flags) << r.id << ":" << i;
+    EXPECT_EQ(flags & 0x10 ? 0 : reader.word(), item.id) << r.id << ":" << i;
+    EXPECT_EQ(reader.text(), item.text) << r.id << ":" << i;
   }
-  return items;
+  EXPECT_TRUE(reader.done() && i == generated.items.size()) << "menu " << r.id;
 }
 
 // String blocks of sixteen counted texts; block b holds ids (b - 1) * 16 to b * 16 - 1.
 void addStrings(const Bytes& file, const Resource& r, std::map<uint16_t, std::string>& strings) {
-  Reader reader(file, r.begin, r.end);
+  Reader reader{file, r.begin, r.end};
   for (uint16_t i = 0; i < 16; ++i) {
-    uint16_t length = reader.word();
-    std::string text;
-    for (uint16_t c = 0; c < length; ++c) text += static_cast<char>(reader.word());
-    if (length) strings[static_cast<uint16_t>((r.id - 1) * 16 + i)] = text;
+    std::string text(reader.word(), ' ');
+    for (char& c : text) c = static_cast<char>(reader.word());
+    if (!text.empty()) strings[static_cast<uint16_t>((r.id - 1) * 16 + i)] = text;
   }
-}
-
-std::string lowerCase(std::string text) {
-  for (char& c : text) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
-  return text;
 }
 
 // Class names compare without case, as Windows matches them.
-std::string className(uint16_t atom, const std::string& name) {
-  switch (atom) {
-    case 0x80:
-      return "button";
-    case 0x81:
-      return "edit";
-    case 0x82:
-      return "static";
-    default:
-      return lowerCase(name);
-  }
+std::string className(uint16_t atom, std::string name) {
+  if (atom >= 0x80 && atom <= 0x82)
+    return std::vector<std::string>{"button", "edit", "static"}[atom - 0x80];
+  for (char& c : name) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+  return name;
 }
 
 void expectSameDialog(const Bytes& file, const Resource& r,
                       const quorrel::platform::DialogResource& generated) {
-  Reader reader(file, r.begin, r.end);
+  Reader reader{file, r.begin, r.end};
   EXPECT_EQ(reader.dword(), generated.style);
   EXPECT_EQ(reader.dword(), 0u);  // extended style
-  uint16_t count = reader.word();
-  ASSERT_EQ(count, generated.controls.size());
-  EXPECT_EQ(static_cast<int16_t>(reader.word()), generated.x);
-  EXPECT_EQ(static_cast<int16_t>(reader.word()), generated.y);
-  EXPECT_EQ(static_cast<int16_t>(reader.word()), generated.cx);
-  EXPECT_EQ(static_cast<int16_t>(reader.word()), generated.cy);
+  ASSERT_EQ(reader.word(), generated.controls.size());
+  EXPECT_EQ((std::vector<int16_t>{reader.signedWord(), reader.signedWord(), reader.signedWord(),
+                                  reader.signedWord()}),
+            (std::vector<int16_t>{generated.x, generated.y, generated.cx, generated.cy}));
   uint16_t ordinal;
   EXPECT_EQ(reader.nameOrOrdinal(ordinal), "");  // no menu
   EXPECT_EQ(reader.nameOrOrdinal(ordinal), "");  // the standard dialog class
@@ -177,14 +148,14 @@ void expectSameDialog(const Bytes& file, const Resource& r,
     reader.align(4);
     EXPECT_EQ(reader.dword(), control.style) << control.text;
     EXPECT_EQ(reader.dword(), 0u);
-    EXPECT_EQ(static_cast<int16_t>(reader.word()), control.x) << control.text;
-    EXPECT_EQ(static_cast<int16_t>(reader.word()), control.y) << control.text;
-    EXPECT_EQ(static_cast<int16_t>(reader.word()), control.cx) << control.text;
-    EXPECT_EQ(static_cast<int16_t>(reader.word()), control.cy) << control.text;
+    EXPECT_EQ((std::vector<int16_t>{reader.signedWord(), reader.signedWord(), reader.signedWord(),
+                                    reader.signedWord()}),
+              (std::vector<int16_t>{control.x, control.y, control.cx, control.cy}))
+        << control.text;
     EXPECT_EQ(reader.word(), control.id) << control.text;
     uint16_t atom;
     std::string name = reader.nameOrOrdinal(atom);
-    EXPECT_EQ(className(atom, name), lowerCase(control.className)) << control.text;
+    EXPECT_EQ(className(atom, name), className(0, control.className)) << control.text;
     EXPECT_EQ(reader.nameOrOrdinal(ordinal), control.text);
     EXPECT_EQ(reader.word(), 0u);  // no creation data
   }
@@ -204,19 +175,13 @@ TEST(ResourceScript, GeneratedTablesEqualTheCompiledScript) {
   for (const Resource& r : resourcesOf(file)) {
     EXPECT_EQ(r.language, kEnglishUs) << r.type << " " << r.id;
     ++kinds[r.type];
+    const Bytes content(file.begin() + static_cast<std::ptrdiff_t>(r.begin),
+                        file.begin() + static_cast<std::ptrdiff_t>(r.end));
     if (r.type == kTypeMenu) {
-      const quorrel::platform::MenuResource* generated = nullptr;
-      for (const auto& menu : data.menus) {
-        if (menu.id == r.id) generated = &menu;
-      }
-      ASSERT_NE(generated, nullptr) << "menu " << r.id;
-      std::vector<CompiledItem> compiled = compiledMenu(file, r);
-      ASSERT_EQ(compiled.size(), generated->items.size()) << "menu " << r.id;
-      for (std::size_t i = 0; i < compiled.size(); ++i) {
-        EXPECT_EQ(compiled[i].flags, generated->items[i].flags) << r.id << ":" << i;
-        EXPECT_EQ(compiled[i].id, generated->items[i].id) << r.id << ":" << i;
-        EXPECT_EQ(compiled[i].text, generated->items[i].text) << r.id << ":" << i;
-      }
+      auto generated = std::find_if(data.menus.begin(), data.menus.end(),
+                                    [&](const auto& menu) { return menu.id == r.id; });
+      ASSERT_NE(generated, data.menus.end()) << "menu " << r.id;
+      expectSameMenu(file, r, *generated);
     } else if (r.type == kTypeString) {
       addStrings(file, r, strings);
     } else if (r.type == kTypeDialog) {
@@ -228,26 +193,19 @@ TEST(ResourceScript, GeneratedTablesEqualTheCompiledScript) {
       Bytes picture =
           readFile(std::string(QUORREL_RESOURCE_DIR) + "/quorrel" + std::to_string(r.id) + ".bmp");
       ASSERT_GT(picture.size(), 14u);
-      EXPECT_TRUE(std::equal(picture.begin() + 14, picture.end(),
-                             file.begin() + static_cast<std::ptrdiff_t>(r.begin),
-                             file.begin() + static_cast<std::ptrdiff_t>(r.end)));
+      EXPECT_EQ(Bytes(picture.begin() + 14, picture.end()), content);
     } else if (r.type == kTypeData) {
       EXPECT_EQ(r.id, 200);
-      EXPECT_EQ(Bytes(file.begin() + static_cast<std::ptrdiff_t>(r.begin),
-                      file.begin() + static_cast<std::ptrdiff_t>(r.end)),
-                Bytes(4, 0));
+      EXPECT_EQ(content, Bytes(4, 0));
     }
   }
-  EXPECT_EQ(kinds[kTypeMenu], static_cast<int>(data.menus.size()));
-  EXPECT_EQ(kinds[kTypeMenu], 3);
-  EXPECT_EQ(kinds[kTypeDialog], 1);
-  EXPECT_EQ(kinds[kTypeBitmap], 2);
-  EXPECT_EQ(kinds[kTypeData], 1);
+  kinds.erase(kTypeString);
+  EXPECT_EQ(kinds, (std::map<uint16_t, int>{
+                       {kTypeBitmap, 2}, {kTypeMenu, 3}, {kTypeDialog, 1}, {kTypeData, 1}}));
+  EXPECT_EQ(data.menus.size(), 3u);
 
   ASSERT_EQ(strings.size(), data.strings.size());
-  for (const auto& entry : data.strings) {
-    EXPECT_EQ(strings[entry.id], entry.text) << entry.id;
-  }
+  for (const auto& entry : data.strings) EXPECT_EQ(strings[entry.id], entry.text) << entry.id;
   // 1, 2, 128 to 131, 79 display strings and 60 names.
   EXPECT_EQ(strings.size(), 2u + 4u + 79u + 60u);
 #endif
@@ -258,14 +216,14 @@ TEST(ResourceScript, BitmapsAreSmallSixteenColourPictures) {
   for (const char* name : {"quorrel400.bmp", "quorrel401.bmp"}) {
     Bytes picture = readFile(std::string(QUORREL_RESOURCE_DIR) + "/" + name);
     ASSERT_EQ(picture.size(), 14u + 40u + 16u * 4u + 32u * 16u) << name;
-    Reader reader(picture, 0, picture.size());
+    Reader reader{picture, 0, picture.size()};
     EXPECT_EQ(reader.word(), 0x4D42);  // "BM"
     EXPECT_EQ(reader.dword(), picture.size());
-    reader.skip(4);
-    EXPECT_EQ(reader.dword(), 118u);  // pixel data offset
-    EXPECT_EQ(reader.dword(), 40u);   // information header size
-    EXPECT_EQ(reader.dword(), 32u);
-    EXPECT_EQ(reader.dword(), 32u);
+    reader.pos += 4;
+    // Pixel data offset, information header size, width, height.
+    EXPECT_EQ(
+        (std::vector<uint32_t>{reader.dword(), reader.dword(), reader.dword(), reader.dword()}),
+        (std::vector<uint32_t>{118, 40, 32, 32}));
     EXPECT_EQ(reader.word(), 1);
     EXPECT_EQ(reader.word(), 4);
     EXPECT_EQ(reader.dword(), 0u);  // no compression
