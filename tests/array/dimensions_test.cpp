@@ -3,29 +3,24 @@
 #include <random>
 #include <string>
 
-#include "array/element_array.h"
+#include "contents.h"
 
 namespace quorrel {
 namespace {
 
-std::string contents(ElementArray& a) {
-  std::string out;
-  for (int32_t i = 0; i < a.size(); ++i) {
-    if (i > 0) out += '|';
-    out += a.at(i).type() == ElementType::None ? std::string("_") : a.getString(i);
-  }
-  return out;
-}
-
-void appendTexts(ElementArray& a, std::initializer_list<const char*> texts) {
-  for (const char* t : texts) a.appendString(t);
-}
-
-ElementArray table(int32_t columns) {
+// An array of `dims` dimensions with boundary entries 0 and 1 set (where positive)
+// holding one single-character text per character of `chars`.
+ElementArray shaped(int32_t dims, int32_t entry0, int32_t columns, const char* chars) {
   ElementArray a;
-  a.setDimensions(2);
+  a.setDimensions(dims);
+  a.setBoundary(0, entry0);
   a.setBoundary(1, columns);
+  fill(a, chars);
   return a;
+}
+
+ElementArray table(int32_t columns, const char* chars = "") {
+  return shaped(2, 0, columns, chars);
 }
 
 TEST(Dimensions, FreshArrayAndBoundaryRules) {
@@ -35,12 +30,9 @@ TEST(Dimensions, FreshArrayAndBoundaryRules) {
   EXPECT_EQ(a.boundary(1), 0);
   EXPECT_EQ(a.dimIndexOfIndex(1, 7), 7);
   EXPECT_EQ(a.dimIndexOfIndex(2, 7), 0);
-  EXPECT_EQ(a.dimIndexOfIndex(3, 7), 0);
 
   a.setDimensions(2);
   a.setBoundary(1, 10);
-  EXPECT_EQ(a.boundary(1), 10);
-  EXPECT_EQ(a.boundary(2), 0);
   a.setBoundary(2, 5);  // the last dimension has no boundary
   EXPECT_EQ(a.boundaryEntry(2), 0);
   a.setBoundary(1, 0);
@@ -51,8 +43,6 @@ TEST(Dimensions, FreshArrayAndBoundaryRules) {
   a.setBoundary(0, 6);  // entry 0 is settable like any other
   EXPECT_EQ(a.boundary(0), 6);
 
-  a.setDimensions(12);
-  EXPECT_EQ(a.dimensions(), 2);
   a.setDimensions(10);
   EXPECT_EQ(a.dimensions(), 2);
   a.setDimensions(0);
@@ -73,15 +63,11 @@ TEST(Dimensions, FreshArrayAndBoundaryRules) {
 
 TEST(Dimensions, CoordinatesOfAnIndex) {
   ElementArray a = table(10);
-  EXPECT_EQ(a.dimIndexOfIndex(1, 23), 3);
-  EXPECT_EQ(a.dimIndexOfIndex(2, 23), 2);
-  EXPECT_EQ(a.dimIndexOfIndex(1, -1), -1);
-  EXPECT_EQ(a.dimIndexOfIndex(2, -1), 0);
-  EXPECT_EQ(a.dimIndexOfIndex(2, -23), -2);
-  EXPECT_EQ(a.dimIndexOfIndex(1, -23), -3);
-  EXPECT_EQ(a.dimIndexOfIndex(0, 23), 0);
-  EXPECT_EQ(a.dimIndexOfIndex(-1, 23), 0);
-  EXPECT_EQ(a.dimIndexOfIndex(3, 23), 0);
+  const int32_t cases[][3] = {{1, 23, 3},   {2, 23, 2}, {1, -1, -1}, {2, -1, 0}, {2, -23, -2},
+                              {1, -23, -3}, {0, 23, 0}, {-1, 23, 0}, {3, 23, 0}};
+  for (auto [dim, index, expected] : cases) {
+    EXPECT_EQ(a.dimIndexOfIndex(dim, index), expected) << dim << " " << index;
+  }
   EXPECT_EQ(a.indexOfXY(3, 2), 23);
   // 3 * 10^8 * 10 + 1 wraps past 2^32.
   EXPECT_EQ(a.indexOfXY(1, 300000000), -1294967295);
@@ -93,13 +79,10 @@ TEST(Dimensions, CoordinatesOfAnIndex) {
   EXPECT_EQ(cube.stride(0), 1);
   EXPECT_EQ(cube.stride(1), 4);
   EXPECT_EQ(cube.stride(2), 12);
-  EXPECT_EQ(cube.dimIndexOfIndex(1, 17), 1);
-  EXPECT_EQ(cube.dimIndexOfIndex(2, 17), 1);
-  EXPECT_EQ(cube.dimIndexOfIndex(3, 17), 1);
+  for (int32_t dim = 1; dim <= 3; ++dim) EXPECT_EQ(cube.dimIndexOfIndex(dim, 17), 1);
 
   // A 2D array whose X boundary was never set divides by 0: the answer is 0.
-  ElementArray unset;
-  unset.setDimensions(2);
+  ElementArray unset = table(0);
   EXPECT_EQ(unset.dimIndexOfIndex(1, 5), 0);
   EXPECT_EQ(unset.dimIndexOfIndex(2, 5), 0);
   EXPECT_EQ(unset.indexOfXY(5, 3), 5);
@@ -107,30 +90,24 @@ TEST(Dimensions, CoordinatesOfAnIndex) {
 
 TEST(Dimensions, IndexOfCoordinateListSplitsAtEveryDelimiterCharacter) {
   ElementArray a = table(10);
-  EXPECT_EQ(a.indexOfDimIndex("3,2"), 23);
-  EXPECT_EQ(a.indexOfDimIndex(",,3,,,2,,"), 23);
-  EXPECT_EQ(a.indexOfDimIndex(" 3, -2"), -17);
-  EXPECT_EQ(a.indexOfDimIndex("x,2"), 20);
-  EXPECT_EQ(a.indexOfDimIndex(""), 0);
-  EXPECT_EQ(a.indexOfDimIndex(",,,"), 0);
   EXPECT_EQ(a.indexOfDimIndex(nullptr), 0);
-
-  a.setListDelimiter(";");
-  EXPECT_EQ(a.indexOfDimIndex("3;2"), 23);
-  EXPECT_EQ(a.indexOfDimIndex("3,2"), 3);
+  const struct {
+    const char* delimiter;
+    const char* list;
+    int32_t index;
+  } cases[] = {// clang-format off
+      {",", "3,2", 23}, {",", ",,3,,,2,,", 23}, {",", " 3, -2", -17}, {",", "x,2", 20},
+      {",", "", 0},     {",", ",,,", 0},        {";", "3;2", 23},     {";", "3,2", 3},
+      // A set of characters, not a word; digits can separate too; with no delimiter
+      // the whole text is one token.
+      {"ab", "3a2", 23}, {"ab", "3b2", 23}, {"ab", "3ba2", 23}, {"0", "305", 53},
+      {"", "3,2", 3},    {"", "", 0}};
+  // clang-format on
+  for (const auto& c : cases) {
+    a.setListDelimiter(c.delimiter);
+    EXPECT_EQ(a.indexOfDimIndex(c.list), c.index) << "«" << c.list << "» by «" << c.delimiter;
+  }
   EXPECT_EQ(a.indexOfXY(3, 2), 23);
-
-  a.setListDelimiter("ab");  // a set of characters, not a word
-  EXPECT_EQ(a.indexOfDimIndex("3a2"), 23);
-  EXPECT_EQ(a.indexOfDimIndex("3b2"), 23);
-  EXPECT_EQ(a.indexOfDimIndex("3ba2"), 23);
-
-  a.setListDelimiter("0");  // digits can separate too
-  EXPECT_EQ(a.indexOfDimIndex("305"), 53);
-
-  a.setListDelimiter("");  // the whole text is one token
-  EXPECT_EQ(a.indexOfDimIndex("3,2"), 3);
-  EXPECT_EQ(a.indexOfDimIndex(""), 0);
 
   // Coordinates are not limited to their boundaries.
   ElementArray b = table(3);
@@ -148,33 +125,37 @@ TEST(Dimensions, IndexOfCoordinateListSplitsAtEveryDelimiterCharacter) {
   EXPECT_EQ(c.indexOfDimIndex("1,2,3"), 141);
 }
 
-TEST(Dimensions, ResizeKeepsCoordinatesOfCompleteBlocks) {
-  ElementArray a = table(3);
-  appendTexts(a, {"k", "l", "m", "n", "o", "p", "q", "r"});
-  a.resizeBoundary(1, 5);
-  EXPECT_EQ(contents(a), "k|l|m|_|_|n|o|p|_|_|q|r");
-  EXPECT_EQ(a.boundary(1), 5);
-
-  ElementArray b = table(3);
-  appendTexts(b, {"k", "l", "m", "n", "o", "p", "q", "r"});
-  b.resizeBoundary(1, 2);
-  EXPECT_EQ(contents(b), "k|l|n|o|q|r");
-  EXPECT_EQ(b.boundary(1), 2);
-
-  ElementArray c = table(3);
-  appendTexts(c, {"k", "l", "m", "n", "o", "p", "q", "r"});
-  c.resizeBoundary(1, 1);
-  EXPECT_EQ(contents(c), "k|n|q|r");
-
-  ElementArray d = table(2);
-  appendTexts(d, {"1", "2", "3", "4", "5", "6"});
-  d.resizeBoundary(1, 4);
-  EXPECT_EQ(contents(d), "1|2|_|_|3|4|_|_|5|6|_|_");
-  EXPECT_EQ(d.capacity(), 25);
+// Complete blocks keep their coordinates; data filling at most one old block, a table
+// without an X boundary (blocks of 0) and refused resizes move nothing. Entry 0 starts
+// at -1: growing it to 1 adds 1 - (-1) = 2 empty elements after each element; shrinking
+// it by one block (one element) deletes at index 0 once per element, so all go; by more
+// than one it would delete at negative indexes, so nothing moves.
+TEST(Dimensions, ResizeOfColumnsAndOfEntryZero) {
+  const struct {
+    int32_t dims, entry0, columns;
+    const char* chars;
+    int32_t dim, boundary;
+    const char* after;
+    int32_t boundaryAfter;
+  } cases[] = {// clang-format off
+      {2, 0, 3, "klmnopqr", 1, 5, "k|l|m|_|_|n|o|p|_|_|q|r", 5},
+      {2, 0, 3, "klmnopqr", 1, 2, "k|l|n|o|q|r", 2}, {2, 0, 3, "klmnopqr", 1, 1, "k|n|q|r", 1},
+      {2, 0, 2, "123456", 1, 4, "1|2|_|_|3|4|_|_|5|6|_|_", 4},
+      {2, 0, 3, "abc", 1, 5, "a|b|c", 5},    {2, 0, 0, "abcd", 1, 3, "a|b|c|d", 3},
+      {2, 0, 2, "abcd", 1, 0, "a|b|c|d", 2}, {2, 0, 2, "abcd", -1, 3, "a|b|c|d", 2},
+      {2, 0, 2, "abcd", 2, 3, "a|b|c|d", 2}, {2, 0, 2, "abcd", 1, 2, "a|b|c|d", 2},
+      {1, 0, 0, "abc", 0, 1, "a|_|_|b|_|_|c|_|_", 1}, {1, 2, 0, "abc", 0, 1, "", 1},
+      {1, 5, 0, "abc", 0, 2, "a|b|c", 2}};
+  // clang-format on
+  for (const auto& c : cases) {
+    ElementArray a = shaped(c.dims, c.entry0, c.columns, c.chars);
+    a.resizeBoundary(c.dim, c.boundary);
+    EXPECT_EQ(contents(a), c.after) << c.chars << " " << c.dim << " to " << c.boundary;
+    EXPECT_EQ(a.boundary(c.dim == 0 ? 0 : 1), c.boundaryAfter);
+  }
 
   // Keys move with their elements; removed elements take their keys with them.
-  ElementArray e = table(2);
-  appendTexts(e, {"1", "2", "3", "4"});
+  ElementArray e = table(2, "1234");
   e.setKeyString("k3", 2);
   e.setKeyString("k4", 3);
   e.resizeBoundary(1, 1);
@@ -186,7 +167,7 @@ TEST(Dimensions, ResizeKeepsCoordinatesOfCompleteBlocks) {
   EXPECT_EQ(e.getKeyString(1), nullptr);
 }
 
-TEST(Dimensions, ResizeOfPagesInThreeDimensions) {
+TEST(Dimensions, ResizeOfPages) {
   ElementArray a;
   a.setDimensions(3);
   a.setBoundary(1, 2);
@@ -197,71 +178,16 @@ TEST(Dimensions, ResizeOfPagesInThreeDimensions) {
   EXPECT_EQ(a.getValue(a.indexOfDimIndex("0,0,2")), 9);
   a.resizeBoundary(2, 1);
   EXPECT_EQ(contents(a), "1|2|5|6|9|10");
-  // A resize of the last dimension does nothing.
-  a.resizeBoundary(3, 4);
+  a.resizeBoundary(3, 4);  // the last dimension: nothing
   EXPECT_EQ(a.boundaryEntry(3), 0);
   EXPECT_EQ(a.size(), 6);
 }
 
-TEST(Dimensions, ResizeThatMovesNothing) {
-  // The data fills at most one old block.
-  ElementArray a = table(3);
-  appendTexts(a, {"a", "b", "c"});
-  a.resizeBoundary(1, 5);
-  EXPECT_EQ(contents(a), "a|b|c");
-  EXPECT_EQ(a.boundary(1), 5);
-
-  // No X boundary yet: the old block holds 0 elements.
-  ElementArray b;
-  b.setDimensions(2);
-  appendTexts(b, {"a", "b", "c", "d"});
-  b.resizeBoundary(1, 3);
-  EXPECT_EQ(contents(b), "a|b|c|d");
-  EXPECT_EQ(b.boundary(1), 3);
-
-  // Refused dimension numbers and boundaries.
-  ElementArray c = table(2);
-  appendTexts(c, {"a", "b", "c", "d"});
-  c.resizeBoundary(1, 0);
-  c.resizeBoundary(-1, 3);
-  c.resizeBoundary(2, 3);
-  EXPECT_EQ(contents(c), "a|b|c|d");
-  EXPECT_EQ(c.boundary(1), 2);
-  c.resizeBoundary(1, 2);  // the same boundary
-  EXPECT_EQ(contents(c), "a|b|c|d");
-}
-
-TEST(Dimensions, ResizeOfEntryZeroWorksElementByElement) {
-  // Entry 0 starts at -1: growing to 1 adds 1 - (-1) = 2 empty elements after each one.
-  ElementArray a;
-  appendTexts(a, {"a", "b", "c"});
-  a.resizeBoundary(0, 1);
-  EXPECT_EQ(contents(a), "a|_|_|b|_|_|c|_|_");
-  EXPECT_EQ(a.boundary(0), 1);
-
-  // Shrinking by one block (one element) deletes at index 0 once per element: all go.
-  ElementArray b;
-  appendTexts(b, {"a", "b", "c"});
-  b.setBoundary(0, 2);
-  b.resizeBoundary(0, 1);
-  EXPECT_EQ(b.size(), 0);
-  EXPECT_EQ(b.boundary(0), 1);
-
-  // Shrinking by more than one element would delete at negative indexes: nothing moves.
-  ElementArray c;
-  appendTexts(c, {"a", "b", "c"});
-  c.setBoundary(0, 5);
-  c.resizeBoundary(0, 2);
-  EXPECT_EQ(contents(c), "a|b|c");
-  EXPECT_EQ(c.boundary(0), 2);
-}
-
 // The capacity after a resize is the one its inserts and deletes reach one by one.
 TEST(Dimensions, CapacityAfterResize) {
-  // Growing a b / c d / e f / g to four columns: the last insert lands inside the
-  // array at size 12, so the capacity stays 25 although 13 elements result.
-  ElementArray a = table(2);
-  appendTexts(a, {"a", "b", "c", "d", "e", "f", "g"});
+  // The last insert lands inside the array at size 12, so the capacity stays 25
+  // although 13 elements result.
+  ElementArray a = table(2, "abcdefg");
   a.resizeBoundary(1, 4);
   EXPECT_EQ(contents(a), "a|b|_|_|c|d|_|_|e|f|_|_|g");
   EXPECT_EQ(a.capacity(), 25);
@@ -281,7 +207,6 @@ TEST(Dimensions, CapacityAfterResize) {
   // 414 -> 310 (at 102) -> 232 (at 76) -> 174 (at 57).
   ElementArray c = table(4);
   for (int i = 1; i <= 200; ++i) c.appendValue(i);
-  ASSERT_EQ(c.capacity(), 414);
   c.resizeBoundary(1, 1);
   EXPECT_EQ(c.size(), 50);
   EXPECT_EQ(c.capacity(), 174);
@@ -297,12 +222,13 @@ void resizeStepByStep(ElementArray& a, int32_t d, int32_t n) {
   const int32_t size = a.size();
   if (n != old && block > 0 && block < size) {
     for (int32_t k = 1; k * block <= size; ++k) {
-      if (n > old) {
-        const int32_t count = unit * (n - old);
-        for (int32_t i = 0; i < count; ++i) a.insertFile({}, k * block + (k - 1) * count);
-      } else {
-        const int32_t count = unit * (old - n);
-        for (int32_t i = 0; i < count; ++i) a.deleteAt(k * (block - count));
+      const int32_t count = unit * (n > old ? n - old : old - n);
+      for (int32_t i = 0; i < count; ++i) {
+        if (n > old) {
+          a.insertFile({}, k * block + (k - 1) * count);
+        } else {
+          a.deleteAt(k * (block - count));
+        }
       }
     }
   }
@@ -314,11 +240,9 @@ TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
   for (int round = 0; round < 400; ++round) {
     ElementArray fast;
     ElementArray slow;
-    const int32_t dims = 1 + static_cast<int32_t>(random() % 3);
-    const int32_t x = 1 + static_cast<int32_t>(random() % 4);
-    const int32_t y = 1 + static_cast<int32_t>(random() % 3);
-    const int32_t count = static_cast<int32_t>(random() % 70);
-    const int32_t autoSelect = static_cast<int32_t>(random() % 2);
+    const auto pick = [&](uint32_t n) { return static_cast<int32_t>(random() % n); };
+    const int32_t dims = 1 + pick(3), x = 1 + pick(4), y = 1 + pick(3), count = pick(70);
+    const int32_t autoSelect = pick(2);
     for (ElementArray* a : {&fast, &slow}) {
       a->setAutoSelect(autoSelect);
       a->setDimensions(3);
@@ -330,8 +254,7 @@ TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
       for (uint8_t& state : a->rowStates) state = RowSelected + (state + round) % 2;
     }
     for (int step = 0; step < 2; ++step) {
-      const int32_t d = static_cast<int32_t>(random() % 3);
-      const int32_t n = 1 + static_cast<int32_t>(random() % 5);
+      const int32_t d = pick(3), n = 1 + pick(5);
       fast.resizeBoundary(d, n);
       resizeStepByStep(slow, d, n);
       ASSERT_EQ(contents(fast), contents(slow)) << "round " << round << " d " << d << " n " << n;

@@ -13,93 +13,62 @@
 namespace quorrel {
 namespace {
 
-TEST(Element, ZeroAndEmptyOperandsAreStoredAsNone) {
-  NumberText scratch;
-  Element e;
-  e.assign(ElementValue::ofValue(0));
-  EXPECT_EQ(e.type(), ElementType::None);
-  EXPECT_EQ(e.size(), 0);
-  EXPECT_EQ(e.asValue(), 0);
-  EXPECT_STREQ(e.asString(scratch), "");
-  EXPECT_EQ(e.textLength(), 0);
-
-  e.assign(ElementValue::ofBytes("abc", 0));
-  EXPECT_EQ(e.type(), ElementType::None);
-  e.assign(ElementValue::ofBytes("abc", -3));
-  EXPECT_EQ(e.type(), ElementType::None);
-  e.assign(ElementValue::ofBytes(nullptr, 5));
-  EXPECT_EQ(e.type(), ElementType::None);
-  e.assign(ElementValue::ofText(nullptr));
-  EXPECT_EQ(e.type(), ElementType::None);
-  e.assign({ElementType::Value, 9, nullptr, -1});
-  EXPECT_EQ(e.type(), ElementType::None);
-
-  // The empty text is a real String of size 1, not None.
-  e.assign(ElementValue::ofText(""));
-  EXPECT_EQ(e.type(), ElementType::String);
-  EXPECT_EQ(e.size(), 1);
-  EXPECT_STREQ(e.asString(scratch), "");
-  EXPECT_EQ(e.asValue(), 0);
-  EXPECT_EQ(e.textLength(), 0);
-}
-
-TEST(Element, NumbersReadAsDecimalText) {
-  NumberText scratch;
-  Element e;
+// Zero and empty operands are stored as None, while the empty text is a real String of
+// size 1; file bytes read as nothing; numbers read as their decimal text.
+TEST(Element, StoredTypesAndTheirReadings) {
+  using T = ElementType;
   const struct {
-    int32_t value;
+    ElementValue operand;
+    ElementType type;
+    int32_t size, value;
     const char* text;
-  } cases[] = {
-      {5, "5"}, {-12, "-12"}, {10, "10"}, {INT32_MAX, "2147483647"}, {INT32_MIN, "-2147483648"}};
+  } cases[] = {// clang-format off
+      {ElementValue::ofValue(0), T::None, 0, 0, ""},
+      {ElementValue::ofBytes("abc", 0), T::None, 0, 0, ""},
+      {ElementValue::ofBytes("abc", -3), T::None, 0, 0, ""},
+      {ElementValue::ofBytes(nullptr, 5), T::None, 0, 0, ""},
+      {ElementValue::ofText(nullptr), T::None, 0, 0, ""},
+      {{T::Value, 9, nullptr, -1}, T::None, 0, 0, ""},
+      {ElementValue::ofText(""), T::String, 1, 0, ""},
+      {ElementValue::ofBytes("7\0z", 3), T::File, 3, 0, ""},
+      {ElementValue::ofValue(5), T::Value, 4, 5, "5"},
+      {ElementValue::ofValue(-12), T::Value, 4, -12, "-12"},
+      {ElementValue::ofValue(10), T::Value, 4, 10, "10"},
+      {ElementValue::ofValue(INT32_MAX), T::Value, 4, INT32_MAX, "2147483647"},
+      {ElementValue::ofValue(INT32_MIN), T::Value, 4, INT32_MIN, "-2147483648"}};
+  // clang-format on
+  NumberText scratch;
+  Element e;
   for (const auto& c : cases) {
-    e.assign(ElementValue::ofValue(c.value));
-    EXPECT_EQ(e.type(), ElementType::Value);
-    EXPECT_EQ(e.size(), 4);
+    e.assign(ElementValue::ofValue(1));
+    e.assign(c.operand);
+    EXPECT_EQ(e.type(), c.type) << c.text;
+    EXPECT_EQ(e.size(), c.size);
     EXPECT_EQ(e.asValue(), c.value);
     EXPECT_STREQ(e.asString(scratch), c.text);
     EXPECT_EQ(e.textLength(), static_cast<int32_t>(std::strlen(c.text)));
   }
-}
-
-TEST(Element, FileBytesReadAsNothing) {
-  NumberText scratch;
-  Element e;
   e.assign(ElementValue::ofBytes("7\0z", 3));
-  EXPECT_EQ(e.type(), ElementType::File);
-  EXPECT_EQ(e.size(), 3);
   EXPECT_EQ(std::memcmp(e.bytes(), "7\0z", 3), 0);
-  EXPECT_STREQ(e.asString(scratch), "");
-  EXPECT_EQ(e.asValue(), 0);
-  EXPECT_EQ(e.textLength(), 0);
+  char out[12];
+  EXPECT_EQ(writeDecimal(0, out), 1);
+  EXPECT_STREQ(out, "0");
+  EXPECT_EQ(writeDecimal(INT32_MIN, out), 11);
+  EXPECT_STREQ(out, "-2147483648");
 }
 
 TEST(Element, TextReadsAsNumberLikeAtol) {
   const struct {
     const char* text;
     int32_t value;
-  } cases[] = {
-      {"0042", 42},
-      {"  9 apples", 9},
-      {"-", 0},
-      {" -7", -7},
-      {"12abc", 12},
-      {"abc", 0},
-      {"+5", 5},
-      {"\t\n\v\f\r8", 8},
-      {"+-3", 0},
-      {"- 3", 0},
-      {"3 4", 3},
-      {"\xa0"
-       "5",
-       0},  // not white space in the C locale
-      {"2147483647", INT32_MAX},
-      {"2147483648", INT32_MAX},
-      {"99999999999999999999999", INT32_MAX},
-      {"-2147483648", INT32_MIN},
-      {"-2147483649", INT32_MIN},
-      {"-99999999999999999999999", INT32_MIN},
-      {"000000000000000000000000012", 12},
-  };
+  } cases[] = {// clang-format off
+      {"0042", 42}, {"  9 apples", 9}, {"-", 0}, {" -7", -7}, {"12abc", 12}, {"abc", 0},
+      {"+5", 5}, {"\t\n\v\f\r8", 8}, {"+-3", 0}, {"- 3", 0}, {"3 4", 3},
+      {"\xa0" "5", 0},  // not white space in the C locale
+      {"2147483647", INT32_MAX}, {"2147483648", INT32_MAX}, {"99999999999999999999999", INT32_MAX},
+      {"-2147483648", INT32_MIN}, {"-2147483649", INT32_MIN},
+      {"-99999999999999999999999", INT32_MIN}, {"000000000000000000000000012", 12}};
+  // clang-format on
   for (const auto& c : cases) {
     Element e;
     e.assign(ElementValue::ofText(c.text));
@@ -115,52 +84,54 @@ TEST(Element, KeysFollowTheValueRulesAndSurviveNewValues) {
   Element e;
   e.deleteKey();  // no key yet: nothing happens
   EXPECT_EQ(e.key(), nullptr);
-
   // The key takes the whole text, whatever size the operand claims.
   e.setKey({ElementType::String, 0, "hello", 2});
-  ASSERT_NE(e.key(), nullptr);
+  EXPECT_EQ(e.type(), ElementType::None);
   EXPECT_EQ(e.key()->type(), ElementType::String);
   EXPECT_EQ(e.key()->size(), 6);
   EXPECT_STREQ(e.key()->asString(scratch), "hello");
-
-  // A key of 0 exists but is None.
+  // A key of 0 exists but is None; a Value key has size 4, whatever the operand says.
   e.setKey(ElementValue::ofValue(0));
   ASSERT_NE(e.key(), nullptr);
   EXPECT_EQ(e.key()->type(), ElementType::None);
-  EXPECT_EQ(e.key()->asValue(), 0);
-
-  // A Value key always has size 4, whatever the operand says.
   e.setKey({ElementType::Value, -3, nullptr, 9});
   EXPECT_EQ(e.key()->size(), 4);
   EXPECT_EQ(e.key()->asValue(), -3);
-
-  e.assign(ElementValue::ofText("value"));
-  e.assign(ElementValue::ofValue(0));
-  ASSERT_NE(e.key(), nullptr);
-  EXPECT_EQ(e.key()->asValue(), -3);
-
   e.setKey(ElementValue::ofBytes("ab", 2));
   EXPECT_EQ(e.key()->type(), ElementType::File);
   EXPECT_EQ(e.key()->size(), 2);
 
-  e.deleteKey();
-  EXPECT_EQ(e.key(), nullptr);
+  // Every change of value keeps the key; removing and adding keys keeps the value.
+  const ElementValue values[] = {ElementValue::ofValue(7),       ElementValue::ofText("text"),
+                                 ElementValue::ofBytes("ab", 2), ElementValue::ofValue(0),
+                                 ElementValue::ofValue(-1),      ElementValue::ofText("")};
+  for (const ElementValue& v : values) {
+    e.setKey(ElementValue::ofText("k"));
+    e.assign(v);
+    ASSERT_NE(e.key(), nullptr);
+    EXPECT_STREQ(e.key()->asString(scratch), "k");
+    e.deleteKey();
+    EXPECT_EQ(e.key(), nullptr);
+    EXPECT_EQ(e.type(), v.type == ElementType::Value && v.number == 0 ? ElementType::None : v.type);
+    e.setKey(ElementValue::ofValue(3));
+    e.setKey(ElementValue::ofValue(4));
+    EXPECT_EQ(e.key()->asValue(), 4);
+    EXPECT_EQ(e.asValue(), v.type == ElementType::Value ? v.number : 0);
+  }
+  EXPECT_EQ(e.type(), ElementType::String);
+  EXPECT_EQ(e.size(), 1);
 
-  e.assign(ElementValue::ofText("x"));
-  e.setKey(ElementValue::ofValue(1));
+  // Moving an element moves its key and leaves the source empty.
+  Element moved(std::move(e));
+  EXPECT_EQ(e.type(), ElementType::None);
+  EXPECT_EQ(e.key(), nullptr);
+  EXPECT_EQ(moved.key()->asValue(), 4);
+  std::swap(e, moved);
+  EXPECT_EQ(e.key()->asValue(), 4);
+  EXPECT_EQ(moved.key(), nullptr);
   e.reset();
   EXPECT_EQ(e.type(), ElementType::None);
   EXPECT_EQ(e.key(), nullptr);
-}
-
-TEST(Text, WritesEveryNumberWithoutPadding) {
-  char out[12];
-  EXPECT_EQ(writeDecimal(0, out), 1);
-  EXPECT_STREQ(out, "0");
-  EXPECT_EQ(writeDecimal(INT32_MIN, out), 11);
-  EXPECT_STREQ(out, "-2147483648");
-  EXPECT_EQ(writeDecimal(-1, out), 2);
-  EXPECT_STREQ(out, "-1");
 }
 
 // Elements built from a slab share its blocks but must behave as if each had its own
@@ -182,38 +153,26 @@ TEST(Element, SlabBuiltElementsAreIndependent) {
     elements.push_back(Element::keyed({}, {}, &slab));  // a None under a None key
     expected.emplace_back();
   }
-  NumberText scratch;
   EXPECT_EQ(elements.back().type(), ElementType::None);
   EXPECT_TRUE(elements.back().hasKey());
   EXPECT_EQ(elements.back().key()->type(), ElementType::None);
 
   std::mt19937 random(7);
   for (std::size_t i = 0; i + 1 < elements.size(); i += 3) {
-    switch (random() % 4) {
-      case 0:
-        elements[i].assign(ElementValue::ofValue(-9));
-        expected[i] = "-9";
-        break;
-      case 1:
-        elements[i].setKey(ElementValue::ofText("k"));
-        break;
-      case 2:
-        elements[i].deleteKey();
-        break;
-      default:
-        elements[i].reset();
-        expected[i].clear();
-        break;
-    }
+    const auto pick = random() % 4;
+    if (pick == 0) elements[i].assign(ElementValue::ofValue(-9));
+    if (pick == 1) elements[i].setKey(ElementValue::ofText("k"));
+    if (pick == 2) elements[i].deleteKey();
+    if (pick == 3) elements[i].reset();
+    if (pick == 0 || pick == 3) expected[i] = pick == 0 ? "-9" : "";
   }
   std::vector<std::size_t> order(elements.size());
   for (std::size_t i = 0; i < order.size(); ++i) order[i] = i;
   std::shuffle(order.begin(), order.end(), random);
+  NumberText scratch;
   for (std::size_t n = 0; n < order.size(); ++n) {
-    if (n % 500 == 0) {
-      for (std::size_t k = n; k < order.size(); ++k) {
-        ASSERT_STREQ(elements[order[k]].asString(scratch), expected[order[k]].c_str());
-      }
+    for (std::size_t k = n; n % 500 == 0 && k < order.size(); ++k) {
+      ASSERT_STREQ(elements[order[k]].asString(scratch), expected[order[k]].c_str());
     }
     elements[order[n]].reset();
   }

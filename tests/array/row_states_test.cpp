@@ -12,29 +12,29 @@ using States = std::vector<uint8_t>;
 constexpr uint8_t S = RowSelected;
 constexpr uint8_t U = RowUnselected;
 
-ElementArray table(int32_t columns, int32_t autoSelect) {
+// A table of `columns` columns holding the values 1 .. count, then given `states`.
+ElementArray table(int32_t columns, int32_t autoSelect, int32_t count = 0, States states = {}) {
   ElementArray a;
   a.setAutoSelect(autoSelect);
   a.setDimensions(2);
   a.setBoundary(1, columns);
+  for (int32_t i = 1; i <= count; ++i) a.appendValue(i);
+  if (!states.empty()) a.rowStates = states;
   return a;
 }
 
-TEST(RowStates, OneDimensionalArraysHaveNone) {
-  ElementArray a;
-  a.setAutoSelect(1);
-  for (int i = 0; i < 10; ++i) a.appendValue(i);
-  a.setBoundary(0, 2);
-  EXPECT_EQ(a.tableRowCount(), 0);
-  EXPECT_TRUE(a.rowStates.empty());
-}
-
 TEST(RowStates, NewRowsStartFromTheAutomaticSelection) {
+  ElementArray list;
+  list.setAutoSelect(1);
+  for (int i = 0; i < 10; ++i) list.appendValue(i);
+  list.setBoundary(0, 2);
+  EXPECT_EQ(list.tableRowCount(), 0);  // one-dimensional arrays have no rows
+  EXPECT_TRUE(list.rowStates.empty());
+
   for (int32_t autoSelect : {1, 0}) {
     const uint8_t start = autoSelect == 1 ? S : U;
     ElementArray a = table(3, autoSelect);
-    const size_t expected[] = {0, 0, 1, 1, 1, 2};
-    for (size_t count : expected) {
+    for (size_t count : {0, 0, 1, 1, 1, 2}) {
       a.appendValue(1);
       EXPECT_EQ(a.rowStates.size(), count);
     }
@@ -43,41 +43,30 @@ TEST(RowStates, NewRowsStartFromTheAutomaticSelection) {
 }
 
 TEST(RowStates, StatesBelongToPositionsNotRows) {
-  ElementArray a = table(3, 1);
-  for (int i = 1; i <= 6; ++i) a.appendValue(i);
-  a.rowStates[0] = U;
+  ElementArray a = table(3, 1, 6, {U, S});
   a.deleteAt(4);
   EXPECT_EQ(a.rowStates, (States{U}));
 
-  ElementArray b = table(3, 1);
-  for (int i = 1; i <= 6; ++i) b.appendValue(i);
-  b.rowStates = {U, S};
+  ElementArray b = table(3, 1, 6, {U, S});
   for (int i = 0; i < 3; ++i) b.insertValue(9, 0);
   EXPECT_EQ(b.rowStates, (States{U, S, S}));
-
   // Only positions added later see a new starting value.
   b.setAutoSelect(0);
   EXPECT_EQ(b.rowStates, (States{U, S, S}));
   for (int i = 0; i < 3; ++i) b.appendValue(9);
   EXPECT_EQ(b.rowStates, (States{U, S, S, U}));
-
-  // Key setters change no row.
-  b.setKeyValue(1, 0);
+  b.setKeyValue(1, 0);  // key setters change no row
   EXPECT_EQ(b.rowStates.size(), 4u);
 }
 
 TEST(RowStates, SettingChangesBringTheListUpToDate) {
-  ElementArray a = table(3, 1);
-  for (int i = 1; i <= 6; ++i) a.appendValue(i);
-  a.rowStates = {U, U};
-
+  ElementArray a = table(3, 1, 6, {U, U});
   a.setBoundary(1, 2);  // three rows of two: the third position is new
   EXPECT_EQ(a.rowStates, (States{U, U, S}));
   a.setBoundary(1, 6);
   EXPECT_EQ(a.rowStates, (States{U}));
   a.setBoundary(1, 3);
   EXPECT_EQ(a.rowStates, (States{U, S}));
-
   a.setDimensions(3);
   EXPECT_TRUE(a.rowStates.empty());
   a.setDimensions(2);
@@ -93,34 +82,23 @@ TEST(RowStates, SettingChangesBringTheListUpToDate) {
 
 TEST(RowStates, ResizeKeepsPositionsThatNeverDisappeared) {
   // Growing: no position is lost during the inserts.
-  ElementArray a = table(3, 1);
-  for (int i = 1; i <= 8; ++i) a.appendValue(i);
-  a.rowStates = {U, U};
+  ElementArray a = table(3, 1, 8, {U, U});
   a.resizeBoundary(1, 5);
   EXPECT_EQ(a.size(), 12);
   EXPECT_EQ(a.rowStates, (States{U, U}));
-
-  // Shrinking three columns to two: 6 elements remain, still two rows of three
-  // during the deletes, then three rows of two.
-  ElementArray b = table(3, 1);
-  for (int i = 1; i <= 8; ++i) b.appendValue(i);
-  b.rowStates = {U, U};
+  // Three columns to two: 6 elements remain, still two rows of three during the
+  // deletes, then three rows of two.
+  ElementArray b = table(3, 1, 8, {U, U});
   b.resizeBoundary(1, 2);
   EXPECT_EQ(b.rowStates, (States{U, U, S}));
-
   // Two columns to one on three rows: the deletes leave one row of two before the
   // boundary changes, so positions 1 and 2 come back new.
-  ElementArray c = table(2, 1);
-  for (int i = 1; i <= 6; ++i) c.appendValue(i);
-  c.rowStates = {U, U, U};
+  ElementArray c = table(2, 1, 6, {U, U, U});
   c.resizeBoundary(1, 1);
   EXPECT_EQ(c.size(), 3);
   EXPECT_EQ(c.rowStates, (States{U, S, S}));
-
   // A resize that moves nothing only re-counts the rows.
-  ElementArray d = table(3, 0);
-  for (int i = 1; i <= 3; ++i) d.appendValue(i);
-  d.rowStates = {S};
+  ElementArray d = table(3, 0, 3, {S});
   d.resizeBoundary(1, 1);
   EXPECT_EQ(d.rowStates, (States{S, U, U}));
 }
@@ -128,9 +106,7 @@ TEST(RowStates, ResizeKeepsPositionsThatNeverDisappeared) {
 // Whatever happens, there is exactly one state per table row.
 TEST(RowStates, AlwaysOnePerTableRow) {
   std::mt19937 random(7);
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 3);
+  ElementArray a = table(3, 0);
   for (int step = 0; step < 3000; ++step) {
     const int32_t pick = static_cast<int32_t>(random() % 100);
     const int32_t index = static_cast<int32_t>(random() % 40) - 2;
