@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <array>
 #include <climits>
 
 namespace quorrel {
@@ -27,10 +28,8 @@ TEST(Lists, ElementListsWithEveryType) {
 
   ElementArray two;
   two.appendString("a");
-  two.appendString("b");
-  EXPECT_EQ(elementList(two, ", "), "a, b");
   two.appendString("");
-  EXPECT_EQ(quotedElementList(two, ","), "'a','b',''");
+  EXPECT_EQ(quotedElementList(two, ","), "'a',''");
 
   ElementArray empty;
   EXPECT_EQ(elementList(empty, ","), "");
@@ -72,15 +71,18 @@ TEST(Lists, PairListsSkipUnkeyedAndUnlistedElements) {
   EXPECT_EQ(quotedPairList(array, " => ", ", "), "a => 'x', q' => 3,  => 'y'");
 }
 
+// Max, min, sum and average of an array.
+std::array<int32_t, 4> totals(const ElementArray& array) {
+  return {maxValue(array), minValue(array), sumValue(array), averageValue(array)};
+}
+using Totals = std::array<int32_t, 4>;
+
 TEST(Totals, MixedTypesWrapAndTruncation) {
   ElementArray array;
   array.appendValue(-5);
   array.appendValue(7);
   array.appendString("abc");
-  EXPECT_EQ(maxValue(array), 7);
-  EXPECT_EQ(minValue(array), -5);
-  EXPECT_EQ(sumValue(array), 2);
-  EXPECT_EQ(averageValue(array), 0);
+  EXPECT_EQ(totals(array), (Totals{7, -5, 2, 0}));
 
   ElementArray wrap;
   wrap.appendValue(INT32_MAX);
@@ -94,9 +96,7 @@ TEST(Totals, MixedTypesWrapAndTruncation) {
   ElementArray negatives;
   negatives.appendValue(-1);
   negatives.appendValue(-2);
-  EXPECT_EQ(averageValue(negatives), -1);
-  EXPECT_EQ(maxValue(negatives), -1);
-  EXPECT_EQ(minValue(negatives), -2);
+  EXPECT_EQ(totals(negatives), (Totals{-1, -2, -3, -1}));  // -3 / 2 truncates to -1
 
   // None (a stored 0) and File elements count as 0.
   ElementArray zeros;
@@ -104,26 +104,14 @@ TEST(Totals, MixedTypesWrapAndTruncation) {
   zeros.appendValue(0);
   zeros.appendFile({kFileBytes, 3});
   zeros.appendString("12abc");
-  EXPECT_EQ(maxValue(zeros), 12);
-  EXPECT_EQ(minValue(zeros), -4);
-  EXPECT_EQ(sumValue(zeros), 8);
-  EXPECT_EQ(averageValue(zeros), 2);
+  EXPECT_EQ(totals(zeros), (Totals{12, -4, 8, 2}));
   zeros.setString("-9", 3);
-  EXPECT_EQ(maxValue(zeros), 0);
-  EXPECT_EQ(averageValue(zeros), -3);
+  EXPECT_EQ(totals(zeros), (Totals{0, -9, -13, -3}));
 
   ElementArray one;
   one.appendString(" 42");
-  EXPECT_EQ(maxValue(one), 42);
-  EXPECT_EQ(minValue(one), 42);
-  EXPECT_EQ(sumValue(one), 42);
-  EXPECT_EQ(averageValue(one), 42);
-
-  ElementArray empty;
-  EXPECT_EQ(maxValue(empty), 0);
-  EXPECT_EQ(minValue(empty), 0);
-  EXPECT_EQ(sumValue(empty), 0);
-  EXPECT_EQ(averageValue(empty), 0);
+  EXPECT_EQ(totals(one), (Totals{42, 42, 42, 42}));
+  EXPECT_EQ(totals(ElementArray{}), (Totals{0, 0, 0, 0}));
 }
 
 }  // namespace

@@ -5,7 +5,7 @@
 #include <random>
 #include <string>
 
-#include "query/compare.h"
+#include "models.h"
 
 namespace quorrel {
 namespace {
@@ -18,8 +18,7 @@ ElementValue keyNumber(int32_t n) {
 }
 
 TEST(KeyLookup, FirstMatchCaseAndTypes) {
-  ElementArray array;
-  for (int i = 0; i < 6; ++i) array.appendValue(100 + i);
+  ElementArray array = arrayOf({"#100", "#101", "#102", "#103", "#104", "#105"});
   array.setKeyString("Apple", 3);
   array.setKeyString("apple", 5);
   array.setKeyValue(5, 1);
@@ -42,14 +41,10 @@ TEST(KeyLookup, FirstMatchCaseAndTypes) {
   EXPECT_EQ(valueWithKey(array, keyNumber(77)), 0);
   ElementArray empty;
   EXPECT_EQ(indexOfKey(empty, keyText("")), -1);
-  EXPECT_EQ(stringWithKey(empty, keyText("")), nullptr);
 }
 
-TEST(KeyLookup, ZeroKeyIsNoneAndEqualKeysGiveTheLowerIndex) {
-  ElementArray array;
-  array.appendString("a");
-  array.appendString("b");
-  array.appendString("c");
+TEST(KeyLookup, ZeroKeysEqualKeysAndWildcardKeys) {
+  ElementArray array = arrayOf({"a", "b", "c"});
   array.setKeyValue(0, 1);
   array.setKeyString("7k", 0);
   array.setKeyString("7k", 2);
@@ -59,145 +54,102 @@ TEST(KeyLookup, ZeroKeyIsNoneAndEqualKeysGiveTheLowerIndex) {
   EXPECT_EQ(indexOfKey(array, keyText("7K")), 0);
   EXPECT_EQ(indexOfKey(array, keyNumber(7)), 0);
   EXPECT_EQ(stringWithKey(array, keyText("")), std::string("b"));
-}
 
-TEST(KeyLookup, WildcardKeyIsThePattern) {
-  ElementArray array;
-  array.appendString("first");
-  array.appendString("second");
-  array.setKeyString("item7", 0);
-  array.setKeyString("item*", 1);
-  array.searchMode = SearchWildcard;
   // The key's text is the pattern: the probe «item*» is taken literally.
-  EXPECT_EQ(indexOfKey(array, keyText("item*")), 1);
-  EXPECT_EQ(indexOfKey(array, keyText("ITEM9")), 1);
-  EXPECT_EQ(indexOfKey(array, keyText("item7")), 0);
-  EXPECT_EQ(indexOfKey(array, keyText("item?")), 1);
+  ElementArray wild = arrayOf({"first", "second"});
+  wild.setKeyString("item7", 0);
+  wild.setKeyString("item*", 1);
+  wild.searchMode = SearchWildcard;
+  EXPECT_EQ(indexOfKey(wild, keyText("item*")), 1);
+  EXPECT_EQ(indexOfKey(wild, keyText("ITEM9")), 1);
+  EXPECT_EQ(indexOfKey(wild, keyText("item7")), 0);
 }
 
-TEST(FindString, LiteralAndWildcardWithTheProbeAsPattern) {
-  ElementArray array;
-  array.appendValue(12);
-  array.appendString("item7");
-  array.appendString("a*");
-  array.appendString("Abc");
-  array.appendValue(0);  // None
-  array.appendString("");
-  EXPECT_EQ(findString(array, "12"), 0);
-  EXPECT_EQ(findString(array, "012"), -1);
-  EXPECT_EQ(findString(array, "a*"), 2);
-  EXPECT_EQ(findString(array, "ABC"), 3);
-  EXPECT_EQ(findString(array, ""), 4);
-  EXPECT_EQ(findString(array, "0"), -1);
-  EXPECT_EQ(findString(array, "ITEM7", 999), 1);
-  array.caseMode = CaseSensitive;
-  EXPECT_EQ(findString(array, "ABC"), -1);
-  EXPECT_EQ(findString(array, "Abc"), 3);
-  array.caseMode = CaseInsensitive;
-  array.searchMode = SearchWildcard;
-  EXPECT_EQ(findString(array, "a*"), 2);
-  EXPECT_EQ(findString(array, "A*"), 2);
-  EXPECT_EQ(findString(array, "item*"), 1);
-  EXPECT_EQ(findString(array, "1?"), 0);
-  EXPECT_EQ(findString(array, "*"), 0);
-  EXPECT_EQ(findString(array, "?b?"), 3);
-  EXPECT_EQ(findString(array, ""), 4);
-  // The element «a*» is a text here, never a pattern.
-  EXPECT_EQ(findString(array, "ab"), -1);
-  array.caseMode = CaseSensitive;
-  EXPECT_EQ(findString(array, "A*"), 3);
-  EXPECT_EQ(findString(array, nullptr), -1);
+TEST(Find, StringsLiteralAndWildcardWithTheProbeAsPattern) {
+  ElementArray array = arrayOf({"#12", "item7", "a*", "Abc", "#0", ""});
+  const struct {
+    int16_t caseMode, searchMode;
+    const char* probe;
+    int32_t found;
+  } cases[] = {
+      {0, 0, "12", 0},    {0, 0, "012", -1},  {0, 0, "a*", 2},   {0, 0, "ABC", 3}, {0, 0, "", 4},
+      {0, 0, "0", -1},    {0, 0, "ITEM7", 1}, {1, 0, "ABC", -1}, {1, 0, "Abc", 3}, {0, 1, "A*", 2},
+      {0, 1, "item*", 1}, {0, 1, "1?", 0},    {0, 1, "*", 0},    {0, 1, "?b?", 3}, {0, 1, "", 4},
+      {0, 1, "ab", -1},  // the element «a*» is a text here, never a pattern
+      {1, 1, "A*", 3},    {1, 1, nullptr, -1}};
+  for (const auto& c : cases) {
+    array.caseMode = c.caseMode;
+    array.searchMode = c.searchMode;
+    EXPECT_EQ(findString(array, c.probe, 999), c.found) << (c.probe ? c.probe : "null");
+  }
 }
 
-TEST(FindValue, NumericValuesOfEveryType) {
-  ElementArray array;
-  array.appendString("");
-  array.appendString("  -7 apples");
-  array.appendValue(9);
-  const char bytes[2] = {'4', '2'};
-  array.appendFile({bytes, 2});
+TEST(Find, NumericValuesOfEveryType) {
+  ElementArray array = arrayOf({"", "  -7 apples", "#9"});
+  array.appendFile({"42", 2});
   EXPECT_EQ(findValue(array, 0), 0);
   EXPECT_EQ(findValue(array, -7), 1);
   EXPECT_EQ(findValue(array, 9, -1), 2);
   EXPECT_EQ(findValue(array, 42), -1);  // file bytes have no numeric value
-  ElementArray empty;
-  EXPECT_EQ(findValue(empty, 0), -1);
+  EXPECT_EQ(findValue(ElementArray{}, 0), -1);
 }
 
 TEST(FindContaining, StringsValuesAndFileBytes) {
-  ElementArray array;
-  array.appendString("xyz");
-  array.appendString("1234");
+  ElementArray array = arrayOf({"xyz", "1234"});
   EXPECT_EQ(findContainingString(array, "23"), 1);
   EXPECT_EQ(findContainingValue(array, 23), 1);
-  EXPECT_EQ(findContainingString(array, "yz"), 0);     // at the very end of a text
-  EXPECT_EQ(findContainingString(array, "YZ"), 0);     // folded
+  EXPECT_EQ(findContainingString(array, "YZ"), 0);     // folded, at the very end
   EXPECT_EQ(findContainingString(array, "xyz1"), -1);  // longer than every element
   EXPECT_EQ(findContainingString(array, ""), 0);
   array.caseMode = CaseSensitive;
   EXPECT_EQ(findContainingString(array, "YZ"), -1);
-  array.caseMode = CaseInsensitive;
   // Values are searched in their decimal text.
   array.setValue(-512, 0);
   EXPECT_EQ(findContainingValue(array, -5), 0);
   EXPECT_EQ(findContainingString(array, "12"), 0);
-  EXPECT_EQ(findContainingString(array, "-512"), 0);
   EXPECT_EQ(findContainingString(array, "-5120"), -1);
 
-  ElementArray files;
-  files.appendValue(0);  // None: only the empty probe is found there
-  const char data[7] = {'a', 'b', '\0', 'c', 'd', '\0', 'e'};
-  files.appendFile({data, 7});
-  EXPECT_EQ(findContainingString(files, ""), 0);
-  EXPECT_EQ(findContainingString(files, "cd"), 1);
-  EXPECT_EQ(findContainingString(files, "CD"), 1);
-  EXPECT_EQ(findContainingString(files, "e"), 1);  // the last byte of the file
-  EXPECT_EQ(findContainingString(files, "bc"), -1);
-  files.searchMode = SearchWildcard;
-  EXPECT_EQ(findContainingString(files, "c?"), 1);
-  EXPECT_EQ(findContainingString(files, "b?"), -1);  // the span would hold a zero byte
-  EXPECT_EQ(findContainingString(files, "??"), 1);
-  EXPECT_EQ(findContainingString(files, "???"), -1);
-  EXPECT_EQ(findContainingString(files, "*"), 1);
-  EXPECT_EQ(findContainingString(files, "e*"), -1);  // needs two bytes after offset 6
-}
+  ElementArray files = arrayOf({"#0"});  // None: only the empty probe is found there
+  files.appendFile({"ab\0cd\0e", 7});
+  const struct {
+    int16_t searchMode;
+    const char* probe;
+    int32_t found;
+  } cases[] = {{0, "", 0},    {0, "CD", 1},   {0, "e", 1},    // the last byte of the file
+               {0, "bc", -1}, {1, "c?", 1},   {1, "b?", -1},  // the span would hold a zero byte
+               {1, "??", 1},  {1, "???", -1}, {1, "*", 1},
+               {1, "e*", -1}};  // needs two bytes after offset 6
+  for (const auto& c : cases) {
+    files.searchMode = c.searchMode;
+    EXPECT_EQ(findContainingString(files, c.probe), c.found) << c.probe;
+  }
 
-TEST(FindContaining, WildcardSpansHaveTheProbeLength) {
-  ElementArray array;
-  array.searchMode = SearchWildcard;
-  array.appendString("");
-  array.appendString("abc");
-  EXPECT_EQ(findContainingString(array, "b?"), 1);
-  EXPECT_EQ(findContainingString(array, "*"), 1);  // needs one character
-  EXPECT_EQ(findContainingString(array, "a*c"), 1);
-  EXPECT_EQ(findContainingString(array, "a*"), 1);
-  EXPECT_EQ(findContainingString(array, "a**c"), -1);  // four characters
-  EXPECT_EQ(findContainingString(array, "?c"), 1);
-  EXPECT_EQ(findContainingString(array, "C"), 1);
+  // Wildcard spans have the probe's length.
+  ElementArray wild = arrayOf({"", "abc"});
+  wild.searchMode = SearchWildcard;
+  EXPECT_EQ(findContainingString(wild, "*"), 1);  // needs one character
+  EXPECT_EQ(findContainingString(wild, "a*c"), 1);
+  EXPECT_EQ(findContainingString(wild, "a**c"), -1);  // four characters
+  EXPECT_EQ(findContainingString(wild, "C"), 1);
 }
 
 TEST(FindContaining, LongTextsAtEveryPlacement) {
   // Folded probes at the start, middle and end of long texts, and just short of them.
   for (std::size_t length : {63u, 64u, 511u, 512u, 513u, 1100u}) {
     for (std::size_t probeLength : {1u, 3u, 128u, 129u, 300u}) {
-      if (probeLength > length) continue;
       std::string probe;
       for (std::size_t i = 0; i < probeLength; ++i) probe += static_cast<char>('a' + i % 3);
-      std::string upper = probe;
-      for (char& c : upper) c = static_cast<char>(c - 'a' + 'A');
       for (std::size_t at :
            {std::size_t{0}, length / 2, std::size_t{509}, std::size_t{510}, length - probeLength}) {
-        if (at + probeLength > length) continue;
+        if (probeLength > length || at + probeLength > length) continue;
         std::string text(length, 'x');
-        text.replace(at, probeLength, upper);
+        for (std::size_t i = 0; i < probeLength; ++i) text[at + i] = probe[i] - 'a' + 'A';
         ElementArray array;
         array.appendString(text.c_str());
-        ASSERT_EQ(findContainingString(array, probe.c_str()), 0)
-            << length << " " << probeLength << " " << at;
+        ASSERT_EQ(findContainingString(array, probe.c_str()), 0) << length << " " << at;
         text[at + probeLength - 1] = 'y';
         array.setString(text.c_str(), 0);
-        ASSERT_EQ(findContainingString(array, probe.c_str()), -1)
-            << length << " " << probeLength << " " << at;
+        ASSERT_EQ(findContainingString(array, probe.c_str()), -1) << length << " " << at;
       }
     }
   }
@@ -212,46 +164,36 @@ TEST(FindContaining, AgreesWithSpanComparisonAtEveryOffset) {
     array.caseMode = static_cast<int16_t>(round & 1);
     array.searchMode = static_cast<int16_t>((round >> 1) & 1);
     for (int e = 0; e < 4; ++e) {
-      std::string bytes;
-      int length = static_cast<int>(rng() % 7);
-      for (int i = 0; i < length; ++i) bytes += alphabet[rng() % alphabet.size()];
-      int kind = static_cast<int>(rng() % 4);
+      std::string bytes(rng() % 7, ' ');
+      for (char& c : bytes) c = alphabet[rng() % alphabet.size()];
+      const auto kind = rng() % 4;
       if (kind == 0) {
         array.appendString(bytes.c_str());
       } else if (kind == 1) {
         if (!bytes.empty()) bytes[rng() % bytes.size()] = '\0';
         array.appendFile({bytes.data(), static_cast<int32_t>(bytes.size())});
-      } else if (kind == 2) {
-        array.appendValue(static_cast<int32_t>(rng() % 200) - 100);
       } else {
-        array.appendValue(0);
+        array.appendValue(kind == 2 ? static_cast<int32_t>(rng() % 200) - 100 : 0);
       }
     }
-    std::string probe;
-    int probeLength = 1 + static_cast<int>(rng() % 3);
-    for (int i = 0; i < probeLength; ++i) probe += alphabet[rng() % 5];
+    std::string probe(1 + rng() % 3, ' ');
+    for (char& c : probe) c = alphabet[rng() % 5];
+    const auto length = static_cast<int32_t>(probe.size());
     int32_t expected = -1;
-    for (int32_t i = 0; i < array.size() && expected < 0; ++i) {
+    int32_t expectedFind = -1;
+    for (int32_t i = array.size() - 1; i >= 0; --i) {
       const Element& e = array.at(i);
       NumberText scratch;
-      const char* bytes = e.type() == ElementType::File ? e.bytes() : e.asString(scratch);
-      int32_t size = e.type() == ElementType::File   ? e.size()
-                     : e.type() == ElementType::None ? 0
-                                                     : e.textLength() + 1;
-      const auto length = static_cast<int32_t>(probe.size());
+      const char* text = e.asString(scratch);
+      if (searchCompare(array, probe.c_str(), text) == 0) expectedFind = i;
+      const bool file = e.type() == ElementType::File;
+      const char* bytes = file ? e.bytes() : text;
+      const int32_t size = file ? e.size() : e.type() == ElementType::None ? 0 : e.textLength() + 1;
       for (int32_t o = 0; o <= size - length; ++o) {
-        if (searchCompareSpan(array, probe.c_str(), bytes + o, length) == 0) {
-          expected = i;
-          break;
-        }
+        if (searchCompareSpan(array, probe.c_str(), bytes + o, length) == 0) expected = i;
       }
     }
     ASSERT_EQ(findContainingString(array, probe.c_str()), expected) << "probe «" << probe << "»";
-    int32_t expectedFind = -1;
-    for (int32_t i = 0; i < array.size() && expectedFind < 0; ++i) {
-      NumberText scratch;
-      if (searchCompare(array, probe.c_str(), array.at(i).asString(scratch)) == 0) expectedFind = i;
-    }
     ASSERT_EQ(findString(array, probe.c_str()), expectedFind) << "probe «" << probe << "»";
   }
 }

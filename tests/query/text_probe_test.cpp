@@ -5,44 +5,13 @@
 #include <cstring>
 #include <random>
 #include <string>
-#include <vector>
 
-#include "query/compare.h"
+#include "models.h"
 
 namespace quorrel {
 namespace {
 
-// Straightforward models of the two tests: fold whole strings, compare them, and match
-// patterns with a table of prefix pairs.
-std::string fold(std::string s, bool caseSensitive) {
-  if (!caseSensitive) {
-    for (char& c : s) {
-      if (c >= 'A' && c <= 'Z') c = static_cast<char>(c - 'A' + 'a');
-    }
-  }
-  return s;
-}
-
-bool patternMatches(const std::string& pattern, const std::string& text, bool caseSensitive) {
-  const std::string p = fold(pattern, caseSensitive);
-  const std::string t = fold(text, caseSensitive);
-  // ok[i][j]: the first i pattern characters match the first j text characters.
-  const std::size_t width = t.size() + 1;
-  std::vector<char> ok((p.size() + 1) * width, 0);
-  auto at = [&](std::size_t i, std::size_t j) -> char& { return ok[i * width + j]; };
-  at(0, 0) = 1;
-  for (std::size_t i = 1; i <= p.size(); ++i) {
-    for (std::size_t j = 0; j <= t.size(); ++j) {
-      if (pattern[i - 1] == '*') {
-        at(i, j) = at(i - 1, j) || (j > 0 && at(i, j - 1));
-      } else if (j > 0) {
-        at(i, j) = at(i - 1, j - 1) && (pattern[i - 1] == '?' || p[i - 1] == t[j - 1]);
-      }
-    }
-  }
-  return at(p.size(), t.size()) != 0;
-}
-
+// Models of the two tests over whole strings.
 bool modelWhole(const std::string& probe, const std::string& text, bool wildcard,
                 bool caseSensitive) {
   return wildcard ? patternMatches(probe, text, caseSensitive)
@@ -51,18 +20,10 @@ bool modelWhole(const std::string& probe, const std::string& text, bool wildcard
 
 bool modelOccurs(const std::string& probe, const std::string& text, bool wildcard,
                  bool caseSensitive) {
-  if (text.size() < probe.size()) return false;
   for (std::size_t o = 0; o + probe.size() <= text.size(); ++o) {
     if (modelWhole(probe, text.substr(o, probe.size()), wildcard, caseSensitive)) return true;
   }
   return false;
-}
-
-ElementArray settings(bool wildcard, bool caseSensitive) {
-  ElementArray a;
-  a.searchMode = wildcard ? SearchWildcard : SearchLiteral;
-  a.caseMode = caseSensitive ? CaseSensitive : CaseInsensitive;
-  return a;
 }
 
 // Letters of both cases, the characters next to the letter ranges ('@' '[' '`' '{'),
@@ -90,27 +51,14 @@ std::string probeFor(std::mt19937& rng, const std::string& text, std::size_t max
   return piece;
 }
 
-// The literal order of folded texts: unsigned bytes, a text that ends first is smaller.
+// The literal order of folded texts: unsigned bytes (as char_traits<char> compares), a
+// text that ends first is smaller.
 int modelOrder(const std::string& probe, const std::string& text, bool caseSensitive) {
-  const std::string p = fold(probe, caseSensitive);
-  const std::string t = fold(text, caseSensitive);
-  for (std::size_t i = 0; i < p.size() && i < t.size(); ++i) {
-    const auto a = static_cast<unsigned char>(p[i]);
-    const auto b = static_cast<unsigned char>(t[i]);
-    if (a != b) return a < b ? -1 : 1;
-  }
-  return p.size() < t.size() ? -1 : p.size() > t.size() ? 1 : 0;
-}
-
-int sign(int32_t v) {
-  return (v > 0) - (v < 0);
+  return sign(fold(probe, caseSensitive).compare(fold(text, caseSensitive)));
 }
 
 struct Hits {
-  int whole = 0;
-  int occurs = 0;
-  int below = 0;
-  int above = 0;
+  int whole = 0, occurs = 0, below = 0, above = 0;
 };
 
 // Checks every mode. The text is stored with up to eight bytes after its zero, as a
@@ -133,116 +81,99 @@ void expectAgreement(std::mt19937& rng, const std::string& probe, const std::str
     hits.occurs += occurs;
     hits.below += order < 0;
     hits.above += order > 0;
-    ASSERT_EQ(prepared.matchesWhole(stored.c_str(), bound), whole)
-        << "probe «" << probe << "» text «" << text << "» mode " << mode;
+    SCOPED_TRACE("probe «" + probe + "» text «" + text + "» mode " + std::to_string(mode));
+    ASSERT_EQ(prepared.matchesWhole(stored.c_str(), bound), whole);
     ASSERT_EQ(searchCompare(a, probe.c_str(), text.c_str()) == 0, whole);
-    ASSERT_EQ(prepared.occursIn(text.c_str(), text.size()), occurs)
-        << "probe «" << probe << "» text «" << text << "» mode " << mode;
-    ASSERT_EQ(sign(prepared.compareTo(stored.c_str(), bound)), order)
-        << "probe «" << probe << "» text «" << text << "» mode " << mode;
+    ASSERT_EQ(prepared.occursIn(text.c_str(), text.size()), occurs);
+    ASSERT_EQ(sign(prepared.compareTo(stored.c_str(), bound)), order);
     ASSERT_EQ(sign(compareText(a, probe.c_str(), text.c_str())), order);
   }
 }
 
-TEST(TextProbe, AgreesWithAPlainModelOnRandomShortTexts) {
-  std::mt19937 rng(2024);
+// Random texts up to `maxText` long with probes up to `maxProbe`; `copies` makes
+// every other probe the whole text.
+Hits randomRounds(uint32_t seed, int rounds, std::size_t maxText, std::size_t maxProbe,
+                  bool copies) {
+  std::mt19937 rng(seed);
   Hits hits;
-  for (int round = 0; round < 30000; ++round) {
-    const std::string text = randomText(rng, 20);
-    const std::string probe = probeFor(rng, text, 11);
+  for (int round = 0; round < rounds && !::testing::Test::HasFatalFailure(); ++round) {
+    const std::string text = randomText(rng, maxText);
+    std::string probe = probeFor(rng, text, maxProbe);
+    if (copies && rng() % 2 == 0) probe = text;
     expectAgreement(rng, probe, text, hits);
-    if (HasFatalFailure()) return;
   }
-  // Every outcome of every test is well exercised.
+  return hits;
+}
+
+TEST(TextProbe, AgreesWithAPlainModelOnRandomTexts) {
+  // Short texts: every outcome of every test is well exercised.
+  Hits hits = randomRounds(2024, 30000, 20, 11, false);
   EXPECT_GT(hits.whole, 5000);
   EXPECT_GT(hits.occurs, 40000);
   EXPECT_LT(hits.occurs, 100000);
   EXPECT_GT(hits.below, 20000);
   EXPECT_GT(hits.above, 20000);
-}
-
-TEST(TextProbe, LongProbesAroundThePreparedLength) {
-  std::mt19937 rng(77);
-  Hits hits;
-  for (int round = 0; round < 1500; ++round) {
-    const std::string text = randomText(rng, 90);
-    std::string probe = probeFor(rng, text, 80);
-    if (rng() % 2 == 0) probe = text;  // whole-text hits for long texts
-    expectAgreement(rng, probe, text, hits);
-    if (HasFatalFailure()) return;
-  }
+  // Long probes around the prepared length, with whole-text hits for long texts.
+  hits = randomRounds(77, 1500, 90, 80, true);
   EXPECT_GT(hits.whole, 2000);
   EXPECT_GT(hits.occurs, 2500);
   EXPECT_GT(hits.below, 500);
   EXPECT_GT(hits.above, 500);
 }
 
+// '@' and '`' differ by the case bit only, yet are different characters. A missing
+// probe matches nothing, and contains like the empty one. In literal mode the wildcard
+// characters are ordinary ones.
 TEST(TextProbe, ByHand) {
-  const ElementArray literalFolded = settings(false, false);
-  const ElementArray literalExact = settings(false, true);
-  const ElementArray wild = settings(true, false);
+  const ElementArray modes[] = {settings(false, false), settings(false, true),
+                                settings(true, false)};
+  enum { Folded, Exact, Wild, Whole = 0, Occurs = 1 };
+  const struct {
+    int mode, test;
+    const char *probe, *text;
+    bool expected;
+  } cases[] = {// clang-format off
+      {Folded, Whole, "K000000500", "k000000500", true},
+      {Exact, Whole, "K000000500", "k000000500", false},
+      {Folded, Whole, "abc", "abcd", false}, {Folded, Whole, "abcd", "abc", false},
+      {Folded, Whole, "`", "@", false},      {Folded, Whole, "\xE1", "\xC1", false},
+      {Folded, Whole, "", "", true},         {Folded, Whole, nullptr, "", false},
+      {Wild, Whole, nullptr, "", false},     {Wild, Occurs, nullptr, "", true},
+      {Exact, Occurs, nullptr, "abc", true}, {Folded, Occurs, "05", "k000000500", true},
+      {Folded, Occurs, "06", "k000000500", false}, {Folded, Occurs, "B", "abc", true},
+      {Exact, Occurs, "B", "abc", false},    {Wild, Occurs, "b?", "abc", true},
+      {Wild, Occurs, "b?", "ab", false},     {Wild, Whole, "a*", "abc", true},
+      {Wild, Whole, "b*", "abc", false},     {Folded, Whole, "a*", "abc", false},
+      {Folded, Occurs, "?c", "b?C", true}};
+  // clang-format on
+  for (const auto& c : cases) {
+    const TextProbe probe(modes[c.mode], c.probe);
+    const std::size_t length = std::strlen(c.text);
+    EXPECT_EQ(c.test == Whole ? probe.matchesWhole(c.text, length) : probe.occursIn(c.text, length),
+              c.expected)
+        << (c.probe ? c.probe : "null") << " " << c.text;
+  }
 
-  EXPECT_TRUE(TextProbe(literalFolded, "K000000500").matchesWhole("k000000500", 10));
-  EXPECT_FALSE(TextProbe(literalExact, "K000000500").matchesWhole("k000000500", 10));
-  EXPECT_FALSE(TextProbe(literalFolded, "abc").matchesWhole("abcd", 4));
-  EXPECT_FALSE(TextProbe(literalFolded, "abcd").matchesWhole("abc", 3));
-  // '@' and '`' differ by the case bit only, yet are different characters.
-  EXPECT_FALSE(TextProbe(literalFolded, "`").matchesWhole("@", 1));
-  EXPECT_FALSE(TextProbe(literalFolded, "\xE1").matchesWhole("\xC1", 1));
-  EXPECT_TRUE(TextProbe(literalFolded, "").matchesWhole("", 0));
-  // A missing probe matches nothing, and contains like the empty one.
-  EXPECT_FALSE(TextProbe(literalFolded, nullptr).matchesWhole("", 0));
-  EXPECT_FALSE(TextProbe(wild, nullptr).matchesWhole("", 0));
-  EXPECT_TRUE(TextProbe(wild, nullptr).occursIn("", 0));
-  EXPECT_TRUE(TextProbe(literalExact, nullptr).occursIn("abc", 3));
-
-  EXPECT_TRUE(TextProbe(literalFolded, "05").occursIn("k000000500", 10));
-  EXPECT_FALSE(TextProbe(literalFolded, "06").occursIn("k000000500", 10));
-  EXPECT_TRUE(TextProbe(literalFolded, "B").occursIn("abc", 3));
-  EXPECT_FALSE(TextProbe(literalExact, "B").occursIn("abc", 3));
-  EXPECT_TRUE(TextProbe(literalFolded, "23").occursIn("1234", 4));
-  EXPECT_TRUE(TextProbe(wild, "b?").occursIn("abc", 3));
-  EXPECT_FALSE(TextProbe(wild, "b?").occursIn("ab", 2));
-  EXPECT_TRUE(TextProbe(wild, "a*").matchesWhole("abc", 3));
-  EXPECT_FALSE(TextProbe(wild, "b*").matchesWhole("abc", 3));
-  // In literal mode the wildcard characters are ordinary ones.
-  EXPECT_FALSE(TextProbe(literalFolded, "a*").matchesWhole("abc", 3));
-  EXPECT_TRUE(TextProbe(literalFolded, "?c").occursIn("b?C", 3));
-}
-
-TEST(TextProbe, OrderByHand) {
-  const ElementArray folded = settings(true, false);  // the order is literal in any mode
-  const ElementArray exact = settings(false, true);
-  EXPECT_EQ(TextProbe(folded, "abc").compareTo("ABC", 3), 0);
-  EXPECT_GT(TextProbe(exact, "abc").compareTo("ABC", 3), 0);
-  // Folding goes to lower case: '_' sorts before the letters only when folded.
-  EXPECT_GT(TextProbe(folded, "A").compareTo("_", 1), 0);
-  EXPECT_LT(TextProbe(exact, "A").compareTo("_", 1), 0);
-  EXPECT_LT(TextProbe(folded, "k000000250").compareTo("K000000251", 10), 0);
-  EXPECT_GT(TextProbe(folded, "k000000250x").compareTo("K000000250", 10), 0);
-  EXPECT_LT(TextProbe(folded, "k000000250").compareTo("K000000250x", 11), 0);
-  EXPECT_GT(TextProbe(folded, "\xE1").compareTo("z", 1), 0);
-  // Characters one case bit apart that are not letters, inside a full word of text.
-  EXPECT_GT(TextProbe(folded, "abcdefg{x").compareTo("ABCDEFG[x", 9), 0);
-  EXPECT_LT(TextProbe(folded, "abcdefg@x").compareTo("ABCDEFG`x", 9), 0);
-  EXPECT_GT(TextProbe(folded, "abcdefg\xE1x").compareTo("ABCDEFG\xC1x", 9), 0);
-  EXPECT_LT(TextProbe(folded, nullptr).compareTo("", 0), 0);
-  EXPECT_LT(TextProbe(folded, "").compareTo("a", 1), 0);
-  EXPECT_EQ(TextProbe(folded, "").compareTo("", 0), 0);
-}
-
-TEST(TextProbe, TheBoundOnlyLimitsWhatIsRead) {
-  const ElementArray a = settings(false, false);
-  // Text bytes after the zero are never part of the text, whatever the bound.
-  const char stored[] = "ab\0cd";
-  EXPECT_TRUE(TextProbe(a, "AB").matchesWhole(stored, 5));
-  EXPECT_FALSE(TextProbe(a, "ABxcd").matchesWhole(stored, 5));
-  EXPECT_FALSE(TextProbe(a, "abcdefghijk").matchesWhole(stored, 5));
-  // A long probe against a text that ends before it.
-  const std::string probe(70, 'q');
-  const std::string shorter(69, 'Q');
-  EXPECT_FALSE(TextProbe(a, probe.c_str()).matchesWhole(shorter.c_str(), shorter.size()));
-  EXPECT_TRUE(TextProbe(a, probe.c_str()).matchesWhole((shorter + "q").c_str(), 70));
+  // The order is literal in any search mode. Folding goes to lower case, so '_' sorts
+  // before the letters only when folded; characters one case bit apart that are not
+  // letters differ, also inside a full word of text.
+  const struct {
+    int mode;
+    const char *probe, *text;
+    int order;
+  } orders[] = {// clang-format off
+      {Wild, "abc", "ABC", 0}, {Exact, "abc", "ABC", 1}, {Wild, "A", "_", 1}, {Exact, "A", "_", -1},
+      {Wild, "k000000250", "K000000251", -1}, {Wild, "k000000250x", "K000000250", 1},
+      {Wild, "k000000250", "K000000250x", -1}, {Wild, "\xE1", "z", 1},
+      {Wild, "abcdefg{x", "ABCDEFG[x", 1}, {Wild, "abcdefg@x", "ABCDEFG`x", -1},
+      {Wild, "abcdefg\xE1x", "ABCDEFG\xC1x", 1},
+      {Wild, nullptr, "", -1}, {Wild, "", "a", -1}, {Wild, "", "", 0}};
+  // clang-format on
+  for (const auto& c : orders) {
+    EXPECT_EQ(sign(TextProbe(modes[c.mode], c.probe).compareTo(c.text, std::strlen(c.text))),
+              c.order)
+        << (c.probe ? c.probe : "null") << " " << c.text;
+  }
 }
 
 }  // namespace
