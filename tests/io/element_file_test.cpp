@@ -41,7 +41,11 @@ TEST_F(ElementFile, WritesExactlyTheElementsBytes) {
   saveElementToFile(a, 5, path("none.bin").c_str(), 0);
   saveElementToFile(a, -1, path("none.bin").c_str(), 0);
   EXPECT_FALSE(exists(path("none.bin")));
+}
 
+TEST_F(ElementFile, UnwritablePlacesGetNothing) {
+  ElementArray a;
+  a.appendString("x");
   expectNothingSavedToUnusablePaths([&](const char* file) { saveElementToFile(a, 0, file, 0); });
 }
 

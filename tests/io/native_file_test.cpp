@@ -60,12 +60,9 @@ TEST_F(NativeFile, LoadsTheExampleAndRoundTripsEveryTypeOfElementAndKey) {
   ElementArray old;
   old.appendString("old");
   ElementArray a = loaded(loadNativeFile, kExample, std::move(old));
-  ASSERT_EQ(a.size(), 2);
+  EXPECT_EQ(contents(a), "ab|#7");
   EXPECT_EQ(a.dimensions(), 2);
   EXPECT_EQ(a.boundary(1), 3);
-  EXPECT_EQ(a.at(0).type(), ElementType::String);
-  EXPECT_STREQ(a.getString(0), "ab");
-  EXPECT_EQ(a.getValue(1), 7);
   EXPECT_STREQ(a.getKeyString(1), "k");
   // An element saved without key comes back with an empty key of type None.
   ASSERT_TRUE(a.at(0).hasKey());
@@ -119,12 +116,11 @@ TEST_F(NativeFile, AppendAddsAtTheEndAndKeepsDimensions) {
   ElementArray a = shaped(3, 5, 6);
   for (int i = 1; i <= 5; ++i) a.appendValue(i);
   a = loaded(loadNativeFile, kExample, std::move(a), 1);
-  ASSERT_EQ(a.size(), 7);
+  EXPECT_EQ(contents(a), "#1|#2|#3|#4|#5|ab|#7");
   EXPECT_EQ(a.dimensions(), 3);
   EXPECT_EQ(a.boundary(1), 5);
   EXPECT_EQ(a.boundary(2), 6);
   EXPECT_FALSE(a.at(4).hasKey());
-  EXPECT_STREQ(a.getString(5), "ab");
   EXPECT_STREQ(a.getKeyString(6), "k");
 }
 
@@ -164,11 +160,8 @@ TEST_F(NativeFile, ReadAndWriteImageReproduceTheFile) {
   const std::string bytes = saved(saveNativeFile, a);
   auto image = readNativeFile(path("out").c_str());
   ASSERT_TRUE(image.has_value());
-  EXPECT_EQ(image->dimensions, 2);
-  EXPECT_EQ(image->boundaries[0], 3);
   EXPECT_EQ(image->labelCount(), 3);
   ASSERT_EQ(image->elementCount(), 3);
-  EXPECT_EQ(image->elements[1].number, 7);
   EXPECT_EQ(image->elements[2].type, 3);
   EXPECT_EQ(image->elements[2].keySize, 1);
   writeNativeFile(path("b.arr").c_str(), *image, 0);
@@ -187,24 +180,16 @@ TEST_F(NativeFile, TruncatedExampleLoadsWhatItHolds) {
     EXPECT_EQ(a.boundaryEntry(1), n >= 15 ? 3 : 0);
     const int32_t records = n > 45 ? 2 : (n > 30 ? 1 : 0);
     ASSERT_EQ(a.size(), records);
+    const std::string first = n < 33 ? "~" : n < 37 ? "" : n == 37 ? "a" : "ab";
+    EXPECT_EQ(contents(a),
+              records < 2 ? (records == 0 ? "" : first) : first + (n < 52 ? "|~" : "|#7"));
     for (int32_t i = 0; i < records; ++i) {
       ASSERT_TRUE(a.at(i).hasKey());
-    }
-    if (records >= 1) {
-      EXPECT_EQ(a.at(0).type(), n < 33 ? ElementType::None : ElementType::String);
-      if (n >= 33) {
-        EXPECT_STREQ(a.at(0).bytes(), n < 37 ? "" : (n == 37 ? "a" : "ab"));
-      }
-      EXPECT_EQ(a.at(0).key()->type(), ElementType::None);
-    }
-    if (records == 2) {
-      const Element& e = a.at(1);
-      EXPECT_EQ(e.number(), n >= 52 ? 7 : 0);
-      EXPECT_EQ(e.type(), n >= 52 ? ElementType::Value : ElementType::None);
-      EXPECT_EQ(e.key()->type(), n < 58 ? ElementType::None : ElementType::String);
-      if (n >= 58) {
-        EXPECT_STREQ(e.key()->bytes(), n < 62 ? "" : "k");
-      }
+      // Record 0 was saved without key; record 1's "k" is there as far as the file goes.
+      const Element& key = *a.at(i).key();
+      EXPECT_EQ(key.type(), i == 1 && n >= 58 ? ElementType::String : ElementType::None);
+      EXPECT_STREQ(key.type() == ElementType::String ? key.bytes() : "",
+                   i == 1 && n >= 62 ? "k" : "");
     }
   }
 }
@@ -222,11 +207,9 @@ TEST_F(NativeFile, HostileCountsAndSizesAreBoundedByTheFile) {
   // the end cuts short (but not beyond the file's size) is completed with zeros.
   ElementArray a =
       loaded(loadNativeFile, kHead + le32(0) + le32(1) + le16(3) + le32(INT32_MAX) + "abc");
-  ASSERT_EQ(a.size(), 1);
-  EXPECT_EQ(describe(a.at(0)), "3/3/0/abc");
+  EXPECT_EQ(contents(a), "<abc>");
   a = loaded(loadNativeFile, kHead + le32(0) + le32(1) + le16(3) + le32(10) + "abc");
-  ASSERT_EQ(a.size(), 1);
-  EXPECT_EQ(contentOf(a.at(0)), std::string("abc") + std::string(7, '\0'));
+  EXPECT_EQ(contents(a), "<abc" + std::string(7, '\0') + ">");
   // A negative key size.
   a = loaded(loadNativeFile,
              kHead + le32(0) + le32(1) + le16(0) + le32(0) + le16(2) + le32(-7) + le16(2));
@@ -238,8 +221,7 @@ TEST_F(NativeFile, HostileCountsAndSizesAreBoundedByTheFile) {
   a = loaded(loadNativeFile, kMagic + le16(1) + le32(-5) + le32(0) + le32(1) + le16(2) + le32(2) +
                                  "q" + bytesOf({0}) + le16(0) + le32(0));
   EXPECT_EQ(a.dimensions(), -5);
-  ASSERT_EQ(a.size(), 1);
-  EXPECT_STREQ(a.getString(0), "q");
+  EXPECT_EQ(contents(a), "q");
   // A huge X boundary with a label: the label list is not blown up to that length.
   a = loaded(loadNativeFile, kMagic + le16(1) + le32(2) + le32(INT32_MAX) + le32(0) + le32(1) +
                                  le32(1) + "L" + le32(0));
