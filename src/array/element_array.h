@@ -75,9 +75,15 @@ class ElementArray {
   void insertFile(ByteBlock block, int32_t index) { insertAt(fileOperand(block), index); }
   void insertElement(const ElementValue& value, int32_t index) { insertAt(value, index); }
 
-  void appendString(const char* text) { insertString(text, size()); }
+  void appendString(const char* text) {
+    if (appendOnlyStores()) {
+      elements_.pushBack(Element::of(ElementValue::ofText(text)));
+    } else {
+      insertString(text, size());
+    }
+  }
   void appendValue(int32_t value) {
-    if (size() >= plainAppendFloor_ && size() < plainAppendLimit_) {
+    if (appendOnlyStores()) {
       elements_.pushBackValue(value);
     } else {
       insertValue(value, size());
@@ -150,6 +156,9 @@ class ElementArray {
   // that it only stores: kept up to date by every operation that changes the capacity
   // or the dimension count.
   void refreshAppendRange();
+  bool appendOnlyStores() const {
+    return size() >= plainAppendFloor_ && size() < plainAppendLimit_;
+  }
   int32_t plainAppendFloor_ = 0;
   int32_t plainAppendLimit_ = 0;
 
