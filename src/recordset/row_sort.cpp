@@ -140,9 +140,9 @@ class RowKeySort {
     return {i, j};
   }
 
-  // The specified steps, with the smaller part handled first and the larger one kept
-  // on an explicit stack: the parts are disjoint, so the order of work changes nothing
-  // and the stack stays O(log n).
+  // The first-row-pivot partition steps, with the smaller part handled first and the
+  // larger one kept on an explicit stack: the parts are disjoint, so the order of work
+  // changes nothing and the stack stays O(log n).
   void partitionSteps(int32_t lo, int32_t hi) {
     std::vector<std::pair<int32_t, int32_t>>& pending = pending_;
     pending.clear();
