@@ -41,9 +41,9 @@ void writeEntry(BufferedWriter& out, const char* key, const char* value) {
 }
 
 // Walks the lines of an INI text, cutting names, keys and values in place, and hands
-// sections and entries to the sink (a key without "=" has a value with no data). Lines of 0 or 1
-// characters, "//" comments (after leading blanks) and entry lines before the first section are
-// skipped.
+// sections and entries to the sink (a key without "=" has a value with no data).
+// Lines of 0 or 1 characters, "//" comments (after leading blanks) and entry lines
+// before the first section are skipped.
 template <class Sink>
 void parseIni(char* text, std::size_t size, Sink& sink) {
   bool inSection = false;
