@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "array/element_array.h"
+#include "support/array_text.h"
 
 namespace quorrel {
 
@@ -94,25 +95,6 @@ inline std::string bytesOf(std::initializer_list<int> values) {
   return s;
 }
 
-// The element's own bytes (a String's with its terminator), for comparisons.
-inline std::string contentOf(const Element& e) {
-  return e.bytes() == nullptr ? std::string()
-                              : std::string(e.bytes(), static_cast<size_t>(e.size()));
-}
-// Every element in one text: texts as they are, "~" for None, "#n" for numbers and
-// "<bytes>" for files.
-inline std::string contents(ElementArray& a) {
-  std::string out;
-  for (int32_t i = 0; i < a.size(); ++i) {
-    const Element& e = a.at(i);
-    out += i == 0 ? "" : "|";
-    out += e.type() == ElementType::None    ? "~"
-           : e.type() == ElementType::Value ? "#" + std::to_string(e.number())
-           : e.type() == ElementType::File  ? "<" + contentOf(e) + ">"
-                                            : std::string(a.getString(i));
-  }
-  return out;
-}
 // Type, size, number and bytes in one text, for whole-element comparisons.
 inline std::string describe(const Element& e) {
   return std::to_string(static_cast<int>(e.type())) + "/" + std::to_string(e.size()) + "/" +

@@ -124,7 +124,7 @@ TEST(Selection, NewRowsTakeTheStartingStateAndStatesStayPut) {
   ElementArray a = pairs({{1, 1}, {2, 2}}, 0);
   appendRowFromList(a, "3,3");  // no visible row: "append" lands at table row 0
   EXPECT_EQ(numberOfRows(a), 0);
-  EXPECT_EQ(dump(a), "3|3|#1|#1|#2|#2");
+  EXPECT_EQ(contents(a), "3|3|#1|#1|#2|#2");
   startNewWhere(a);
   selectWhereGreater(a, 0, 1);
   EXPECT_EQ(a.rowStates, (States{S, U, S}));
@@ -132,10 +132,10 @@ TEST(Selection, NewRowsTakeTheStartingStateAndStatesStayPut) {
   a.setAutoSelect(1);
   a.rowStates = {U, S, S};
   insertRowFromList(a, "0,0", 0);  // visible row 0 is table row 1
-  EXPECT_EQ(dump(a), "3|3|0|0|#1|#1|#2|#2");
+  EXPECT_EQ(contents(a), "3|3|0|0|#1|#1|#2|#2");
   EXPECT_EQ(a.rowStates, (States{U, S, S, S}));
   deleteRow(a, 0);
-  EXPECT_EQ(dump(a), "3|3|#1|#1|#2|#2");
+  EXPECT_EQ(contents(a), "3|3|#1|#1|#2|#2");
   EXPECT_EQ(a.rowStates, (States{U, S, S}));
 }
 

@@ -9,7 +9,7 @@ namespace {
 TEST(TableRows, ListFieldsFillColumnsAsStrings) {
   ElementArray a = makeTable(3, {"a,b", "1,2,3,4", ",a,,b,", "0"});
   // Numbers stay strings ("0" too); missing fields are None; surplus ones are dropped.
-  EXPECT_EQ(dump(a), "a|b|~|1|2|3|a|b|~|0|~|~");
+  EXPECT_EQ(contents(a), "a|b|~|1|2|3|a|b|~|0|~|~");
   EXPECT_EQ(numberOfRows(a), 4);
   EXPECT_EQ(numberOfCols(a), 3);
 
@@ -56,20 +56,20 @@ TEST(TableRows, VisibleRowsCountOnlySelectedRows) {
   // Append lands at the position of the visible row count; states stay at their
   // positions and the new last position gets the starting state.
   appendRowFromList(a, "new,9");
-  EXPECT_EQ(dump(a), "r0|0|r1|1|new|9|r2|2|r3|3");
+  EXPECT_EQ(contents(a), "r0|0|r1|1|new|9|r2|2|r3|3");
   EXPECT_EQ(a.rowStates, (States{U, S, U, S, S}));
   EXPECT_EQ(rowList(a, 1), "r2,2");
 
   insertRowFromList(a, "ins,7", 2);  // before table row 4
-  EXPECT_EQ(dump(a), "r0|0|r1|1|new|9|r2|2|ins|7|r3|3");
+  EXPECT_EQ(contents(a), "r0|0|r1|1|new|9|r2|2|ins|7|r3|3");
   EXPECT_EQ(a.rowStates, (States{U, S, U, S, S, S}));
   insertRowFromList(a, "no", 5);    // above numberOfRows (4): nothing
   replaceRowWithList(a, "rep", 0);  // visible row 0 is table row 1
   replaceRowWithList(a, "x,y", 4);  // not below numberOfRows: nothing
-  EXPECT_EQ(dump(a), "r0|0|rep|~|new|9|r2|2|ins|7|r3|3");
+  EXPECT_EQ(contents(a), "r0|0|rep|~|new|9|r2|2|ins|7|r3|3");
   deleteRow(a, 2);  // visible row 2 is table row 4 ("ins")
   deleteRow(a, 3);  // not below numberOfRows (3)
-  EXPECT_EQ(dump(a), "r0|0|rep|~|new|9|r2|2|r3|3");
+  EXPECT_EQ(contents(a), "r0|0|rep|~|new|9|r2|2|r3|3");
   EXPECT_EQ(a.rowStates, (States{U, S, U, S, S}));
 
   // All rows visible: the partial row's cell is pushed along by the appended row.
@@ -77,7 +77,7 @@ TEST(TableRows, VisibleRowsCountOnlySelectedRows) {
   b.appendString("partial");
   EXPECT_EQ(visibleCellIndex(b, numberOfRows(b), 0), 2);
   appendRowFromList(b, "b,2");
-  EXPECT_EQ(dump(b), "a|1|b|2|partial");
+  EXPECT_EQ(contents(b), "a|1|b|2|partial");
 }
 
 TEST(TableRows, RowsPastTheCapAreNotInserted) {
@@ -91,7 +91,7 @@ TEST(TableRows, RowsPastTheCapAreNotInserted) {
   EXPECT_EQ(a.size(), 1);
   a.setBoundary(1, 2);
   appendRowFromList(a, "x,y");  // the table is one half row: it goes at 0
-  EXPECT_EQ(dump(a), "x|y|#1");
+  EXPECT_EQ(contents(a), "x|y|#1");
 
   // A negative row falls back to the row past the last complete one, here row 0 at
   // index 0: in a table too wide for the cap, replace writes nothing, and delete
@@ -99,7 +99,7 @@ TEST(TableRows, RowsPastTheCapAreNotInserted) {
   ElementArray w = makeTable(INT32_MAX);
   w.appendString("keep");
   replaceRowWithList(w, "r", -1);
-  EXPECT_EQ(dump(w), "keep");
+  EXPECT_EQ(contents(w), "keep");
   w.appendString("too");
   deleteRow(w, -1);
   EXPECT_EQ(w.size(), 0);
@@ -125,7 +125,7 @@ TEST(TableRows, SwapRowsMovesCellsWithKeysAndLeavesStates) {
   a.rowStates = {S, S, U};
   swapRows(a, 0, 1);
   swapRows(a, 0, 2);  // row 2 is not below numberOfRows
-  EXPECT_EQ(dump(a), "b|2|a|1|c|3");
+  EXPECT_EQ(contents(a), "b|2|a|1|c|3");
   EXPECT_EQ(std::string(a.getKeyString(2)), "ka");
   EXPECT_EQ(a.getKeyValue(1), 22);
   EXPECT_EQ(a.rowStates, (States{S, S, U}));

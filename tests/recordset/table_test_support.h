@@ -8,6 +8,7 @@
 
 #include "array/element_array.h"
 #include "recordset/table.h"
+#include "support/array_text.h"
 
 namespace quorrel {
 
@@ -31,19 +32,6 @@ inline ElementArray makeTable(int32_t columns, std::initializer_list<const char*
 inline Texts columnTexts(ElementArray& a, int32_t j) {
   Texts out;
   for (int32_t r = 0; r < a.tableRowCount(); ++r) out.emplace_back(a.getString(cellIndex(a, r, j)));
-  return out;
-}
-
-// Every element in one text: strings as they are, "~" for None, "#n" for values.
-inline std::string dump(ElementArray& a) {
-  std::string out;
-  for (int32_t i = 0; i < a.size(); ++i) {
-    const ElementType type = a.at(i).type();
-    out += i == 0 ? "" : "|";
-    out += type == ElementType::None    ? "~"
-           : type == ElementType::Value ? "#" + std::to_string(a.getValue(i))
-                                        : std::string(a.getString(i));
-  }
   return out;
 }
 

@@ -1,0 +1,30 @@
+// Reading a whole array back as one text, for tests that compare arrays at once.
+#pragma once
+
+#include <string>
+
+#include "array/element_array.h"
+
+namespace quorrel {
+
+// The element's own bytes (a String's with its terminator), for comparisons.
+inline std::string contentOf(const Element& e) {
+  return e.bytes() == nullptr ? std::string()
+                              : std::string(e.bytes(), static_cast<size_t>(e.size()));
+}
+// Every element in one text: texts as they are, "~" for None, "#n" for numbers and
+// "<bytes>" for files.
+inline std::string contents(ElementArray& a) {
+  std::string out;
+  for (int32_t i = 0; i < a.size(); ++i) {
+    const Element& e = a.at(i);
+    out += i == 0 ? "" : "|";
+    out += e.type() == ElementType::None    ? "~"
+           : e.type() == ElementType::Value ? "#" + std::to_string(e.number())
+           : e.type() == ElementType::File  ? "<" + contentOf(e) + ">"
+                                            : std::string(a.getString(i));
+  }
+  return out;
+}
+
+}  // namespace quorrel
