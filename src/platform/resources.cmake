@@ -1,7 +1,7 @@
 # The module's resources, from the one script resources/quorrel.rc. Included from
 # src/host/CMakeLists.txt with quorrel_module defined.
 #  - Windows: the resource compiler builds the script into the DLL (WindowsDll.cmake).
-#  - Elsewhere: rcgen, built for this machine, turns the script into constant tables
+#  - Elsewhere: rcgen, built for the build machine even in a cross build, turns the script into constant tables
 #    (quorrel_resource_data) that the portable menu, string and dialog services read,
 #    and the module exports those services for host programs.
 set(QUORREL_RESOURCE_SCRIPT ${CMAKE_SOURCE_DIR}/resources/quorrel.rc)
@@ -10,15 +10,31 @@ if(WIN32)
   return()  # cmake/WindowsDll.cmake hands the script to the resource compiler
 endif()
 
-add_executable(quorrel_rcgen ${CMAKE_SOURCE_DIR}/src/platform/rcgen/rcgen.cpp)
-quorrel_warnings(quorrel_rcgen)
+if(CMAKE_CROSSCOMPILING)
+  # Built with the build machine's compiler: the target's programs may not run here.
+  include(ExternalProject)
+  set(rcgen_dir ${CMAKE_BINARY_DIR}/rcgen-host)
+  ExternalProject_Add(quorrel_rcgen_host
+    SOURCE_DIR ${CMAKE_SOURCE_DIR}/src/platform/rcgen
+    BINARY_DIR ${rcgen_dir}
+    CMAKE_ARGS -DCMAKE_BUILD_TYPE=Release
+    BUILD_ALWAYS ON
+    INSTALL_COMMAND ""
+    BUILD_BYPRODUCTS ${rcgen_dir}/quorrel_rcgen)
+  set(rcgen_command ${rcgen_dir}/quorrel_rcgen)
+  set(rcgen_depends quorrel_rcgen_host ${rcgen_dir}/quorrel_rcgen)
+else()
+  add_subdirectory(${CMAKE_SOURCE_DIR}/src/platform/rcgen ${CMAKE_BINARY_DIR}/rcgen)
+  set(rcgen_command quorrel_rcgen)
+  set(rcgen_depends quorrel_rcgen)
+endif()
 
 set(QUORREL_GENERATED_RESOURCES ${CMAKE_BINARY_DIR}/generated/quorrel_resources.cpp)
 add_custom_command(
   OUTPUT ${QUORREL_GENERATED_RESOURCES}
   COMMAND ${CMAKE_COMMAND} -E make_directory ${CMAKE_BINARY_DIR}/generated
-  COMMAND quorrel_rcgen ${QUORREL_RESOURCE_SCRIPT} ${QUORREL_GENERATED_RESOURCES}
-  DEPENDS quorrel_rcgen ${QUORREL_RESOURCE_SCRIPT}
+  COMMAND ${rcgen_command} ${QUORREL_RESOURCE_SCRIPT} ${QUORREL_GENERATED_RESOURCES}
+  DEPENDS ${rcgen_depends} ${QUORREL_RESOURCE_SCRIPT}
   COMMENT "Generating resource tables from quorrel.rc"
   VERBATIM)
 
