@@ -2,6 +2,7 @@
 //   fuzz_make_seeds fuzz/corpus
 // Run it again after a format change and commit the result.
 #include <filesystem>
+#include <fstream>
 #include <string>
 
 #include "array/element_array.h"
@@ -42,6 +43,19 @@ ElementArray cube() {
   return a;
 }
 
+// The array_file target reads its first byte as the format: 0 native, 1 host array,
+// 2 CSV, 3 INI. Saves go to a scratch file that is copied in behind that byte.
+void addArraySeed(const std::filesystem::path& dir, const char* name, char format,
+                  void (*save)(ElementArray&, const char*, uint16_t), ElementArray& array) {
+  const std::filesystem::path scratch = dir / ".scratch";
+  save(array, scratch.c_str(), 0);
+  std::ifstream in(scratch, std::ios::binary);
+  std::ofstream out(dir / name, std::ios::binary);
+  out << format << in.rdbuf();
+  in.close();
+  std::filesystem::remove(scratch);
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -54,15 +68,16 @@ int main(int argc, char** argv) {
   ElementArray empty;
   ElementArray t = table();
   ElementArray c = cube();
-  quorrel::saveNativeFile(empty, (dir("native_file") / "empty.arr").c_str(), 0);
-  quorrel::saveNativeFile(t, (dir("native_file") / "table.arr").c_str(), 0);
-  quorrel::saveNativeFile(c, (dir("native_file") / "cube.arr").c_str(), 0);
-  quorrel::saveHostArrayFile(t, (dir("host_file") / "table.mmf").c_str(), 0);
-  quorrel::saveHostArrayFile(c, (dir("host_file") / "cube.mmf").c_str(), 0);
-  quorrel::saveCsvFile(t, (dir("csv_file") / "table.csv").c_str(), 0);
-  quorrel::saveCsvFile(c, (dir("csv_file") / "cube.csv").c_str(), 0);
-  quorrel::saveIniFile(t, (dir("ini_file") / "table.ini").c_str(), 0);
-  quorrel::saveIniFile(empty, (dir("ini_file") / "empty.ini").c_str(), 0);
+  const fs::path arrays = dir("array_file");
+  addArraySeed(arrays, "empty.arr", 0, quorrel::saveNativeFile, empty);
+  addArraySeed(arrays, "table.arr", 0, quorrel::saveNativeFile, t);
+  addArraySeed(arrays, "cube.arr", 0, quorrel::saveNativeFile, c);
+  addArraySeed(arrays, "table.mmf", 1, quorrel::saveHostArrayFile, t);
+  addArraySeed(arrays, "cube.mmf", 1, quorrel::saveHostArrayFile, c);
+  addArraySeed(arrays, "table.csv", 2, quorrel::saveCsvFile, t);
+  addArraySeed(arrays, "cube.csv", 2, quorrel::saveCsvFile, c);
+  addArraySeed(arrays, "table.ini", 3, quorrel::saveIniFile, t);
+  addArraySeed(arrays, "empty.ini", 3, quorrel::saveIniFile, empty);
   quorrel::saveElementToFile(t, 0, (dir("element_file") / "string.bin").c_str(), 0);
   quorrel::saveElementToFile(t, 8, (dir("element_file") / "file.bin").c_str(), 0);
   quorrel::saveElementToFile(t, 6, (dir("element_file") / "value.bin").c_str(), 0);
