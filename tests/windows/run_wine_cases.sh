@@ -44,9 +44,9 @@ run_all() {  # wine build label
 }
 
 run_all "$WINE64" "$build64" win64
-if [[ -n $WINE32 && -f $build32/quorrel.exe && -f $build32/quorrel.dll ]]; then
+if wine32_runs "$build32/quorrel.exe" --module "$build32/quorrel.dll" menu actions; then
   run_all "$WINE32" "$build32" win32
 else
-  echo "win32: not run (${WINE32_WHY:-no 32-bit quorrel.exe in $build32})"
+  echo "win32: not run ($WINE32_WHY)"
 fi
 exit $((total_fail > 0))

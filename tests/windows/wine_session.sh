@@ -20,11 +20,24 @@ wine_session_start() {
   WINE32=$(ls /usr/lib/wine/wine 2>/dev/null || true)
   WINE32_WHY=
   [[ -z $WINE32 ]] && WINE32_WHY="wine32 is not installed: the i386 architecture is not usable here"
-  mkdir -p "$dir"
+  mkdir -p "$dir/prefix"
   export WINEPREFIX=$dir/prefix WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml="
   "$WINESERVER" -p
   trap wine_session_stop EXIT
   # The first start of a new prefix sets it up; do it once, outside any measured case.
   "$WINE64" cmd /c exit >/dev/null 2>&1 </dev/null
   return 0
+}
+
+# Succeeds when 32-bit Wine runs the 32-bit program EXE (given its arguments);
+# otherwise sets WINE32_WHY.
+wine32_runs() {
+  [[ -n $WINE32 ]] || return 1
+  if [[ ! -f $1 ]]; then
+    WINE32_WHY="no $1"
+    return 1
+  fi
+  "$WINE32" "$@" >/dev/null 2>&1 </dev/null && return 0
+  WINE32_WHY="32-bit programs do not start under this Wine"
+  return 1
 }
