@@ -353,12 +353,27 @@ void cancelAndHelp(const Entry& dll) {
              "help calls the host's help service with the page, three times");
 }
 
+// By ordinal, as a host finds it, and the same code by name.
 template <typename Fn>
-Fn entryPoint(HMODULE dll, WORD ordinal, const char* name) {
-  FARPROC byOrdinal = GetProcAddress(dll, MAKEINTRESOURCEA(ordinal));
-  check(byOrdinal && byOrdinal == GetProcAddress(dll, name),
-        std::string(name) + " at ordinal " + std::to_string(ordinal));
-  return reinterpret_cast<Fn>(reinterpret_cast<void*>(byOrdinal));
+Fn entryPoint(HMODULE dll, const char* name) {
+  struct Ordinal {
+    const char* name;
+    WORD ordinal;
+  };
+  static constexpr Ordinal kOrdinals[] = {
+#define QUORREL_ENTRY_POINT(name, ordinal) {#name, ordinal},
+#include "entry_point_ordinals.inc"
+#undef QUORREL_ENTRY_POINT
+  };
+  for (const Ordinal& entry : kOrdinals) {
+    if (std::strcmp(entry.name, name) != 0) continue;
+    FARPROC byOrdinal = GetProcAddress(dll, MAKEINTRESOURCEA(entry.ordinal));
+    check(byOrdinal && byOrdinal == GetProcAddress(dll, name),
+          std::string(name) + " at ordinal " + std::to_string(entry.ordinal));
+    return reinterpret_cast<Fn>(reinterpret_cast<void*>(byOrdinal));
+  }
+  check(false, std::string(name) + " is an entry point");
+  return nullptr;
 }
 
 }  // namespace
@@ -373,8 +388,8 @@ int main(int argc, char** argv) {
     std::printf("cannot load %s: error %lu\n", argv[1], GetLastError());
     return 1;
   }
-  const Entry dll{entryPoint<abi::CreateObjectFn>(module, 14, "CreateObject"),
-                  entryPoint<abi::EditObjectFn>(module, 18, "EditObject")};
+  const Entry dll{entryPoint<abi::CreateObjectFn>(module, "CreateObject"),
+                  entryPoint<abi::EditObjectFn>(module, "EditObject")};
   if (dll.create && dll.edit) {
     createObject(dll);
     dimensions(dll);
