@@ -4,20 +4,32 @@
 # CMakeLists.txt on Windows builds after src/ is added.
 
 # The module-definition file comes from the same list as the Linux version script.
-# __stdcall symbols carry an @bytes decoration; the .def names them decorated and
-# --kill-at strips the decoration from the exported names.
+# On 32-bit Windows __stdcall symbols carry an @bytes decoration; the .def names them
+# decorated and --kill-at strips the decoration from the exported names. 64-bit Windows
+# has one calling convention and no decoration.
 set(quorrel_entry_points ${CMAKE_SOURCE_DIR}/src/host/entry_points.txt)
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${quorrel_entry_points})
 file(STRINGS ${quorrel_entry_points} quorrel_def_lines REGEX "^[A-Za-z]")
 set(quorrel_def_text "LIBRARY quorrel.dll\nEXPORTS\n")
+set(quorrel_ordinals_text "")
 foreach(line IN LISTS quorrel_def_lines)
   if(NOT line MATCHES "^([A-Za-z]+)[ \t]+([0-9]+)[ \t]+([0-9]+)")
     message(FATAL_ERROR "entry_points.txt: cannot read line '${line}'")
   endif()
-  string(APPEND quorrel_def_text "  ${CMAKE_MATCH_1}@${CMAKE_MATCH_3} @${CMAKE_MATCH_2}\n")
+  if(CMAKE_SIZEOF_VOID_P EQUAL 4)
+    string(APPEND quorrel_def_text "  ${CMAKE_MATCH_1}@${CMAKE_MATCH_3} @${CMAKE_MATCH_2}\n")
+  else()
+    string(APPEND quorrel_def_text "  ${CMAKE_MATCH_1} @${CMAKE_MATCH_2}\n")
+  endif()
+  string(APPEND quorrel_ordinals_text "QUORREL_ENTRY_POINT(${CMAKE_MATCH_1}, ${CMAKE_MATCH_2})\n")
 endforeach()
 set(quorrel_def ${CMAKE_BINARY_DIR}/quorrel.def)
 file(CONFIGURE OUTPUT ${quorrel_def} CONTENT "${quorrel_def_text}" @ONLY)
+# The same list for Windows hosts (quorrel.exe, the dialog test), which find every entry
+# point by its ordinal.
+set(QUORREL_GENERATED_INCLUDE_DIR ${CMAKE_BINARY_DIR}/generated)
+file(CONFIGURE OUTPUT ${QUORREL_GENERATED_INCLUDE_DIR}/entry_point_ordinals.inc
+  CONTENT "${quorrel_ordinals_text}" @ONLY)
 
 set_target_properties(quorrel_module PROPERTIES
   PREFIX ""
@@ -34,5 +46,5 @@ file(GLOB quorrel_rc_inputs CONFIGURE_DEPENDS ${CMAKE_SOURCE_DIR}/resources/*.bm
 set_property(SOURCE ${quorrel_rc} TARGET_DIRECTORY quorrel_module APPEND PROPERTY
   OBJECT_DEPENDS ${quorrel_rc_inputs})
 
-# Layout checks compiled for i686, and the Windows test host.
+# Layout checks compiled for i686, and the setup dialog test.
 add_subdirectory(${CMAKE_SOURCE_DIR}/tests/windows ${CMAKE_BINARY_DIR}/tests/windows)

@@ -20,7 +20,7 @@ struct DialogContext {
 };
 
 DialogContext& contextOf(HWND dialog) {
-  return *reinterpret_cast<DialogContext*>(GetWindowLongA(dialog, DWL_USER));
+  return *reinterpret_cast<DialogContext*>(GetWindowLongPtrA(dialog, DWLP_USER));
 }
 
 void setChecked(HWND dialog, int id, bool checked) {
@@ -55,7 +55,7 @@ void showDimensions(HWND dialog, int32_t dimensionCount) {
 }
 
 void initialise(HWND dialog, DialogContext* context) {
-  SetWindowLongA(dialog, DWL_USER, reinterpret_cast<LONG_PTR>(context));
+  SetWindowLongPtrA(dialog, DWLP_USER, reinterpret_cast<LONG_PTR>(context));
   const void* record = context->setupRecord;
   char delimiter[abi::kSetupListDelimiterSize + 1];
   SetDlgItemTextA(dialog, kControlDelimiter, setupListDelimiter(record, delimiter));

@@ -84,6 +84,7 @@ using DLGPROC = INT_PTR (*)(HWND, UINT, WPARAM, LPARAM);
 #define BST_UNCHECKED 0
 #define BST_CHECKED 1
 #define DWL_USER 8
+#define DWLP_USER DWL_USER
 
 // Window and control styles the dialog template uses.
 #define WS_DISABLED 0x08000000L
@@ -120,6 +121,14 @@ QUORREL_PLATFORM_API INT_PTR DialogBoxParamA(HINSTANCE instance, LPCSTR name, HW
 QUORREL_PLATFORM_API BOOL EndDialog(HWND dialog, INT_PTR result);
 QUORREL_PLATFORM_API LONG_PTR SetWindowLongA(HWND window, int index, LONG_PTR value);
 QUORREL_PLATFORM_API LONG_PTR GetWindowLongA(HWND window, int index);
+// The pointer-sized forms that Windows code uses (64-bit Windows keeps a LONG in the
+// ...LongA slots); here the slots are pointer-sized already.
+inline LONG_PTR SetWindowLongPtrA(HWND window, int index, LONG_PTR value) {
+  return SetWindowLongA(window, index, value);
+}
+inline LONG_PTR GetWindowLongPtrA(HWND window, int index) {
+  return GetWindowLongA(window, index);
+}
 QUORREL_PLATFORM_API HWND GetDlgItem(HWND dialog, int id);
 QUORREL_PLATFORM_API BOOL SetDlgItemTextA(HWND dialog, int id, LPCSTR text);
 QUORREL_PLATFORM_API UINT GetDlgItemTextA(HWND dialog, int id, LPSTR buffer, int size);

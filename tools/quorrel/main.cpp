@@ -161,6 +161,7 @@ int dispatch(const Options& options) {
 }  // namespace
 
 int main(int argc, char** argv) {
+  quorrel::tool::useBinaryStandardStreams();
   std::string command;
   try {
     const Options options = parseOptions(argc, argv);

@@ -1,8 +1,16 @@
 #include "module.h"
 
+#ifdef _WIN32
+#include <fcntl.h>
+#include <io.h>
+
+#include "platform/windows_services.h"
+#else
 #include <dlfcn.h>
+#endif
 
 #include <algorithm>
+#include <cstdio>
 #include <cstring>
 #include <filesystem>
 
@@ -87,7 +95,75 @@ std::vector<unsigned char> setupRecord(const SetupFields& fields) {
 }  // namespace
 
 // ---------------------------------------------------------------------------------
+// Loading: the only platform-specific part of the command.
 Module::Module(std::string path, void* handle) : path_(std::move(path)), handle_(handle) {}
+
+#ifdef _WIN32
+
+namespace {
+// Every entry point with its ordinal, from entry_points.txt (WindowsDll.cmake).
+struct EntryOrdinal {
+  const char* name;
+  WORD ordinal;
+};
+constexpr EntryOrdinal kEntryOrdinals[] = {
+#define QUORREL_ENTRY_POINT(name, ordinal) {#name, ordinal},
+#include "entry_point_ordinals.inc"
+#undef QUORREL_ENTRY_POINT
+};
+
+void* procedure(void* handle, LPCSTR name) {
+  return reinterpret_cast<void*>(GetProcAddress(static_cast<HMODULE>(handle), name));
+}
+}  // namespace
+
+Module::~Module() {
+  FreeLibrary(static_cast<HMODULE>(handle_));
+}
+
+std::unique_ptr<Module> Module::open(const std::string& path) {
+  // A bare file name would make LoadLibrary search the system folders instead.
+  const std::string usable = path.find_first_of("/\\") == std::string::npos ? "./" + path : path;
+  std::string native = usable;
+  std::replace(native.begin(), native.end(), '/', '\\');
+  HMODULE handle = LoadLibraryA(native.c_str());
+  if (!handle) {
+    const DWORD code = GetLastError();
+    // The same words as the dynamic loader's on Linux, so that a script's output does
+    // not depend on the platform.
+    const std::string why =
+        code == ERROR_MOD_NOT_FOUND || code == ERROR_FILE_NOT_FOUND || code == ERROR_PATH_NOT_FOUND
+            ? "cannot open shared object file: No such file or directory"
+            : "Windows error " + std::to_string(code);
+    throw ModuleError("cannot load module: " + usable + ": " + why);
+  }
+  std::unique_ptr<Module> module(new Module(path, handle));
+  // A host finds the entry points by ordinal; the names must lead to the same code.
+  for (const auto& entry : kEntryOrdinals) {
+    void* byOrdinal = procedure(handle, MAKEINTRESOURCEA(entry.ordinal));
+    if (!byOrdinal || byOrdinal != procedure(handle, entry.name)) {
+      throw ModuleError("cannot load module: " + usable + ": " + entry.name +
+                        " is not exported at ordinal " + std::to_string(entry.ordinal));
+    }
+  }
+  return module;
+}
+
+void* Module::symbol(const char* name) const {
+  for (const auto& entry : kEntryOrdinals) {
+    if (std::strcmp(entry.name, name) == 0) {
+      return procedure(handle_, MAKEINTRESOURCEA(entry.ordinal));
+    }
+  }
+  return nullptr;
+}
+
+void useBinaryStandardStreams() {
+  // Output is byte for byte what the Linux build writes: no CRLF translation.
+  for (FILE* stream : {stdin, stdout, stderr}) _setmode(_fileno(stream), _O_BINARY);
+}
+
+#else
 
 Module::~Module() {
   dlclose(handle_);
@@ -104,6 +180,10 @@ std::unique_ptr<Module> Module::open(const std::string& path) {
 void* Module::symbol(const char* name) const {
   return dlsym(handle_, name);
 }
+
+void useBinaryStandardStreams() {}
+
+#endif
 
 Signature Module::actionSignature(int32_t code) const {
   return signatureOf(required<abi::GetInfoEntryFn>(*this, "GetActionInfos")(nullptr, code));
@@ -185,6 +265,22 @@ void Module::printMenu(std::string_view which, std::string& out) const {
                                                : "GetConditionMenu";
   void* menu = required<abi::GetMenuFn>(*this, entry)(0, 0, 0);
   if (!menu) return;
+#ifdef _WIN32
+  // The system's menu services, on the menu the module built with them.
+  const menus::Services services{
+      [](menus::Menu m) { return GetMenuItemCount(static_cast<HMENU>(m)); },
+      [](menus::Menu m, int position) {
+        return static_cast<unsigned>(GetMenuItemID(static_cast<HMENU>(m), position));
+      },
+      [](menus::Menu m, unsigned item, char* text, int size, unsigned flags) {
+        return GetMenuStringA(static_cast<HMENU>(m), item, text, size, flags);
+      },
+      [](menus::Menu m, int position) -> menus::Menu {
+        return GetSubMenu(static_cast<HMENU>(m), position);
+      }};
+  menus::walk(services, menu, 0, out);
+  DestroyMenu(static_cast<HMENU>(menu));  // the host owns the menu it was handed
+#else
   const menus::Services services{required<menus::ItemCountFn>(*this, "GetMenuItemCount"),
                                  required<menus::ItemIdFn>(*this, "GetMenuItemID"),
                                  required<menus::ItemTextFn>(*this, "GetMenuStringA"),
@@ -192,6 +288,7 @@ void Module::printMenu(std::string_view which, std::string& out) const {
   menus::walk(services, menu, 0, out);
   // The host owns the menu it was handed.
   if (const auto destroy = optional<menus::DestroyFn>(*this, "DestroyMenu")) destroy(menu);
+#endif
 }
 
 // ---------------------------------------------------------------------------------
@@ -290,6 +387,16 @@ ExpressionResult Instance::callExpression(int32_t code, const std::vector<Argume
 std::string defaultModulePath() {
   namespace fs = std::filesystem;
   std::error_code error;
+#ifdef _WIN32
+  char self[MAX_PATH] = {};
+  const DWORD length = GetModuleFileNameA(nullptr, self, sizeof self);
+  if (length == 0 || length >= sizeof self) return "quorrel.dll";
+  const fs::path dir = fs::path(self).parent_path();
+  for (const fs::path& candidate : {dir / "quorrel.dll", dir / "../quorrel.dll"}) {
+    if (fs::exists(candidate, error)) return candidate.lexically_normal().string();
+  }
+  return (dir / "quorrel.dll").string();
+#else
   const fs::path self = fs::read_symlink("/proc/self/exe", error);
   if (error) return "libquorrel.so";
   const fs::path dir = self.parent_path();
@@ -298,6 +405,7 @@ std::string defaultModulePath() {
     if (fs::exists(candidate, error)) return candidate.lexically_normal().string();
   }
   return (dir / "../src/host/libquorrel.so").lexically_normal().string();
+#endif
 }
 
 }  // namespace quorrel::tool

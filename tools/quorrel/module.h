@@ -95,4 +95,8 @@ class Instance {
 // The module beside the executable: the install layout, then the build tree.
 std::string defaultModulePath();
 
+// Standard input, output and error carry bytes as they are (Windows would translate
+// line ends otherwise).
+void useBinaryStandardStreams();
+
 }  // namespace quorrel::tool

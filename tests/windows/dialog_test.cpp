@@ -1,0 +1,403 @@
+// The setup dialog through the real dialog manager: loads the DLL, calls CreateObject
+// and EditObject, and plays the author with window messages from inside the modal
+// loop (a CBT hook catches the dialog, a timer acts once it runs): edit texts set
+// with WM_SETTEXT or typed with WM_CHAR, buttons pressed with BM_CLICK, Enter and
+// Escape posted as keys. Then checks the setup record's bytes. Run under Wine on a
+// virtual display; prints one line per failed check and "N passed, N failed".
+#include <windows.h>
+
+#include <array>
+#include <cstdio>
+#include <cstring>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "host/abi.h"
+
+namespace abi = quorrel::abi;
+
+namespace {
+
+int passed = 0, failed = 0;
+
+void check(bool ok, const std::string& what) {
+  if (ok) {
+    ++passed;
+  } else {
+    ++failed;
+    std::printf("FAIL %s\n", what.c_str());
+  }
+}
+
+template <typename T>
+void checkEqual(const T& actual, const T& expected, const std::string& what) {
+  check(actual == expected, what);
+}
+
+using Record = std::array<unsigned char, abi::kSetupRecordSize>;
+using Ints = std::vector<int32_t>;
+
+int32_t readInt(const Record& record, std::size_t offset) {
+  int32_t value;
+  std::memcpy(&value, record.data() + offset, sizeof value);
+  return value;
+}
+std::string delimiterOf(const Record& record) {
+  return reinterpret_cast<const char*>(record.data() + abi::kSetupListDelimiter);
+}
+constexpr std::size_t kFields[] = {abi::kSetupDimensionCount, abi::kSetupXBoundary,
+                                   abi::kSetupYBoundary,      abi::kSetupCaseSensitive,
+                                   abi::kSetupWildcardSearch, abi::kSetupAutoSelectRows};
+Ints fieldsOf(const Record& record) {
+  Ints values;
+  for (std::size_t offset : kFields) values.push_back(readInt(record, offset));
+  return values;
+}
+// A record as the host keeps it: dimension count, X, Y, case, wildcard, auto-select.
+Record storedRecord(const Ints& fields, const char* delimiter = ";") {
+  Record record;
+  record.fill(0xEE);
+  std::memset(record.data(), 0xAB, abi::kSetupHostHeaderSize);
+  for (std::size_t i = 0; i < fields.size(); ++i) {
+    std::memcpy(record.data() + kFields[i], &fields[i], sizeof(int32_t));
+  }
+  std::strcpy(reinterpret_cast<char*>(record.data() + abi::kSetupListDelimiter), delimiter);
+  return record;
+}
+
+// The editor context: no owner window, and the host's help service.
+std::vector<std::string> helpCalls;
+void QUORREL_CALL recordHelp(const char* path, abi::HostWord first, abi::HostWord second) {
+  helpCalls.push_back(std::string(path) + (first == 0 && second == 0 ? "" : " (arguments)"));
+}
+struct Editor {
+  std::array<unsigned char, 2048> context{};
+  Editor() {
+    abi::HelpService help = recordHelp;
+    std::memcpy(context.data() + abi::kEditorHelpService, &help, sizeof help);
+  }
+};
+
+constexpr int kOk = 1, kCancel = 2, kHelp = 20100;
+constexpr int k1D = 1000, k2D = 1001, k3D = 1002, kX = 1003, kY = 1004;
+constexpr int kCaseInsensitive = 1005, kCaseSensitive = 1006, kLiteral = 1007, kWildcard = 1008;
+constexpr int kDelimiter = 1009, kOn = 1010, kOff = 1011;
+
+// --- The author: real messages to the real controls ------------------------------
+void click(HWND dialog, int id) {
+  SendMessageA(GetDlgItem(dialog, id), BM_CLICK, 0, 0);
+}
+void setText(HWND dialog, int id, const std::string& text) {
+  SetDlgItemTextA(dialog, id, text.c_str());
+}
+// Typed key by key, so the edit control's own filters apply.
+void type(HWND dialog, int id, const std::string& text) {
+  HWND field = GetDlgItem(dialog, id);
+  SetWindowTextA(field, "");
+  for (unsigned char c : text) SendMessageA(field, WM_CHAR, c, 1);
+}
+void press(HWND dialog, WPARAM key) {
+  PostMessageA(dialog, WM_KEYDOWN, key, 1);
+  PostMessageA(dialog, WM_KEYUP, key, 0xC0000001);
+}
+std::string fieldText(HWND dialog, int id) {
+  char text[2048] = {};
+  GetDlgItemTextA(dialog, id, text, sizeof text);
+  return text;
+}
+// The checked radio buttons of all four groups and the enabled boundary fields.
+std::string state(HWND dialog) {
+  const char* names[] = {"1D",        "2D",      "3D",       nullptr, nullptr, "insensitive",
+                         "sensitive", "literal", "wildcard", nullptr, "on",    "off"};
+  std::string out;
+  for (int id = k1D; id <= kOff; ++id) {
+    if (names[id - k1D] && IsDlgButtonChecked(dialog, id) == BST_CHECKED) {
+      out += std::string(out.empty() ? "" : " ") + names[id - k1D];
+    }
+  }
+  out += " |";
+  if (IsWindowEnabled(GetDlgItem(dialog, kX))) out += " X";
+  if (IsWindowEnabled(GetDlgItem(dialog, kY))) out += " Y";
+  return out;
+}
+
+// Catches the dialog as it is activated and acts once the modal loop runs.
+std::function<void(HWND)> currentAct;
+HWND currentDialog = nullptr;
+bool acted = false;
+
+void CALLBACK actNow(HWND, UINT, UINT_PTR timer, DWORD) {
+  KillTimer(nullptr, timer);
+  if (acted || !currentDialog) return;
+  acted = true;
+  currentAct(currentDialog);
+}
+
+LRESULT CALLBACK watch(int code, WPARAM wParam, LPARAM lParam) {
+  if (code == HCBT_ACTIVATE && !currentDialog) {
+    char title[64] = {};
+    GetWindowTextA(reinterpret_cast<HWND>(wParam), title, sizeof title);
+    if (std::strcmp(title, "Setup Quorrel") == 0) {
+      currentDialog = reinterpret_cast<HWND>(wParam);
+      SetTimer(nullptr, 0, 10, actNow);
+    }
+  }
+  return CallNextHookEx(nullptr, code, wParam, lParam);
+}
+
+struct Entry {
+  abi::CreateObjectFn create;
+  abi::EditObjectFn edit;
+};
+
+// Runs one entry point with the author acting in the dialog it shows.
+template <typename Call>
+auto withAuthor(const std::string& what, std::function<void(HWND)> act, Call call) {
+  currentAct = std::move(act);
+  currentDialog = nullptr;
+  acted = false;
+  HHOOK hook = SetWindowsHookExA(WH_CBT, watch, nullptr, GetCurrentThreadId());
+  const auto answer = call();
+  UnhookWindowsHookEx(hook);
+  check(acted, what + ": the dialog was shown (error " + std::to_string(GetLastError()) + ")");
+  return answer;
+}
+
+void edit(const Entry& dll, const std::string& what, Record& record, int32_t answer,
+          std::function<void(HWND)> act) {
+  Editor editor;
+  const int32_t got = withAuthor(
+      what, std::move(act), [&] { return dll.edit(editor.context.data(), 0, 0, record.data()); });
+  checkEqual(got, answer, what + ": EditObject answers " + std::to_string(answer));
+}
+
+std::string show(const Ints& values) {
+  std::string out;
+  for (int32_t v : values) out += std::to_string(v) + " ";
+  return out;
+}
+void checkFields(const Record& record, const Ints& expected, const std::string& what) {
+  check(fieldsOf(record) == expected,
+        what + ": fields " + show(fieldsOf(record)) + "expected " + show(expected));
+}
+
+// --- The cases: those of the headless dialog, through the real controls -----------
+void createObject(const Entry& dll) {
+  Editor editor;
+  Record record;
+  record.fill(0x5A);
+  const int32_t answer = withAuthor(
+      "create",
+      [](HWND dialog) {
+        checkEqual(state(dialog), std::string("2D insensitive literal off | X"), "create: shown");
+        checkEqual(fieldText(dialog, kX) + fieldText(dialog, kY) + fieldText(dialog, kDelimiter),
+                   std::string("1010,"), "create: X, Y, delimiter shown");
+        press(dialog, VK_RETURN);  // Enter is OK
+      },
+      [&] { return dll.create(editor.context.data(), 0, record.data()); });
+  checkEqual(answer, 0, "create: CreateObject answers 0 after OK");
+  int16_t size[2];
+  std::memcpy(size, record.data() + abi::kSetupObjectWidth, sizeof size);
+  check(size[0] == 32 && size[1] == 32, "create: object size 32x32");
+  checkFields(record, {2, 10, 10, 0, 0, 0}, "create");
+  checkEqual(delimiterOf(record), std::string(","), "create: delimiter");
+  bool header = true;
+  for (std::size_t i = 0; i < abi::kSetupHostHeaderSize; ++i) header &= record[i] == 0x5A;
+  check(header, "create: the host's header bytes are kept");
+
+  Record cancelled{};
+  const int32_t cancelAnswer = withAuthor(
+      "create cancelled",
+      [](HWND dialog) {
+        click(dialog, k3D);
+        type(dialog, kX, "77");
+        click(dialog, kCancel);
+      },
+      [&] { return dll.create(editor.context.data(), 0, cancelled.data()); });
+  checkEqual(cancelAnswer, -1, "create cancelled: CreateObject answers -1");
+  checkFields(cancelled, {2, 10, 10, 0, 0, 0}, "create cancelled keeps the defaults");
+  checkEqual(delimiterOf(cancelled), std::string(","), "create cancelled: delimiter");
+}
+
+void dimensions(const Entry& dll) {
+  Record record = storedRecord({7, 4, 5, 0, 0, 0});  // an unknown count opens as 1D
+  edit(dll, "unknown count", record, 1, [](HWND dialog) {
+    checkEqual(state(dialog), std::string("1D insensitive literal off |"), "unknown count: shown");
+    click(dialog, kOk);
+  });
+  checkFields(record, {1, 4, 5, 0, 0, 0}, "unknown count");
+
+  record = storedRecord({2, 10, 10, 0, 0, 0});
+  edit(dll, "dimension buttons", record, 0, [](HWND dialog) {
+    click(dialog, k3D);
+    checkEqual(state(dialog), std::string("3D insensitive literal off | X Y"), "3D enables X, Y");
+    click(dialog, k1D);
+    checkEqual(state(dialog), std::string("1D insensitive literal off |"), "1D enables none");
+    click(dialog, k2D);
+    checkEqual(state(dialog), std::string("2D insensitive literal off | X"), "2D enables X");
+    press(dialog, VK_ESCAPE);
+  });
+
+  record = storedRecord({3, 4, 5, 0, 0, 0});
+  edit(dll, "2D", record, 1, [](HWND dialog) {
+    type(dialog, kX, "50");
+    type(dialog, kY, "99");
+    click(dialog, k2D);
+    checkEqual(fieldText(dialog, kY), std::string("99"), "2D: Y field keeps its text");
+    click(dialog, kOk);
+  });
+  checkFields(record, {2, 50, 5, 0, 0, 0}, "2D stores X and keeps Y");
+
+  record = storedRecord({2, 4, 5, 0, 0, 0});
+  edit(dll, "3D", record, 1, [](HWND dialog) {
+    click(dialog, k3D);
+    type(dialog, kX, "6");
+    type(dialog, kY, "7");
+    press(dialog, VK_RETURN);
+  });
+  checkFields(record, {3, 6, 7, 0, 0, 0}, "3D stores X and Y");
+  edit(dll, "1D", record, 1, [](HWND dialog) {
+    type(dialog, kX, "60");
+    type(dialog, kY, "70");
+    click(dialog, k1D);
+    click(dialog, kOk);
+  });
+  checkFields(record, {1, 6, 7, 0, 0, 0}, "1D keeps X and Y");
+}
+
+void signedBoundaries(const Entry& dll) {
+  Record record = storedRecord({3, -5, 12, 0, 0, 0});
+  edit(dll, "signed", record, 1, [](HWND dialog) {
+    checkEqual(fieldText(dialog, kX), std::string("-5"), "signed: X shows -5");
+    type(dialog, kY, "-1a2 3");  // the number field takes digits only
+    checkEqual(fieldText(dialog, kY), std::string("123"), "signed: Y typed takes digits");
+    click(dialog, kOk);
+  });
+  checkFields(record, {3, -5, 123, 0, 0, 0}, "signed");
+  edit(dll, "emptied", record, 1, [](HWND dialog) {
+    setText(dialog, kX, "");
+    click(dialog, kOk);
+  });
+  checkFields(record, {3, 0, 123, 0, 0, 0}, "an emptied field stores 0");
+}
+
+void modes(const Entry& dll) {
+  Record record = storedRecord({2, 10, 10, 5, -3, 2});  // only exactly 1 is On
+  edit(dll, "modes", record, 1, [](HWND dialog) {
+    checkEqual(state(dialog), std::string("2D sensitive wildcard off | X"), "modes: shown");
+    click(dialog, kOk);
+  });
+  checkFields(record, {2, 10, 10, 1, 1, 0}, "modes stored as 0 or 1");
+  edit(dll, "modes clicked", record, 1, [](HWND dialog) {
+    click(dialog, kCaseInsensitive);
+    click(dialog, kLiteral);
+    click(dialog, kOn);
+    checkEqual(state(dialog), std::string("2D insensitive literal on | X"), "modes: clicked");
+    click(dialog, kOk);
+  });
+  checkFields(record, {2, 10, 10, 0, 0, 1}, "modes clicked");
+}
+
+void delimiter(const Entry& dll) {
+  Record record = storedRecord({2, 10, 10, 0, 0, 1});
+  static std::string typed(1100, 'd');
+  for (std::size_t i = 0; i < typed.size(); ++i) typed[i] = static_cast<char>('a' + i % 26);
+  edit(dll, "delimiter", record, 1, [](HWND dialog) {
+    checkEqual(fieldText(dialog, kDelimiter), std::string(";"), "delimiter: shown");
+    setText(dialog, kDelimiter, typed);
+    checkEqual(fieldText(dialog, kDelimiter), typed, "delimiter: the field holds all");
+    click(dialog, kOk);
+  });
+  checkEqual(delimiterOf(record), typed.substr(0, 1023), "delimiter cut to 1023 characters");
+  bool kept = true;
+  for (std::size_t i = abi::kSetupListDelimiter + 1024; i < abi::kSetupAutoSelectRows; ++i) {
+    kept &= record[i] == 0xEE;
+  }
+  check(kept, "delimiter: the bytes past the 1024 written are kept");
+  checkEqual(readInt(record, abi::kSetupAutoSelectRows), 1, "delimiter: auto-select kept");
+  edit(dll, "empty delimiter", record, 1, [](HWND dialog) {
+    setText(dialog, kDelimiter, "");
+    click(dialog, kOk);
+  });
+  checkEqual(delimiterOf(record), std::string(), "an emptied delimiter is stored empty");
+}
+
+void cancelAndHelp(const Entry& dll) {
+  for (bool escape : {false, true}) {
+    const std::string what = escape ? "escape" : "cancel";
+    Record record = storedRecord({2, 10, 10, 0, 0, 0});
+    const Record before = record;
+    edit(dll, what, record, 0, [escape](HWND dialog) {
+      click(dialog, k3D);
+      type(dialog, kX, "1");
+      type(dialog, kY, "2");
+      setText(dialog, kDelimiter, "|");
+      for (int id : {kCaseSensitive, kWildcard, kOn}) click(dialog, id);
+      escape ? press(dialog, VK_ESCAPE) : click(dialog, kCancel);
+    });
+    check(record == before, what + " leaves the record");
+  }
+
+  helpCalls.clear();
+  Record record = storedRecord({2, 10, 10, 0, 0, 0});
+  const Record before = record;
+  edit(dll, "help", record, 0, [](HWND dialog) {
+    for (int i = 0; i < 3; ++i) click(dialog, kHelp);
+    check(IsWindow(dialog) && IsWindowVisible(dialog), "help keeps the dialog open");
+    checkEqual(state(dialog), std::string("2D insensitive literal off | X"), "help: state");
+    click(dialog, kCancel);
+  });
+  check(record == before, "help leaves the record");
+  checkEqual(helpCalls, std::vector<std::string>(3, "Help\\Quorrel\\quorrel2.html"),
+             "help calls the host's help service with the page, three times");
+}
+
+// By ordinal, as a host finds it, and the same code by name.
+template <typename Fn>
+Fn entryPoint(HMODULE dll, const char* name) {
+  struct Ordinal {
+    const char* name;
+    WORD ordinal;
+  };
+  static constexpr Ordinal kOrdinals[] = {
+#define QUORREL_ENTRY_POINT(name, ordinal) {#name, ordinal},
+#include "entry_point_ordinals.inc"
+#undef QUORREL_ENTRY_POINT
+  };
+  for (const Ordinal& entry : kOrdinals) {
+    if (std::strcmp(entry.name, name) != 0) continue;
+    FARPROC byOrdinal = GetProcAddress(dll, MAKEINTRESOURCEA(entry.ordinal));
+    check(byOrdinal && byOrdinal == GetProcAddress(dll, name),
+          std::string(name) + " at ordinal " + std::to_string(entry.ordinal));
+    return reinterpret_cast<Fn>(reinterpret_cast<void*>(byOrdinal));
+  }
+  check(false, std::string(name) + " is an entry point");
+  return nullptr;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  if (argc != 2) {
+    std::fprintf(stderr, "usage: quorrel_dialog_test DLL\n");
+    return 2;
+  }
+  HMODULE module = LoadLibraryA(argv[1]);
+  if (!module) {
+    std::printf("cannot load %s: error %lu\n", argv[1], GetLastError());
+    return 1;
+  }
+  const Entry dll{entryPoint<abi::CreateObjectFn>(module, "CreateObject"),
+                  entryPoint<abi::EditObjectFn>(module, "EditObject")};
+  if (dll.create && dll.edit) {
+    createObject(dll);
+    dimensions(dll);
+    signedBoundaries(dll);
+    modes(dll);
+    delimiter(dll);
+    cancelAndHelp(dll);
+  }
+  std::printf("%d passed, %d failed\n", passed, failed);
+  return failed == 0 ? 0 : 1;
+}

@@ -1,0 +1,48 @@
+#!/usr/bin/env bash
+# Runs the setup dialog test (quorrel_dialog_test.exe on quorrel.dll) under Wine on a
+# virtual X display. Exits 77 (skipped) when Wine, xvfb-run or the Windows build is
+# missing.
+#   run_wine_dialog.sh BUILD64 BUILD32 WORK
+set -u
+here=$(cd "$(dirname "$0")" && pwd)
+absolute() { [[ $1 == /* ]] && echo "$1" || echo "$PWD/$1"; }
+build64=$(absolute "$1") build32=$(absolute "$2") work=$(absolute "$3")
+source "$here/wine_session.sh"
+
+if [[ -z ${QUORREL_UNDER_XVFB:-} ]]; then
+  if ! command -v xvfb-run >/dev/null; then
+    echo "SKIPPED: xvfb-run is not installed (scripts/install-wine installs it); the setup"
+    echo "dialog needs a display"
+    exit 77
+  fi
+  for f in quorrel_dialog_test.exe quorrel.dll; do
+    if [[ ! -f $build64/$f ]]; then
+      echo "SKIPPED: $build64/$f is missing (build it: cmake --preset mingw64 && cmake --build --preset mingw64)"
+      exit 77
+    fi
+  done
+  QUORREL_UNDER_XVFB=1 exec xvfb-run -a bash "$0" "$build64" "$build32" "$work"
+fi
+
+wine_session_start "$work" || exit 77
+# Windows in a Wine desktop of their own: with no window manager on the display, every
+# dialog that closes would wait two seconds for one to acknowledge it.
+if [[ ! -f $work/desktop-set ]]; then
+  "$WINE64" reg add 'HKCU\Software\Wine\Explorer' /v Desktop /d Default /f >/dev/null &&
+    "$WINE64" reg add 'HKCU\Software\Wine\Explorer\Desktops' /v Default /d 800x600 /f >/dev/null &&
+    touch "$work/desktop-set"
+  "$WINESERVER" -k
+  "$WINESERVER" -w
+  "$WINESERVER" -p
+fi
+
+status=0
+echo "win64:"
+"$WINE64" "$build64/quorrel_dialog_test.exe" "$build64/quorrel.dll" || status=1
+if wine32_runs "$build32/quorrel.exe" --module "$build32/quorrel.dll" menu actions; then
+  echo "win32:"
+  "$WINE32" "$build32/quorrel_dialog_test.exe" "$build32/quorrel.dll" || status=1
+else
+  echo "win32: not run ($WINE32_WHY)"
+fi
+exit $status
