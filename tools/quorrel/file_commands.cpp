@@ -272,11 +272,13 @@ void warnLosses(const ArrayContents& a, ArrayFormat target, bool quoted, std::os
   } else if (target == ArrayFormat::Csv) {
     const int32_t columns = a.dims > 1 && a.columns() > 0 ? a.columns() : a.size;
     const bool padded = columns > 0 && a.size % columns != 0;
-    if (a.dims != 2 || padded) {
-      const int64_t rows = columns > 0 ? (a.size + columns - 1) / columns : 0;
-      warn(std::to_string(a.dims) + "-D array of " + plural(a.size, "element") + " becomes 2-D " +
-           plural(rows, "row") + " x " + plural(columns, "column") +
-           (padded ? " (the last row padded)" : ""));
+    const int64_t rows = columns > 0 ? (a.size + columns - 1) / columns : 0;
+    if (a.dims != 2) {
+      warn(std::to_string(a.dims) + "-D array becomes 2-D: " + plural(rows, "row") + " x " +
+           plural(columns, "column"));
+    } else if (padded) {
+      warn("the last row is padded: " + plural(a.size, "element") + " become " +
+           plural(rows * columns, "cell"));
     }
     const auto split = std::count_if(a.texts.begin(), a.texts.end(), [](const std::string& t) {
       return t.find_first_of(",\r\n") != std::string::npos;

@@ -207,7 +207,7 @@ int dispatch(Options options) {
     const bool shared = owner == "run" && command == "shell";
     const bool shellOnly = owner == "shell" && command == "shell";
     if (owner != command && !shared && !shellOnly) {
-      throw UsageError(option + " belongs to " + (owner == "shell" ? "shell" : owner));
+      throw UsageError(option + " belongs to " + (owner == "run" ? "run and shell" : owner));
     }
   }
   // Operands are checked before the module is loaded, so misuse is always status 2.
