@@ -87,6 +87,7 @@ char* generate(const char* text, int state) {
 }
 
 char** complete(const char* text, int, int) {
+  rl_attempted_completion_over = 1;  // no file names when no command or name fits
   return rl_completion_matches(text, generate);
 }
 #endif

@@ -6,8 +6,6 @@
 #include <filesystem>
 #include <fstream>
 
-#include "catalog.h"
-
 namespace quorrel::tool {
 namespace {
 
@@ -44,12 +42,12 @@ void Session::replaceInstance(const SetupFields& setup) {
   instance_ = std::make_unique<Instance>(module_.get(), setup);
 }
 
-std::optional<std::string> fileProblem(const std::string& path, int use) {
+std::optional<std::string> fileProblem(const std::string& path, FileUse use) {
   namespace fs = std::filesystem;
   std::error_code error;
   const auto status = fs::status(path, error);
   if (fs::is_directory(status)) return "it is a directory";
-  if (static_cast<FileUse>(use) == FileUse::Read) {
+  if (use == FileUse::Read) {
     if (!fs::exists(status)) return std::string(std::strerror(ENOENT));
     if (!std::ifstream(path, std::ios::binary)) return std::string(std::strerror(errno));
     return std::nullopt;
@@ -67,7 +65,7 @@ void Session::warnAboutFile(int32_t code, const std::vector<Argument>& args, con
   const ActionEntry& entry = actionEntry(code);
   if (entry.file == FileUse::None || !warnings_) return;
   const std::string& path = args[entry.pathParam].text;
-  const auto problem = fileProblem(path, static_cast<int>(entry.file));
+  const auto problem = fileProblem(path, entry.file);
   if (!problem) return;
   static constexpr const char* kVerbs[] = {"", "read", "write", "append to"};
   *warnings_ << where.file << ':' << where.line << ": warning: " << entry.name << " cannot "

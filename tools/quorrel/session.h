@@ -8,6 +8,7 @@
 #include <string>
 #include <string_view>
 
+#include "catalog.h"
 #include "module.h"
 #include "script.h"
 
@@ -53,6 +54,6 @@ int runScript(const ModuleLoader& module, std::istream& in, const std::string& n
               std::ostream& out, std::ostream& err, const RunOptions& options = {});
 
 // The reason an action that uses `path` as `use` says cannot open it, or nothing.
-std::optional<std::string> fileProblem(const std::string& path, int use);
+std::optional<std::string> fileProblem(const std::string& path, FileUse use);
 
 }  // namespace quorrel::tool
