@@ -22,8 +22,11 @@ new dims=1
 A appendString "k=v"
 A setKeyStringAt "a=b" 0
 A appendString ""
+A appendFile "three.bin"
+A setKeyValueAt 5 2
 A saveToFile "list.arr"
 QS
+printf 'xyz' >three.bin
 q run make.qs
 # Each lossy target names what it loses; native keeps everything.
 q convert t.arr t.csv
@@ -31,6 +34,7 @@ q convert t.arr t.ini
 q convert t.arr t.mmf --to host
 q convert t.arr copy.arr
 q convert list.arr list.ini
+q convert list.arr - --to json
 # The input is never overwritten by mistake.
 q convert t.csv t.csv
 q convert t.csv ./t.csv --to native --force
