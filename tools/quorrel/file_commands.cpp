@@ -428,6 +428,12 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
     warnLosses(contents, ArrayFormat::Csv, true, std::cerr);
   } else if (toName == "json") {
     bytes = toJson(*instance, contents);
+    const auto files = std::count_if(contents.types.begin(), contents.types.end(),
+                                     [](const ElementTypes& t) { return t.type == 3; });
+    if (files > 0) {
+      std::cerr << "quorrel: warning: " << plural(files, "file element")
+                << " written as a byte count only\n";
+    }
   } else {
     const ArrayFormat target =
         toName.empty() ? formatOfOutputPath(out == "-" ? "" : out) : *formatOfName(toName);
