@@ -1,4 +1,5 @@
 // quorrel: a host for the Quorrel extension module on the command line.
+#include <cstdint>
 #include <cstring>
 #include <iostream>
 #include <map>
@@ -20,48 +21,83 @@ Commands:
   run FILE            run a script (FILE - reads standard input)
   shell               type script commands interactively
   inspect FILE        show what a native array, host array, CSV or INI file holds
-  convert IN OUT      convert an array file to another of the four formats
+  convert IN OUT      convert an array file to another format
+  list [WHAT]         list actions and expressions, or describe one (a name, A12, E12)
   menu KIND           print the editor menu tree: actions, expressions or conditions
   strings KIND        print display strings and titles: actions or expressions
 
 Options:
-  --module PATH       the extension module to load (default: the one built beside
-                      quorrel)
+  --module PATH       the extension module to load (default: the one installed or
+                      built beside quorrel)
   -h, --help          show this help; 'quorrel COMMAND --help' for one command
+  --version           print the version
 )";
 
 const std::map<std::string, const char*> kCommandHelp = {
     {"run", R"(Usage: quorrel run FILE
+       quorrel run [--echo] [--warn-files] FILE
 
 Runs a script: one command per line; blank lines and lines starting with # are
 ignored. FILE - reads the script from standard input.
 
-  new [FIELD=VALUE]...   replace the instance; fields dims, x, y, case, wildcard,
-                         autoselect (integers) and delimiter (a quoted string)
-  A CODE [ARG [ARG]]     call action CODE (0..78); prints nothing
-  E CODE [ARG [ARG]]     call expression CODE (0..59) or a name such as rowList$(
-                         and print its result: -12 or "a,b,7"
+  new [FIELD=VALUE]...     replace the instance; fields dims, x, y, case, wildcard,
+                           autoselect (integers) and delimiter (a quoted string)
+  A NAME|CODE [ARG [ARG]]  call an action by name (appendString) or code (0..78);
+                           prints nothing
+  E NAME|CODE [ARG [ARG]]  call expression CODE (0..59) or a name such as rowList$(
+                           and print its result: -12 or "a,b,7"
 
-Arguments are integers or quoted strings with the escapes \\ \" \n \r \t \xHH.
-An error prints FILE:LINE: error: WHAT and exits with status 2.
+'quorrel list' shows every name with its parameters; 'quorrel list NAME' says
+what one does. Arguments are integers or quoted strings with the escapes
+\\ \" \n \r \t \xHH. An error prints FILE:LINE: error: WHAT and exits with status 2.
+
+  --echo          print each E line beside its result: 12: E size(  →  3
+  --warn-files    warn on standard error when a file action names a path it
+                  cannot open; output and exit status stay the same
 )"},
     {"shell", R"(Usage: quorrel shell
+       quorrel shell [--echo] [--no-warn-files]
 
-Reads script commands interactively, one per line, with line editing and history
-on a terminal. Errors are reported and the session goes on; end it with Ctrl-D.
+Reads script commands interactively, one per line, with line editing, history
+(~/.quorrel_history) and Tab completion of commands and names on a terminal.
+Errors are reported and the session goes on. Beside the script commands:
+help, help NAME|CODE, list, show (the current array), quit or exit. Ctrl-C
+clears the line, Ctrl-D ends. File warnings are on; --no-warn-files turns them off.
 )"},
     {"inspect", R"(Usage: quorrel inspect FILE
+       quorrel inspect [--rows N | --all] [--width N] FILE
 
 Recognises a native array file, a host array file, a CSV or an INI file, loads it
 into a fresh instance and prints its format, dimensions, boundaries, labels and
-elements. Exits with status 1 when FILE cannot be read.
+elements. FILE - reads standard input. Exits with status 1 when FILE cannot be
+read.
+
+  --rows N     show at most N table rows or list elements (default 20 and 40)
+  --all        show every row, column and element
+  --width N    cut cells at N characters (default 24; 0 never cuts)
 )"},
     {"convert", R"(Usage: quorrel convert IN OUT [--to native|host|csv|ini]
+       quorrel convert [--from KIND] [--to KIND] [--force] IN OUT
 
 Loads IN (its format recognised as by inspect) and saves it as OUT. Without --to
 the format follows OUT's extension: .csv, .ini, anything else native. The host
-array format needs --to host. Exits with status 1 when IN cannot be read or OUT
-cannot be written.
+array format needs --to host. IN - reads standard input, OUT - writes standard
+output. Exits with status 1 when IN cannot be read or OUT cannot be written.
+
+  --to csv-rfc4180   CSV whose cells are quoted when they hold a comma, a quote
+                     or a line break, so that they read back whole
+  --to json          dimensions, boundaries, labels, and each element's type,
+                     value or text and key
+  --from csv-rfc4180 read IN as such CSV (quotes, doubled quotes, line breaks)
+  --force            allow OUT to be IN itself
+
+A warning on standard error names each kind of content the target format loses.
+)"},
+    {"list", R"(Usage: quorrel list [actions|expressions|NAME|CODE]
+
+Without an operand, lists every action (A) and expression (E): code, name,
+parameters with their types, and menu path. With a name (setLabel, labSum(),
+A12 or E12, or a bare code for both kinds) describes it in the help page's words.
 )"},
     {"menu", R"(Usage: quorrel menu actions|expressions|conditions
 
@@ -76,31 +112,74 @@ Prints one line per code: CODE "display string or name" "title".
 
 struct Options {
   std::string module;
-  std::string to;
-  bool toGiven = false;
-  bool help = false;
-  std::vector<std::string> words;  // the command and its operands
-  std::string mistake;             // the first misuse found, reported once all is read
+  quorrel::tool::ConvertOptions convert;
+  quorrel::tool::ViewOptions view;
+  quorrel::tool::RunOptions run;
+  bool warnFilesGiven = false, noWarnFiles = false;
+  bool help = false, version = false;
+  std::vector<std::pair<std::string, std::string>> owned;  // option, the command it needs
+  std::vector<std::string> words;                          // the command and its operands
+  std::string mistake;  // the first misuse found, reported once all is read
 };
+
+int32_t countOf(const std::string& option, const std::string& value) {
+  if (!quorrel::tool::looksLikeInteger(value) || value[0] == '-' || value.size() > 9) {
+    throw UsageError(option + " needs a count, not '" + value + "'");
+  }
+  return std::stoi(value);
+}
 
 Options parseOptions(int argc, char** argv) {
   Options options;
   for (int i = 1; i < argc; ++i) {
     const std::string arg = argv[i];
-    auto value = [&](const char* name) -> std::string {
-      const std::string prefix = std::string(name) + "=";
-      if (arg.rfind(prefix, 0) == 0) return arg.substr(prefix.size());
+    const std::string name = arg.substr(0, arg.find('='));
+    auto value = [&]() -> std::string {
+      if (name.size() < arg.size()) return arg.substr(name.size() + 1);
       if (i + 1 < argc) return argv[++i];
-      if (options.mistake.empty()) options.mistake = std::string(name) + " needs a value";
+      if (options.mistake.empty()) options.mistake = name + " needs a value";
       return {};
     };
+    auto belongs = [&](const char* command) { options.owned.emplace_back(name, command); };
     if (arg == "--help" || arg == "-h") {
       options.help = true;
-    } else if (arg == "--module" || arg.rfind("--module=", 0) == 0) {
-      options.module = value("--module");
-    } else if (arg == "--to" || arg.rfind("--to=", 0) == 0) {
-      options.to = value("--to");
-      options.toGiven = true;
+    } else if (arg == "--version") {
+      options.version = true;
+    } else if (name == "--module") {
+      options.module = value();
+    } else if (name == "--to") {
+      options.convert.to = value();
+      belongs("convert");
+    } else if (name == "--from") {
+      options.convert.from = value();
+      belongs("convert");
+    } else if (arg == "--force") {
+      options.convert.force = true;
+      belongs("convert");
+    } else if (name == "--rows" || name == "--width") {
+      const std::string text = value();
+      if (options.mistake.empty() && !text.empty()) {
+        try {
+          const int32_t count = countOf(name, text);
+          if (name == "--rows") options.view.rows = count;
+          if (name == "--width") options.view.width = static_cast<size_t>(count);
+        } catch (const UsageError& error) {
+          options.mistake = error.what();
+        }
+      }
+      belongs("inspect");
+    } else if (arg == "--all") {
+      options.view.all = true;
+      belongs("inspect");
+    } else if (arg == "--echo") {
+      options.run.echo = true;
+      belongs("run");
+    } else if (arg == "--warn-files") {
+      options.warnFilesGiven = true;
+      belongs("run");
+    } else if (arg == "--no-warn-files") {
+      options.noWarnFiles = true;
+      belongs("shell");
     } else if (arg.size() > 1 && arg[0] == '-') {
       if (options.mistake.empty()) options.mistake = "unknown option " + arg;
     } else {
@@ -121,9 +200,16 @@ void expectKind(const std::string& kind, std::initializer_list<const char*> allo
   throw UsageError("unknown kind " + kind);
 }
 
-int dispatch(const Options& options) {
+int dispatch(Options options) {
   const std::string& command = options.words[0];
-  if (options.toGiven && command != "convert") throw UsageError("--to belongs to convert");
+  for (const auto& [option, owner] : options.owned) {
+    // --echo and --warn-files serve the shell as well as run.
+    const bool shared = owner == "run" && command == "shell";
+    const bool shellOnly = owner == "shell" && command == "shell";
+    if (owner != command && !shared && !shellOnly) {
+      throw UsageError(option + " belongs to " + (owner == "run" ? "run and shell" : owner));
+    }
+  }
   // Operands are checked before the module is loaded, so misuse is always status 2.
   if (command == "run") {
     expectOperands(options, 1, "a script file (or - for standard input)");
@@ -131,9 +217,18 @@ int dispatch(const Options& options) {
     expectOperands(options, 0, "no operands");
   } else if (command == "inspect") {
     expectOperands(options, 1, "a file");
+    if (options.view.all && options.view.rows)
+      throw UsageError("--rows and --all exclude each other");
   } else if (command == "convert") {
     expectOperands(options, 2, "an input and an output file");
-    if (options.toGiven) expectKind(options.to, {"native", "host", "csv", "ini"});
+    for (const auto& [option, owner] : options.owned) {
+      if (option == "--to") {
+        expectKind(options.convert.to, {"native", "host", "csv", "ini", "csv-rfc4180", "json"});
+      }
+      if (option == "--from") expectKind(options.convert.from, {"csv-rfc4180"});
+    }
+  } else if (command == "list") {
+    if (options.words.size() > 2) throw UsageError("list takes at most one name or code");
   } else if (command == "menu") {
     expectOperands(options, 1, "actions, expressions or conditions");
     expectKind(options.words[1], {"actions", "expressions", "conditions"});
@@ -147,13 +242,23 @@ int dispatch(const Options& options) {
   const quorrel::tool::ModuleLoader loader(
       options.module.empty() ? quorrel::tool::defaultModulePath() : options.module);
   const auto& words = options.words;
-  if (command == "run") return quorrel::tool::runCommand(loader, words[1]);
-  if (command == "shell") return quorrel::tool::shellCommand(loader);
-  const auto& module = loader.get();
-  if (command == "inspect") return quorrel::tool::inspectCommand(module, words[1]);
-  if (command == "convert") {
-    return quorrel::tool::convertCommand(module, words[1], words[2], options.to);
+  if (command == "run") {
+    options.run.warnFiles = options.warnFilesGiven;
+    return quorrel::tool::runCommand(loader, words[1], options.run);
   }
+  if (command == "shell") {
+    options.run.warnFiles = !options.noWarnFiles;
+    return quorrel::tool::shellCommand(loader, options.run);
+  }
+  const auto& module = loader.get();
+  if (command == "inspect") return quorrel::tool::inspectCommand(module, words[1], options.view);
+  if (command == "convert") {
+    options.convert.in = words[1];
+    options.convert.out = words[2];
+    return quorrel::tool::convertCommand(module, options.convert);
+  }
+  if (command == "list")
+    return quorrel::tool::listCommand(module, words.size() > 1 ? words[1] : "");
   if (command == "menu") return quorrel::tool::menuCommand(module, words[1]);
   return quorrel::tool::stringsCommand(module, words[1]);
 }
@@ -164,16 +269,20 @@ int main(int argc, char** argv) {
   quorrel::tool::useBinaryStandardStreams();
   std::string command;
   try {
-    const Options options = parseOptions(argc, argv);
+    Options options = parseOptions(argc, argv);
     if (!options.words.empty()) command = options.words[0];
     if (!options.mistake.empty()) throw UsageError(options.mistake);
+    if (options.version) {
+      std::cout << "quorrel " QUORREL_VERSION "\n";
+      return 0;
+    }
     if (options.help) {
       const auto help = kCommandHelp.find(command);
       std::cout << (help == kCommandHelp.end() ? kMainHelp : help->second);
       return 0;
     }
     if (options.words.empty()) throw UsageError("no command given");
-    return dispatch(options);
+    return dispatch(std::move(options));
   } catch (const UsageError& error) {
     std::cerr << "quorrel: " << error.what() << "\nTry 'quorrel "
               << (kCommandHelp.count(command) ? command + " " : "") << "--help'.\n";

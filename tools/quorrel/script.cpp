@@ -1,5 +1,6 @@
 #include "script.h"
 
+#include <cctype>
 #include <charconv>
 
 namespace quorrel::tool {
@@ -88,6 +89,20 @@ void applyNewField(SetupFields& setup, std::string_view token) {
   } else {
     throw ScriptError("unknown field " + quoteText(name) + " in new");
   }
+}
+
+// An action name: letters and digits with at least three letters, so that a
+// mistyped number such as x1 is still reported as a malformed integer.
+bool looksLikeName(std::string_view token) {
+  int letters = 0;
+  for (char c : token) {
+    if (std::isalpha(static_cast<unsigned char>(c))) {
+      ++letters;
+    } else if (!std::isdigit(static_cast<unsigned char>(c))) {
+      return false;
+    }
+  }
+  return letters >= 3;
 }
 
 }  // namespace
@@ -205,7 +220,7 @@ Command parseLine(std::string_view line) {
     throw ScriptError(isAction ? "A needs an action code" : "E needs an expression code or name");
   }
   const std::string& code = tokens[1];
-  if (looksLikeInteger(code) || isAction) {
+  if (looksLikeInteger(code) || (isAction && !looksLikeName(code))) {
     command.code = parseInteger(code);
     const int32_t count = isAction ? abi::kActionCount : abi::kExpressionCount;
     if (command.code < 0 || command.code >= count) {

@@ -45,7 +45,7 @@ struct Command {
   CommandKind kind = CommandKind::Empty;
   SetupFields setup;           // New
   int32_t code = -1;           // Action, Expression; -1 when named
-  std::string name;            // Expression given by name
+  std::string name;            // Action or Expression given by name
   std::vector<Argument> args;  // typed by their form, checked against the tables when run
 };
 

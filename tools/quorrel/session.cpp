@@ -1,5 +1,11 @@
 #include "session.h"
 
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+
 namespace quorrel::tool {
 namespace {
 
@@ -36,7 +42,38 @@ void Session::replaceInstance(const SetupFields& setup) {
   instance_ = std::make_unique<Instance>(module_.get(), setup);
 }
 
-void Session::execute(const Command& command, std::ostream& out) {
+std::optional<std::string> fileProblem(const std::string& path, FileUse use) {
+  namespace fs = std::filesystem;
+  std::error_code error;
+  const auto status = fs::status(path, error);
+  if (fs::is_directory(status)) return "it is a directory";
+  if (use == FileUse::Read) {
+    if (!fs::exists(status)) return std::string(std::strerror(ENOENT));
+    if (!std::ifstream(path, std::ios::binary)) return std::string(std::strerror(errno));
+    return std::nullopt;
+  }
+  // Writing: open without truncating, and remove what the test itself created.
+  const bool existed = fs::exists(status);
+  if (!std::ofstream(path, std::ios::binary | std::ios::app)) {
+    return std::string(std::strerror(errno));
+  }
+  if (!existed) fs::remove(path, error);
+  return std::nullopt;
+}
+
+void Session::warnAboutFile(int32_t code, const std::vector<Argument>& args, const Where& where) {
+  const ActionEntry& entry = actionEntry(code);
+  if (entry.file == FileUse::None || !warnings_) return;
+  const std::string& path = args[entry.pathParam].text;
+  const auto problem = fileProblem(path, entry.file);
+  if (!problem) return;
+  static constexpr const char* kVerbs[] = {"", "read", "write", "append to"};
+  *warnings_ << where.file << ':' << where.line << ": warning: " << entry.name << " cannot "
+             << kVerbs[static_cast<int>(entry.file)] << ' ' << quoteText(path) << ": " << *problem
+             << '\n';
+}
+
+void Session::execute(const Command& command, std::ostream& out, const Where& where) {
   switch (command.kind) {
     case CommandKind::Empty:
       return;
@@ -44,10 +81,20 @@ void Session::execute(const Command& command, std::ostream& out) {
       replaceInstance(command.setup);
       return;
     case CommandKind::Action: {
-      const std::string what = "action " + std::to_string(command.code);
-      checkArguments(module_.get().actionSignature(command.code), command.args, what,
+      int32_t code = command.code;
+      if (!command.name.empty()) {
+        const auto named = actionCodeOfName(command.name);
+        if (!named) {
+          throw ScriptError("unknown action " + quoteText(command.name) +
+                            " (quorrel list actions shows every name)");
+        }
+        code = *named;
+      }
+      const std::string what = "action " + std::to_string(code);
+      checkArguments(module_.get().actionSignature(code), command.args, what,
                      abi::kActionParamText);
-      instance().callAction(command.code, command.args);
+      if (options_.warnFiles) warnAboutFile(code, command.args, where);
+      instance().callAction(code, command.args);
       return;
     }
     case CommandKind::Expression: {
@@ -61,6 +108,12 @@ void Session::execute(const Command& command, std::ostream& out) {
       checkArguments(module_.get().expressionSignature(code), command.args, what,
                      abi::kExpressionParamText);
       const ExpressionResult result = instance().callExpression(code, command.args);
+      if (options_.echo) {
+        std::string_view text = where.text;
+        text.remove_prefix(std::min(text.size(), text.find_first_not_of(" \t")));
+        text = text.substr(0, text.find_last_not_of(" \t\r") + 1);
+        out << where.line << ": " << text << "  \xe2\x86\x92  ";
+      }
       out << (result.isText ? quoteText(result.text) : std::to_string(result.number)) << '\n';
       return;
     }
@@ -68,12 +121,12 @@ void Session::execute(const Command& command, std::ostream& out) {
 }
 
 int runScript(const ModuleLoader& module, std::istream& in, const std::string& name,
-              std::ostream& out, std::ostream& err) {
-  Session session(module);
+              std::ostream& out, std::ostream& err, const RunOptions& options) {
+  Session session(module, options, &err);
   std::string line;
   for (int lineNumber = 1; std::getline(in, line); ++lineNumber) {
     try {
-      session.execute(parseLine(line), out);
+      session.execute(parseLine(line), out, {name, lineNumber, line});
     } catch (const ScriptError& error) {
       out.flush();
       err << name << ':' << lineNumber << ": error: " << error.what() << '\n';

@@ -3,32 +3,57 @@
 
 #include <istream>
 #include <memory>
+#include <optional>
 #include <ostream>
 #include <string>
+#include <string_view>
 
+#include "catalog.h"
 #include "module.h"
 #include "script.h"
 
 namespace quorrel::tool {
 
+// What `run` and `shell` add to the script language's plain output.
+struct RunOptions {
+  bool echo = false;       // print each E line beside its result
+  bool warnFiles = false;  // warn about file paths an action cannot use; changes nothing else
+};
+
+// Where a command came from, for --echo and warnings.
+struct Where {
+  std::string_view file;
+  int line = 0;
+  std::string_view text;  // the line as written
+};
+
 class Session {
  public:
-  explicit Session(const ModuleLoader& module) : module_(module) {}
+  explicit Session(const ModuleLoader& module, RunOptions options = {},
+                   std::ostream* warnings = nullptr)
+      : module_(module), options_(options), warnings_(warnings) {}
 
   // Runs one parsed command; throws ScriptError for a call that does not fit the tables.
-  void execute(const Command& command, std::ostream& out);
+  void execute(const Command& command, std::ostream& out, const Where& where = {});
 
   // The current instance, created with the default setup when there is none.
   Instance& instance();
   void replaceInstance(const SetupFields& setup);
 
  private:
+  void warnAboutFile(int32_t code, const std::vector<Argument>& args, const Where& where);
+
   const ModuleLoader& module_;
+  RunOptions options_;
+  std::ostream* warnings_;
   std::unique_ptr<Instance> instance_;
 };
 
 // Runs a whole script; reports the first error as "NAME:LINE: error: WHAT" and returns 2.
 int runScript(const ModuleLoader& module, std::istream& in, const std::string& name,
-              std::ostream& out, std::ostream& err);
+              std::ostream& out, std::ostream& err, const RunOptions& options = {});
+
+// The reason an action that uses `path` as `use` says cannot open it, or nothing.
+std::optional<std::string> fileProblem(const std::string& path, FileUse use);
 
 }  // namespace quorrel::tool

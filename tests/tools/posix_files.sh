@@ -1,0 +1,31 @@
+#!/usr/bin/env bash
+# Devices and unreadable files, which only a POSIX system has: a clear message and
+# exit status 1, never a crash. Usage: posix_files.sh QUORREL WORKDIR
+set -u
+quorrel=$1 work=$2
+rm -rf "$work" && mkdir -p "$work" && cd "$work" || exit 1
+fail=0
+check() {  # expected-status expected-stderr command...
+  local status=$1 expected=$2
+  shift 2
+  local err
+  err=$("$quorrel" "$@" 2>&1 >/dev/null)
+  local got=$?
+  if [[ $got != "$status" || $err != "$expected" ]]; then
+    echo "quorrel $*: status $got, stderr '$err'; expected $status, '$expected'"
+    fail=1
+  fi
+}
+check 1 "quorrel: cannot read /dev/null: it is not a regular file" inspect /dev/null
+check 1 "quorrel: cannot read /dev/zero: it is not a regular file" convert /dev/zero o.arr
+echo 'A 8 "x"' >t.qs
+echo 'A 0 "/dev/null/x.arr"' >>t.qs
+check 0 't.qs:2: warning: saveToFile cannot write "/dev/null/x.arr": Not a directory' \
+  run --warn-files t.qs
+if [[ $(id -u) != 0 ]]; then
+  printf 'a,b\r\n' >locked.csv && chmod 000 locked.csv
+  check 1 "quorrel: cannot read locked.csv: Permission denied" inspect locked.csv
+else
+  echo "(as root every file is readable: the unreadable-file check is skipped)"
+fi
+exit $fail

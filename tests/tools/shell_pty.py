@@ -1,0 +1,116 @@
+#!/usr/bin/env python3
+"""The interactive shell through a pseudo-terminal: help, completion, Ctrl-C, history
+across two sessions, quitting. Usage: shell_pty.py QUORREL. Exit 77 (skipped) when
+the system has no pseudo-terminals or the shell was built without line editing."""
+import os
+import select
+import sys
+import tempfile
+import time
+
+try:
+    import pty
+except ImportError:
+    print("skipped: no pty module on this system")
+    sys.exit(77)
+
+QUORREL = sys.argv[1]
+failures = []
+
+
+def fail(message):
+    """A step that did not happen ends the test: the steps after it depend on it."""
+    print(message)
+    sys.exit(1)
+
+
+class Shell:
+    def __init__(self, home):
+        env = dict(os.environ, HOME=home, TERM="xterm")
+        try:
+            self.pid, self.fd = pty.fork()
+        except OSError as error:
+            print(f"skipped: no pseudo-terminal ({error})")
+            sys.exit(77)
+        if self.pid == 0:
+            os.execve(QUORREL, [QUORREL, "shell"], env)
+        self.seen = b""
+
+    def expect(self, text, what, timeout=5.0):
+        """Reads until `text` appears in the output since the last expect."""
+        deadline = time.time() + timeout
+        while text.encode() not in self.seen:
+            left = deadline - time.time()
+            if left <= 0 or not select.select([self.fd], [], [], left)[0]:
+                fail(f"{what}: never saw {text!r} in {self.seen!r}")
+            try:
+                chunk = os.read(self.fd, 4096)
+            except OSError:
+                chunk = b""
+            if not chunk:
+                fail(f"{what}: output ended before {text!r} in {self.seen!r}")
+            self.seen += chunk
+        self.seen = self.seen[self.seen.index(text.encode()) + len(text):]
+
+    def send(self, keys):
+        os.write(self.fd, keys.encode())
+
+    def finish(self, what):
+        """Waits for the shell to end and checks its exit status is 0."""
+        deadline = time.time() + 20  # a sanitizer build checks for leaks at exit
+        while time.time() < deadline:
+            pid, status = os.waitpid(self.pid, os.WNOHANG)
+            if pid:
+                if not os.WIFEXITED(status) or os.WEXITSTATUS(status) != 0:
+                    failures.append(f"{what}: shell ended with wait status {status}")
+                return
+            # Drain what the shell still prints, without blocking on a silent one.
+            if select.select([self.fd], [], [], 0.05)[0]:
+                try:
+                    os.read(self.fd, 4096)
+                except OSError:  # the terminal closed: the shell is ending
+                    time.sleep(0.05)
+        os.kill(self.pid, 9)
+        failures.append(f"{what}: shell did not end")
+
+
+with tempfile.TemporaryDirectory() as home:
+    shell = Shell(home)
+    shell.expect("quorrel> ", "first prompt")
+    shell.send("help\r")
+    shell.expect("Ctrl-C clears the line", "help")
+    shell.send("help appendString\r")
+    shell.expect("Adds a string element at the end of the array.", "help NAME")
+    # Tab completes an action name after A, and an expression name after E.
+    shell.send('A appendStr\t"x"\r')
+    shell.expect("quorrel> ", "completed action")
+    shell.send("E siz\t\r")
+    shell.expect("1\r\n", "completed expression")
+    # Ctrl-C abandons the half-typed line; the shell goes on.
+    shell.send("A appendString")
+    shell.expect("appendString", "echo before Ctrl-C")
+    shell.send("\x03")
+    shell.expect("quorrel> ", "prompt after Ctrl-C")
+    shell.send("E size(\r")
+    shell.expect("1\r\n", "line after Ctrl-C")
+    shell.send("show\r")
+    shell.expect("elements    1", "show")
+    shell.send("quit\r")
+    shell.finish("quit")
+    if not os.path.exists(os.path.join(home, ".quorrel_history")):
+        failures.append("no history file in HOME")
+
+    # The second session recalls the first one's lines: Up three times passes quit
+    # and show.
+    shell = Shell(home)
+    shell.expect("quorrel> ", "second prompt")
+    shell.send("\x1b[A\x1b[A\x1b[A\r")
+    shell.expect("E size(", "recalled line")
+    shell.expect("0\r\n", "recalled line's result in a fresh instance")
+    shell.send("\x04")
+    shell.finish("Ctrl-D")
+
+if failures:
+    print("\n".join(failures))
+    sys.exit(1)
+print("shell: help, completion, Ctrl-C, show, history and quitting work")

@@ -1,0 +1,34 @@
+# Bash completion for quorrel: subcommands, their options and kinds, file operands.
+_quorrel() {
+  local cur prev command word
+  cur=${COMP_WORDS[COMP_CWORD]}
+  prev=${COMP_WORDS[COMP_CWORD - 1]}
+  for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
+    case $word in
+      run | shell | inspect | convert | list | menu | strings) command=$word; break ;;
+    esac
+  done
+  case $prev in
+    --module) COMPREPLY=($(compgen -f -- "$cur")); return ;;
+    --to) COMPREPLY=($(compgen -W "native host csv ini csv-rfc4180 json" -- "$cur")); return ;;
+    --from) COMPREPLY=($(compgen -W "csv-rfc4180" -- "$cur")); return ;;
+    --rows | --width) return ;;
+  esac
+  local options
+  case $command in
+    "") COMPREPLY=($(compgen -W "run shell inspect convert list menu strings --module --help --version" -- "$cur")); return ;;
+    run) options="--echo --warn-files --help" ;;
+    shell) options="--echo --no-warn-files --help" ;;
+    inspect) options="--rows --all --width --help" ;;
+    convert) options="--from --to --force --help" ;;
+    list) COMPREPLY=($(compgen -W "actions expressions --help" -- "$cur")); return ;;
+    menu) COMPREPLY=($(compgen -W "actions expressions conditions" -- "$cur")); return ;;
+    strings) COMPREPLY=($(compgen -W "actions expressions" -- "$cur")); return ;;
+  esac
+  if [[ $cur == -* ]]; then
+    COMPREPLY=($(compgen -W "$options" -- "$cur"))
+  else
+    COMPREPLY=($(compgen -f -- "$cur"))
+  fi
+}
+complete -o filenames -F _quorrel quorrel
