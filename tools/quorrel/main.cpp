@@ -60,7 +60,8 @@ what one does. Arguments are integers or quoted strings with the escapes
 
 Reads script commands interactively, one per line, with line editing, history
 (~/.quorrel_history) and Tab completion of commands and names on a terminal.
-Errors are reported and the session goes on. Beside the script commands:
+Errors are reported and the session goes on; when the input is not a terminal, the
+exit status is then 2. Beside the script commands:
 help, help NAME|CODE, list, show (the current array), quit or exit. Ctrl-C
 clears the line, Ctrl-D ends. File warnings are on; --no-warn-files turns them off.
 )"},
@@ -190,7 +191,10 @@ Options parseOptions(int argc, char** argv) {
 }
 
 void expectOperands(const Options& options, size_t count, const char* what) {
-  if (options.words.size() - 1 != count) throw UsageError(options.words[0] + " needs " + what);
+  const std::string needs = options.words[0] + " needs " + what;
+  if (options.words.size() - 1 < count) throw UsageError(needs);
+  if (options.words.size() - 1 > count)
+    throw UsageError("unexpected operand " + options.words[count + 1] + ": " + needs);
 }
 
 void expectKind(const std::string& kind, std::initializer_list<const char*> allowed) {

@@ -193,6 +193,7 @@ int shellCommand(const ModuleLoader& module, const RunOptions& options) {
 #endif
     std::cout << "Quorrel shell. Type help for the commands; quit or Ctrl-D ends.\n";
   }
+  bool hadError = false;
   for (int lineNumber = 1;; ++lineNumber) {
     const auto line = reader.next();
     if (!line) break;
@@ -216,11 +217,13 @@ int shellCommand(const ModuleLoader& module, const RunOptions& options) {
     } catch (const ScriptError& error) {
       std::cout.flush();
       std::cerr << "<shell>:" << lineNumber << ": error: " << error.what() << '\n';
+      hadError = true;
     }
     std::cout.flush();
   }
   if (reader.interactive()) std::cout << '\n';
-  return 0;
+  // Typed mistakes were answered on the spot; piped ones must reach the caller.
+  return hadError && !reader.interactive() ? 2 : 0;
 }
 
 }  // namespace quorrel::tool

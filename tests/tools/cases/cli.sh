@@ -23,6 +23,6 @@ for c in "" run shell inspect convert menu strings; do
   "$QUORREL" $c --help | head -n 1
   echo "status ${PIPESTATUS[0]}"
 done
-# The shell goes on after an error and ends at the end of its input.
+# The shell goes on after an error, ends at the end of its input and then exits 2.
 printf 'E 0\nbad line\nA 9 5\nE 0\nE 2 0\n' | "$QUORREL" shell
 echo "status $?"
