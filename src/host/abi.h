@@ -17,8 +17,10 @@
 // both widths. All integers are little-endian.
 #pragma once
 
+#include <bit>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 
 #if defined(_WIN32) && !defined(_WIN64)
 #define QUORREL_CALL __stdcall
@@ -27,6 +29,23 @@
 #endif
 
 namespace quorrel::abi {
+
+static_assert(std::endian::native == std::endian::little,
+              "the host's records are little-endian and read in place");
+
+// A field of a host record at its byte offset. The records are byte arrays whose fields
+// need not be aligned, so they are copied, never cast.
+template <typename T>
+T readField(const void* record, std::size_t offset) {
+  T value;
+  std::memcpy(&value, static_cast<const char*>(record) + offset, sizeof value);
+  return value;
+}
+
+template <typename T>
+void writeField(void* record, std::size_t offset, T value) {
+  std::memcpy(static_cast<char*>(record) + offset, &value, sizeof value);
+}
 
 inline constexpr std::size_t kPointerSize = sizeof(void*);
 inline constexpr bool kWide = kPointerSize == 8;

@@ -2,7 +2,6 @@
 // run-time header with the host services, and the setup record.
 #pragma once
 
-#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
@@ -15,20 +14,8 @@ class ElementArray;
 
 namespace quorrel::host {
 
-static_assert(std::endian::native == std::endian::little,
-              "the host's records are little-endian and read in place");
-
-template <typename T>
-T readField(const void* record, std::size_t offset) {
-  T value;
-  std::memcpy(&value, static_cast<const char*>(record) + offset, sizeof value);
-  return value;
-}
-
-template <typename T>
-void writeField(void* record, std::size_t offset, T value) {
-  std::memcpy(static_cast<char*>(record) + offset, &value, sizeof value);
-}
+using abi::readField;
+using abi::writeField;
 
 // --- Run record ----------------------------------------------------------------------
 inline ElementArray* elementArrayOf(const void* runRecord) {

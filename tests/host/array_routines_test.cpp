@@ -47,7 +47,7 @@ TEST(SetupRecordTest, DelimiterModesAndBetweenColumn) {
   EXPECT_EQ(find(SetupRecord(), "a*"), -1);
 
   Instance between(SetupRecord(), false);
-  writeAt<int32_t>(between.record(), kRunBetweenColumn, 77);
+  writeField<int32_t>(between.record(), kRunBetweenColumn, 77);
   between.create();
   EXPECT_EQ(between.betweenColumn(), 0);
   EXPECT_NE(between.elementArray(), nullptr);

@@ -59,8 +59,8 @@ TEST(ModuleTest, ObjectInformationAndRect) {
   // Width and height are signed: 0xFFFF is -1.
   auto getObjectRect = entry<GetObjectRectFn>("GetObjectRect");
   SetupRecord setup;
-  writeAt<uint16_t>(setup.data(), kSetupObjectWidth, 0xFFFF);
-  writeAt<uint16_t>(setup.data(), kSetupObjectHeight, 40);
+  writeField<uint16_t>(setup.data(), kSetupObjectWidth, 0xFFFF);
+  writeField<uint16_t>(setup.data(), kSetupObjectHeight, 40);
   int32_t rect[4] = {100, 200, 7, 8};
   getObjectRect(0, rect, 0, setup.data());
   EXPECT_EQ(std::vector<int32_t>(rect, rect + 4), (std::vector<int32_t>{100, 200, 99, 240}));
@@ -75,21 +75,21 @@ TEST(ModuleTest, RunInfoFieldsAndUntouchedBytes) {
   std::vector<unsigned char> info(64, 0xAB);
   EXPECT_EQ(entry<GetRunObjectInfosFn>("GetRunObjectInfos")(0, info.data()), 1);
   const unsigned char* p = info.data();
-  EXPECT_EQ(readAt<uint16_t>(p, kInfoConditionCount), 0);
-  EXPECT_EQ(readAt<uint16_t>(p, kInfoActionCount), 79);
-  EXPECT_EQ(readAt<uint16_t>(p, kInfoExpressionCount), 60);
-  EXPECT_EQ(readAt<uint16_t>(p, kInfoSetupSize), 1076);
-  EXPECT_EQ(readAt<uint32_t>(p, kInfoHostWord1), 0u);
+  EXPECT_EQ(readField<uint16_t>(p, kInfoConditionCount), 0);
+  EXPECT_EQ(readField<uint16_t>(p, kInfoActionCount), 79);
+  EXPECT_EQ(readField<uint16_t>(p, kInfoExpressionCount), 60);
+  EXPECT_EQ(readField<uint16_t>(p, kInfoSetupSize), 1076);
+  EXPECT_EQ(readField<uint32_t>(p, kInfoHostWord1), 0u);
   EXPECT_EQ(p[kInfoHostByte], 10);
   EXPECT_EQ(p[kInfoHostByte + 1], 0xAB);  // the byte between is the host's
-  EXPECT_EQ(readAt<uint16_t>(p, kInfoHostWord2), 0);
+  EXPECT_EQ(readField<uint16_t>(p, kInfoHostWord2), 0);
   EXPECT_EQ(std::string(reinterpret_cast<const char*>(p + kInfoIdentifier), 4), "RQUZ");
-  EXPECT_EQ(readAt<uint16_t>(p, kInfoHostWord3), 0);
+  EXPECT_EQ(readField<uint16_t>(p, kInfoHostWord3), 0);
   for (std::size_t i = kRunInfoWrittenSize; i < info.size(); ++i) EXPECT_EQ(p[i], 0xAB) << i;
 
-  auto conditions = readAt<const ConditionRoutine*>(p, kInfoConditionRoutines);
-  auto actions = readAt<const ActionRoutine*>(p, kInfoActionRoutines);
-  auto expressions = readAt<const ExpressionRoutine*>(p, kInfoExpressionRoutines);
+  auto conditions = readField<const ConditionRoutine*>(p, kInfoConditionRoutines);
+  auto actions = readField<const ActionRoutine*>(p, kInfoActionRoutines);
+  auto expressions = readField<const ExpressionRoutine*>(p, kInfoExpressionRoutines);
   ASSERT_NE(conditions, nullptr);
   EXPECT_EQ(conditions[0], nullptr);
   EXPECT_EQ(actions[79], nullptr);

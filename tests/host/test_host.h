@@ -17,17 +17,6 @@ namespace testhost {
 
 using namespace quorrel::abi;
 
-template <typename T>
-T readAt(const void* base, std::size_t offset) {
-  T value;
-  std::memcpy(&value, static_cast<const char*>(base) + offset, sizeof value);
-  return value;
-}
-template <typename T>
-void writeAt(void* base, std::size_t offset, T value) {
-  std::memcpy(static_cast<char*>(base) + offset, &value, sizeof value);
-}
-
 // The module, loaded once for the whole test program, and its entry points by name.
 struct Module {
   void* handle = dlopen(QUORREL_MODULE_PATH, RTLD_NOW | RTLD_LOCAL);
@@ -57,10 +46,10 @@ inline const unsigned char* runInfo() {
   return Module::get().runInfo.data();
 }
 inline const ActionRoutine* actionRoutines() {
-  return readAt<const ActionRoutine*>(runInfo(), kInfoActionRoutines);
+  return readField<const ActionRoutine*>(runInfo(), kInfoActionRoutines);
 }
 inline const ExpressionRoutine* expressionRoutines() {
-  return readAt<const ExpressionRoutine*>(runInfo(), kInfoExpressionRoutines);
+  return readField<const ExpressionRoutine*>(runInfo(), kInfoExpressionRoutines);
 }
 
 #define ASSERT_MODULE_LOADED() ASSERT_NE(Module::get().handle, nullptr) << Module::get().error
@@ -69,13 +58,13 @@ inline const ExpressionRoutine* expressionRoutines() {
 struct SetupRecord {
   std::vector<unsigned char> bytes = std::vector<unsigned char>(kSetupRecordSize, 0);
   SetupRecord() {
-    writeAt<int16_t>(bytes.data(), kSetupObjectWidth, 32);
-    writeAt<int16_t>(bytes.data(), kSetupObjectHeight, 32);
+    writeField<int16_t>(bytes.data(), kSetupObjectWidth, 32);
+    writeField<int16_t>(bytes.data(), kSetupObjectHeight, 32);
     set(kSetupDimensionCount, 2).set(kSetupXBoundary, 10).set(kSetupYBoundary, 10);
     delimiter(",");
   }
   SetupRecord& set(std::size_t offset, int32_t value) {
-    writeAt(bytes.data(), offset, value);
+    writeField(bytes.data(), offset, value);
     return *this;
   }
   SetupRecord& delimiter(const char* text) {
@@ -118,11 +107,11 @@ class Instance {
     const auto dataSize = entry<GetRunObjectDataSizeFn>("GetRunObjectDataSize")(0, 0);
     record_.assign(static_cast<std::size_t>(dataSize), 0);
     header_.assign(kRunHeaderMinSize, 0);
-    writeAt<Instance*>(record_.data(), 0, this);  // host-owned bytes: find the instance back
-    writeAt<void*>(record_.data(), kRunHeader, header_.data());
-    writeAt<FetchParameterService>(header_.data(), kFetchFirstParameter, &fetchFirst);
-    writeAt<FetchParameterService>(header_.data(), kFetchNextParameter, &fetchNext);
-    writeAt<AllocateResultStringService>(header_.data(), kAllocateResultString, &allocate);
+    writeField<Instance*>(record_.data(), 0, this);  // host-owned bytes: find the instance back
+    writeField<void*>(record_.data(), kRunHeader, header_.data());
+    writeField<FetchParameterService>(header_.data(), kFetchFirstParameter, &fetchFirst);
+    writeField<FetchParameterService>(header_.data(), kFetchNextParameter, &fetchNext);
+    writeField<AllocateResultStringService>(header_.data(), kAllocateResultString, &allocate);
     if (createNow) create();
   }
   void create() {
@@ -136,10 +125,10 @@ class Instance {
   Instance& operator=(const Instance&) = delete;
 
   void* record() { return record_.data(); }
-  uint16_t flags() const { return readAt<uint16_t>(record_.data(), kRunHostFlags); }
-  void setFlags(uint16_t value) { writeAt(record_.data(), kRunHostFlags, value); }
-  void* elementArray() const { return readAt<void*>(record_.data(), kRunElementArray); }
-  int32_t betweenColumn() const { return readAt<int32_t>(record_.data(), kRunBetweenColumn); }
+  uint16_t flags() const { return readField<uint16_t>(record_.data(), kRunHostFlags); }
+  void setFlags(uint16_t value) { writeField(record_.data(), kRunHostFlags, value); }
+  void* elementArray() const { return readField<void*>(record_.data(), kRunElementArray); }
+  int32_t betweenColumn() const { return readField<int32_t>(record_.data(), kRunBetweenColumn); }
 
   int16_t action(int code, const Arg& p1 = Arg(), const Arg& p2 = Arg()) {
     return actionRoutines()[code](record_.data(), p1.word(), p2.word());
@@ -182,7 +171,7 @@ class Instance {
   std::vector<int32_t> allocations;
 
  private:
-  static Instance* owner(void* record) { return readAt<Instance*>(record, 0); }
+  static Instance* owner(void* record) { return readField<Instance*>(record, 0); }
   static HostWord QUORREL_CALL fetchFirst(void* record, int32_t flag, HostWord token) {
     owner(record)->next_ = 0;
     return owner(record)->fetch(true, flag, token);

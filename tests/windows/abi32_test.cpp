@@ -16,17 +16,8 @@ static_assert(sizeof(void*) == 4, "this test runs in the 32-bit build");
 
 using quorrel::abi::HostWord;
 
-template <typename T>
-T at(const std::vector<uint8_t>& bytes, std::size_t offset) {
-  T value;
-  std::memcpy(&value, bytes.data() + offset, sizeof value);
-  return value;
-}
-
-template <typename T>
-void put(std::vector<uint8_t>& bytes, std::size_t offset, T value) {
-  std::memcpy(bytes.data() + offset, &value, sizeof value);
-}
+using quorrel::abi::readField;
+using quorrel::abi::writeField;
 
 // The host side of one expression call: its parameters, the services' record of what
 // was fetched, and result buffers.
@@ -57,10 +48,10 @@ class Abi32 : public ::testing::Test {
   void SetUp() override {
     host = &fake;
     // The run-time header: the services at bytes 876, 880 and 916.
-    put(runHeader, 876, &fetchFirst);
-    put(runHeader, 880, &fetchNext);
-    put(runHeader, 916, &allocateResult);
-    put(runRecord, 8, runHeader.data());
+    writeField(runHeader.data(), 876, &fetchFirst);
+    writeField(runHeader.data(), 880, &fetchNext);
+    writeField(runHeader.data(), 916, &allocateResult);
+    writeField(runRecord.data(), 8, runHeader.data());
     GetRunObjectInfos(0, runInfo.data());
     std::memcpy(&actions, runInfo.data() + 4, 4);
     std::memcpy(&expressions, runInfo.data() + 8, 4);
@@ -83,7 +74,7 @@ class Abi32 : public ::testing::Test {
 
 TEST_F(Abi32, RunInfoBytes) {
   EXPECT_EQ(GetRunObjectDataSize(0, 0), 192);
-  const void* conditions = at<const void*>(runInfo, 0);
+  const void* conditions = readField<const void*>(runInfo.data(), 0);
   ASSERT_NE(conditions, nullptr);
   EXPECT_EQ(*static_cast<const void* const*>(conditions), nullptr);
   for (int code = 0; code < 79; ++code) EXPECT_NE(actions[code], nullptr) << code;
@@ -122,8 +113,8 @@ TEST_F(Abi32, InstanceLivesInTheLastEightBytes) {
   const std::vector<uint8_t> hostPart(runRecord.begin(), runRecord.begin() + 184);
 
   ASSERT_EQ(CreateRunObject(runRecord.data(), setup.data(), 0), 0);
-  EXPECT_NE(at<void*>(runRecord, 184), nullptr);
-  EXPECT_EQ(at<int32_t>(runRecord, 188), 0);
+  EXPECT_NE(readField<void*>(runRecord.data(), 184), nullptr);
+  EXPECT_EQ(readField<int32_t>(runRecord.data(), 188), 0);
   EXPECT_EQ(std::vector<uint8_t>(runRecord.begin(), runRecord.begin() + 184), hostPart)
       << "the host's 184 bytes are not the extension's to write";
 
@@ -146,7 +137,7 @@ TEST_F(Abi32, InstanceLivesInTheLastEightBytes) {
   EXPECT_EQ(fake.buffers[0].size(), 4u);
   EXPECT_EQ(reinterpret_cast<const char*>(text), fake.buffers[0].data());
   EXPECT_EQ(std::string(fake.buffers[0].data()), "abc");
-  EXPECT_EQ(at<uint16_t>(runRecord, 124), 0x8001);
+  EXPECT_EQ(readField<uint16_t>(runRecord.data(), 124), 0x8001);
 
   EXPECT_EQ(DestroyRunObject(runRecord.data(), 0), 0);
 }

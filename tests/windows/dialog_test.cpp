@@ -39,9 +39,7 @@ using Record = std::array<unsigned char, abi::kSetupRecordSize>;
 using Ints = std::vector<int32_t>;
 
 int32_t readInt(const Record& record, std::size_t offset) {
-  int32_t value;
-  std::memcpy(&value, record.data() + offset, sizeof value);
-  return value;
+  return abi::readField<int32_t>(record.data(), offset);
 }
 std::string delimiterOf(const Record& record) {
   return reinterpret_cast<const char*>(record.data() + abi::kSetupListDelimiter);
@@ -60,7 +58,7 @@ Record storedRecord(const Ints& fields, const char* delimiter = ";") {
   record.fill(0xEE);
   std::memset(record.data(), 0xAB, abi::kSetupHostHeaderSize);
   for (std::size_t i = 0; i < fields.size(); ++i) {
-    std::memcpy(record.data() + kFields[i], &fields[i], sizeof(int32_t));
+    abi::writeField(record.data(), kFields[i], fields[i]);
   }
   std::strcpy(reinterpret_cast<char*>(record.data() + abi::kSetupListDelimiter), delimiter);
   return record;

@@ -17,17 +17,8 @@
 namespace quorrel::tool {
 namespace {
 
-template <typename T>
-T readField(const void* record, size_t offset) {
-  T value;
-  std::memcpy(&value, static_cast<const char*>(record) + offset, sizeof value);
-  return value;
-}
-
-template <typename T>
-void writeField(void* record, size_t offset, T value) {
-  std::memcpy(static_cast<char*>(record) + offset, &value, sizeof value);
-}
+using abi::readField;
+using abi::writeField;
 
 template <typename Fn>
 Fn required(const Module& module, const char* name) {
