@@ -118,19 +118,6 @@ TEST(TableRows, OneDimensionalArrayHasNoTable) {
   EXPECT_EQ(columnOfLabel(a, "x"), -1);
 }
 
-TEST(TableRows, SwapRowsMovesCellsWithKeysAndLeavesStates) {
-  ElementArray a = makeTable(2, {"a,1", "b,2", "c,3"});
-  a.setKeyString("ka", 0);
-  a.setKeyValue(22, 3);
-  a.rowStates = {S, S, U};
-  swapRows(a, 0, 1);
-  swapRows(a, 0, 2);  // row 2 is not below numberOfRows
-  EXPECT_EQ(contents(a), "b|2|a|1|c|3");
-  EXPECT_EQ(std::string(a.getKeyString(2)), "ka");
-  EXPECT_EQ(a.getKeyValue(1), 22);
-  EXPECT_EQ(a.rowStates, (States{S, S, U}));
-}
-
 TEST(TableLabels, SetGetListAndFind) {
   ElementArray a = makeTable(2);
   EXPECT_EQ(labelList(a), std::nullopt);
