@@ -5,7 +5,6 @@
 #include <functional>
 #include <random>
 
-#include "recordset/aggregates.h"
 #include "table_test_support.h"
 
 namespace quorrel {
@@ -185,39 +184,6 @@ TEST(RowSortDepth, MillionReversedRowsOnAOneMegabyteStack) {
   pthread_join(thread, nullptr);
   pthread_attr_destroy(&attributes);
   EXPECT_TRUE(sorted);
-}
-
-// --- Aggregates ----------------------------------------------------------------------------
-
-struct Aggregates {
-  int32_t max, min, sum, average;
-  bool operator==(const Aggregates&) const = default;
-};
-
-Aggregates aggregates(const ElementArray& a, int32_t column) {
-  return {columnMax(a, column), columnMin(a, column), columnSum(a, column),
-          columnAverage(a, column)};
-}
-
-// The random tables check the aggregates against the model; these pin wraps and neighbours.
-TEST(ColumnAggregates, SumsWrapAndColumnsOutsideTheTableReadNeighbours) {
-  ElementArray w = makeTable(1);
-  for (int32_t v : {INT32_MAX, 2, 1000, -7}) w.appendValue(v);
-  w.rowStates = {S, S, U, S};
-  // 2147483647 + 2 wraps to -2147483647; minus 7 gives -2147483654 mod 2^32 = 2147483642.
-  EXPECT_EQ(aggregates(w, 0), (Aggregates{INT32_MAX, -7, 2147483642, 715827880}));
-  w.rowStates = {S, S, U, U};
-  EXPECT_EQ(columnSum(w, 0), -2147483647);
-  EXPECT_EQ(columnAverage(w, 0), -1073741823);
-  w.rowStates = {U, U, U, U};
-  EXPECT_EQ(aggregates(w, 0), (Aggregates{0, 0, 0, 0}));
-
-  ElementArray a = makeTable(2);  // rows (1, 2), (3, 4), (5, 6)
-  for (int v : {1, 2, 3, 4, 5, 6}) a.appendValue(v);
-  // Column -1: row 0 has no previous cell (0), then 2 and 4.
-  EXPECT_EQ(aggregates(a, -1), (Aggregates{4, 0, 6, 2}));
-  // Column 2: 3, 5, then past the end (0).
-  EXPECT_EQ(aggregates(a, 2), (Aggregates{5, 0, 8, 2}));
 }
 
 }  // namespace
