@@ -79,23 +79,26 @@ TEST(CompareElements, AbsentElementsKindsAndBytes) {
   array.appendFile({low, 2});
   array.appendFile({high, 2});
   array.appendString("a");
-  const Element* e = array.slots().data();
-  EXPECT_EQ(compareElements(array, nullptr, nullptr, SortByText), 0);
-  EXPECT_EQ(compareElements(array, nullptr, &e[0], SortByText), -1);
-  EXPECT_EQ(compareElements(array, &e[0], nullptr, SortByValue), 1);
-  EXPECT_EQ(compareElements(array, &e[0], &e[0], SortByValue), 0);
-  EXPECT_LT(compareElements(array, &e[0], &e[1], SortByText), 0);
-  EXPECT_EQ(compareElements(array, &e[0], &e[1], SortByValue), 1);
-  // Files read as the empty text and 0.
-  EXPECT_EQ(compareElements(array, &e[2], &e[3], SortByText), 0);
-  EXPECT_EQ(compareElements(array, &e[2], &e[3], SortByValue), 0);
-  // Other kinds: byte count first («a» is 2 bytes with its terminator; a Value 4).
+  // Files read as the empty text and 0. Other kinds: byte count first («a» is 2 bytes
+  // with its terminator, a Value 4), then unsigned bytes. -1 stands for no element.
   const auto bytes = static_cast<SortKind>(0);
-  EXPECT_EQ(compareElements(array, &e[2], &e[3], bytes), -1);
-  EXPECT_EQ(compareElements(array, &e[3], &e[2], bytes), 1);
-  EXPECT_EQ(compareElements(array, &e[4], &e[0], bytes), -1);
-  EXPECT_EQ(compareElements(array, &e[4], &e[2], bytes), -1);  // «a»,0 against «a»,1
-  EXPECT_EQ(compareElements(array, &e[4], &e[3], bytes), -1);  // 0x00 before 0x80
+  const struct {
+    int a, b;
+    SortKind kind;
+    int order;
+  } cases[] = {{-1, -1, SortByText, 0}, {-1, 0, SortByText, -1}, {0, -1, SortByValue, 1},
+               {0, 0, SortByValue, 0},  {0, 1, SortByText, -1},  {0, 1, SortByValue, 1},
+               {2, 3, SortByText, 0},   {2, 3, SortByValue, 0},  {2, 3, bytes, -1},
+               {3, 2, bytes, 1},        {4, 0, bytes, -1},       {4, 2, bytes, -1},
+               {4, 3, bytes, -1}};
+  const Element* e = array.slots().data();
+  for (const auto& c : cases) {
+    const int32_t result =
+        compareElements(array, c.a < 0 ? nullptr : &e[c.a], c.b < 0 ? nullptr : &e[c.b], c.kind);
+    // Folded texts may answer any negative or positive number; the rest exactly -1, 0, 1.
+    EXPECT_EQ(c.kind == SortByText ? sign(result) : result, c.order)
+        << c.a << " " << c.b << " kind " << c.kind;
+  }
 }
 
 // The sort written out step by step: slots modelled as element ids, the pivot held
