@@ -204,10 +204,16 @@ TEST(Store, EditsEverywhereAgreeWithAPlainVector) {
 TEST(Store, AppendsMatchSingleInsertsAtTheEnd) {
   for (int32_t dims : {1, 2}) {
     ElementArray appended, inserted;
-    for (ElementArray* a : {&appended, &inserted}) a->setDimensions(dims), a->setBoundary(1, 3);
+    for (ElementArray* a : {&appended, &inserted}) {
+      a->setDimensions(dims);
+      a->setBoundary(1, 3);  // refused in one dimension
+    }
     for (int step = 0; step < 400; ++step) {
       if (step % 97 == 96) {
-        while (appended.size() > 3) appended.deleteAt(0), inserted.deleteAt(0);
+        // Delete most of the array so that the capacity shrinks on the next appends.
+        for (ElementArray* a : {&appended, &inserted}) {
+          while (a->size() > 3) a->deleteAt(0);
+        }
       }
       const std::string text = step % 5 == 0 ? std::string() : "t" + std::to_string(step);
       if (step % 3 == 0) {
