@@ -74,6 +74,10 @@ void RecordSlab::releaseBlock() noexcept {
 }
 
 Element::Record* Element::makeRecord(const ElementValue& value, bool keySlot, RecordSlab* slab) {
+  // A record's distance from its slab block, in 8-byte units, lives in the flag bits above
+  // kSlabShift; every offset inside a block must fit there.
+  static_assert((RecordSlab::kBlockBytes / 8 - 1) <= (uint16_t{0xFFFF} >> kSlabShift),
+                "slab offsets fit the flag bits");
   std::size_t payload = 0;
   if (value.type == ElementType::Value) {
     payload = sizeof(int32_t);

@@ -178,9 +178,12 @@ class Element {
       std::memcpy(&n, payload(), sizeof n);
       return n;
     }
-    Element* key() { return reinterpret_cast<Element*>(reinterpret_cast<char*>(this) - 8); }
+    Element* key() {
+      return reinterpret_cast<Element*>(reinterpret_cast<char*>(this) - sizeof(Element));
+    }
     const Element* key() const {
-      return reinterpret_cast<const Element*>(reinterpret_cast<const char*>(this) - 8);
+      return reinterpret_cast<const Element*>(reinterpret_cast<const char*>(this) -
+                                              sizeof(Element));
     }
   };
 

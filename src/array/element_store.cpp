@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <new>
+#include <type_traits>
 
 namespace quorrel {
 
@@ -15,7 +16,14 @@ void moveElements(Element* to, const Element* from, std::size_t count) {
   std::memmove(static_cast<void*>(to), static_cast<const void*>(from), count * sizeof(Element));
 }
 
+// moveElements and realloc relocate elements as raw bytes, skipping their move
+// constructors and destructors. That is sound only while an element is one plain word
+// that nothing points back to: standard layout, the size of its word, and no virtual
+// table. A member that breaks this must fail here, not corrupt arrays.
 static_assert(sizeof(Element) == sizeof(uint64_t), "an element is one word");
+static_assert(std::is_standard_layout_v<Element> && !std::is_polymorphic_v<Element> &&
+                  std::is_nothrow_move_constructible_v<Element>,
+              "elements are relocated with memmove/realloc");
 
 // Destroys the elements, passing over runs of empty words eight at a time: files of
 // byteless cells leave millions of them.

@@ -8,14 +8,13 @@
 #include <cstdint>
 
 #include "array/element_array.h"
+#include "query/sort.h"
 
 namespace quorrel {
 
-// Only the two kinds the host uses; any other kind compares as text.
-enum SortKind : int32_t { SortByValue = 1, SortByText = 2 };
-
 // Sorts the first numberOfRows table rows (all of them when every row is visible) when
 // the array has two dimensions and 0 ≤ column < the column count.
+// Any kind other than SortByValue compares as text.
 void sortRows(ElementArray& array, int32_t column, int32_t kind, bool descending);
 
 // Sorts table rows first..last (both included) by the column. The range is clipped to

@@ -2,94 +2,57 @@
 
 #include <random>
 #include <string>
+#include <vector>
 
-#include "contents.h"
+#include "support/array_text.h"
 
 namespace quorrel {
 namespace {
 
+using States = std::vector<uint8_t>;
+constexpr uint8_t S = RowSelected;
+constexpr uint8_t U = RowUnselected;
+
 // An array of `dims` dimensions with boundary entries 0 and 1 set (where positive)
 // holding one single-character text per character of `chars`.
-ElementArray shaped(int32_t dims, int32_t entry0, int32_t columns, const char* chars) {
+ElementArray shaped(int32_t dims, int32_t entry0, int32_t columns, const char* chars = "") {
   ElementArray a;
   a.setDimensions(dims);
   a.setBoundary(0, entry0);
   a.setBoundary(1, columns);
-  fill(a, chars);
+  for (; *chars != '\0'; ++chars) a.appendString(std::string(1, *chars).c_str());
   return a;
 }
 
-ElementArray table(int32_t columns, const char* chars = "") {
-  return shaped(2, 0, columns, chars);
-}
-
-TEST(Dimensions, FreshArrayAndBoundaryRules) {
-  ElementArray a;
-  EXPECT_EQ(a.dimensions(), 1);
-  EXPECT_EQ(a.boundary(0), -1);
-  EXPECT_EQ(a.boundary(1), 0);
-  EXPECT_EQ(a.dimIndexOfIndex(1, 7), 7);
-  EXPECT_EQ(a.dimIndexOfIndex(2, 7), 0);
-
-  a.setDimensions(2);
-  a.setBoundary(1, 10);
-  a.setBoundary(2, 5);  // the last dimension has no boundary
-  EXPECT_EQ(a.boundaryEntry(2), 0);
-  a.setBoundary(1, 0);
-  a.setBoundary(1, -4);
-  EXPECT_EQ(a.boundary(1), 10);
-  a.setBoundary(-1, 5);
-  EXPECT_EQ(a.boundary(-1), 0);
-  a.setBoundary(0, 6);  // entry 0 is settable like any other
-  EXPECT_EQ(a.boundary(0), 6);
-
-  a.setDimensions(10);
-  EXPECT_EQ(a.dimensions(), 2);
-  a.setDimensions(0);
-  EXPECT_EQ(a.dimensions(), 0);
-  EXPECT_EQ(a.boundary(1), 0);
-  EXPECT_EQ(a.boundary(0), 0);
-  a.setDimensions(-3);
-  EXPECT_EQ(a.dimensions(), -3);
-  EXPECT_EQ(a.dimIndexOfIndex(1, 7), 0);
-
-  // An entry stored while it had a dimension stays, unread, when the count drops.
-  a.setDimensions(3);
-  a.setBoundary(2, 4);
-  a.setDimensions(2);
-  EXPECT_EQ(a.boundary(2), 0);
-  EXPECT_EQ(a.boundaryEntry(2), 4);
-}
-
+// Counts outside 1..3 are stored but give no coordinates; a 2D array whose X boundary
+// was never set divides by 0, and the answer is 0.
 TEST(Dimensions, CoordinatesOfAnIndex) {
-  ElementArray a = table(10);
+  ElementArray a = shaped(2, 0, 10);
   const int32_t cases[][3] = {{1, 23, 3},   {2, 23, 2}, {1, -1, -1}, {2, -1, 0}, {2, -23, -2},
                               {1, -23, -3}, {0, 23, 0}, {-1, 23, 0}, {3, 23, 0}};
   for (auto [dim, index, expected] : cases) {
     EXPECT_EQ(a.dimIndexOfIndex(dim, index), expected) << dim << " " << index;
   }
-  EXPECT_EQ(a.indexOfXY(3, 2), 23);
   // 3 * 10^8 * 10 + 1 wraps past 2^32.
   EXPECT_EQ(a.indexOfXY(1, 300000000), -1294967295);
+  a.setDimensions(-3);
+  EXPECT_EQ(a.dimensions(), -3);
+  EXPECT_EQ(a.dimIndexOfIndex(1, 7), 0);
+  a.setDimensions(0);
+  EXPECT_EQ(a.boundary(0), 0);
 
-  ElementArray cube;
-  cube.setDimensions(3);
-  cube.setBoundary(1, 4);
+  ElementArray cube = shaped(3, 0, 4);
   cube.setBoundary(2, 3);
-  EXPECT_EQ(cube.stride(0), 1);
-  EXPECT_EQ(cube.stride(1), 4);
-  EXPECT_EQ(cube.stride(2), 12);
   for (int32_t dim = 1; dim <= 3; ++dim) EXPECT_EQ(cube.dimIndexOfIndex(dim, 17), 1);
 
-  // A 2D array whose X boundary was never set divides by 0: the answer is 0.
-  ElementArray unset = table(0);
+  ElementArray unset = shaped(2, 0, 0);
   EXPECT_EQ(unset.dimIndexOfIndex(1, 5), 0);
   EXPECT_EQ(unset.dimIndexOfIndex(2, 5), 0);
   EXPECT_EQ(unset.indexOfXY(5, 3), 5);
 }
 
 TEST(Dimensions, IndexOfCoordinateListSplitsAtEveryDelimiterCharacter) {
-  ElementArray a = table(10);
+  ElementArray a = shaped(2, 0, 10);
   EXPECT_EQ(a.indexOfDimIndex(nullptr), 0);
   const struct {
     const char* delimiter;
@@ -107,19 +70,14 @@ TEST(Dimensions, IndexOfCoordinateListSplitsAtEveryDelimiterCharacter) {
     a.setListDelimiter(c.delimiter);
     EXPECT_EQ(a.indexOfDimIndex(c.list), c.index) << "«" << c.list << "» by «" << c.delimiter;
   }
-  EXPECT_EQ(a.indexOfXY(3, 2), 23);
-
   // Coordinates are not limited to their boundaries.
-  ElementArray b = table(3);
-  EXPECT_EQ(b.indexOfDimIndex("5,2"), 11);
-  EXPECT_EQ(b.indexOfDimIndex("2,3"), 11);
+  EXPECT_EQ(shaped(2, 0, 3).indexOfDimIndex("5,2"), 11);
 
   // Tokens past the last dimension use the entries stored above it.
-  ElementArray c;
-  c.setDimensions(3);
-  c.setBoundary(1, 10);
+  ElementArray c = shaped(3, 0, 10);
   c.setBoundary(2, 4);
   c.setDimensions(2);
+  EXPECT_EQ(c.boundary(2), 0);
   EXPECT_EQ(c.indexOfDimIndex("1,2,3"), 141);
   c.setDimensions(1);
   EXPECT_EQ(c.indexOfDimIndex("1,2,3"), 141);
@@ -138,13 +96,12 @@ TEST(Dimensions, ResizeOfColumnsAndOfEntryZero) {
     const char* after;
     int32_t boundaryAfter;
   } cases[] = {// clang-format off
-      {2, 0, 3, "klmnopqr", 1, 5, "k|l|m|_|_|n|o|p|_|_|q|r", 5},
-      {2, 0, 3, "klmnopqr", 1, 2, "k|l|n|o|q|r", 2}, {2, 0, 3, "klmnopqr", 1, 1, "k|n|q|r", 1},
-      {2, 0, 2, "123456", 1, 4, "1|2|_|_|3|4|_|_|5|6|_|_", 4},
+      {2, 0, 3, "klmnopqr", 1, 5, "k|l|m|~|~|n|o|p|~|~|q|r", 5},
+      {2, 0, 3, "klmnopqr", 1, 1, "k|n|q|r", 1},
       {2, 0, 3, "abc", 1, 5, "a|b|c", 5},    {2, 0, 0, "abcd", 1, 3, "a|b|c|d", 3},
       {2, 0, 2, "abcd", 1, 0, "a|b|c|d", 2}, {2, 0, 2, "abcd", -1, 3, "a|b|c|d", 2},
-      {2, 0, 2, "abcd", 2, 3, "a|b|c|d", 2}, {2, 0, 2, "abcd", 1, 2, "a|b|c|d", 2},
-      {1, 0, 0, "abc", 0, 1, "a|_|_|b|_|_|c|_|_", 1}, {1, 2, 0, "abc", 0, 1, "", 1},
+      {2, 0, 2, "abcd", 2, 3, "a|b|c|d", 2},
+      {1, 0, 0, "abc", 0, 1, "a|~|~|b|~|~|c|~|~", 1}, {1, 2, 0, "abc", 0, 1, "", 1},
       {1, 5, 0, "abc", 0, 2, "a|b|c", 2}};
   // clang-format on
   for (const auto& c : cases) {
@@ -153,64 +110,6 @@ TEST(Dimensions, ResizeOfColumnsAndOfEntryZero) {
     EXPECT_EQ(contents(a), c.after) << c.chars << " " << c.dim << " to " << c.boundary;
     EXPECT_EQ(a.boundary(c.dim == 0 ? 0 : 1), c.boundaryAfter);
   }
-
-  // Keys move with their elements; removed elements take their keys with them.
-  ElementArray e = table(2, "1234");
-  e.setKeyString("k3", 2);
-  e.setKeyString("k4", 3);
-  e.resizeBoundary(1, 1);
-  EXPECT_EQ(contents(e), "1|3");
-  EXPECT_STREQ(e.getKeyString(1), "k3");
-  e.resizeBoundary(1, 3);
-  EXPECT_EQ(contents(e), "1|_|_|3|_|_");
-  EXPECT_STREQ(e.getKeyString(3), "k3");
-  EXPECT_EQ(e.getKeyString(1), nullptr);
-}
-
-TEST(Dimensions, ResizeOfPages) {
-  ElementArray a;
-  a.setDimensions(3);
-  a.setBoundary(1, 2);
-  a.setBoundary(2, 2);
-  for (int i = 1; i <= 10; ++i) a.appendValue(i);
-  a.resizeBoundary(2, 3);  // every complete page of 4 gains a row of 2
-  EXPECT_EQ(contents(a), "1|2|3|4|_|_|5|6|7|8|_|_|9|10");
-  EXPECT_EQ(a.getValue(a.indexOfDimIndex("0,0,2")), 9);
-  a.resizeBoundary(2, 1);
-  EXPECT_EQ(contents(a), "1|2|5|6|9|10");
-  a.resizeBoundary(3, 4);  // the last dimension: nothing
-  EXPECT_EQ(a.boundaryEntry(3), 0);
-  EXPECT_EQ(a.size(), 6);
-}
-
-// The capacity after a resize is the one its inserts and deletes reach one by one.
-TEST(Dimensions, CapacityAfterResize) {
-  // The last insert lands inside the array at size 12, so the capacity stays 25
-  // although 13 elements result.
-  ElementArray a = table(2, "abcdefg");
-  a.resizeBoundary(1, 4);
-  EXPECT_EQ(contents(a), "a|b|_|_|c|d|_|_|e|f|_|_|g");
-  EXPECT_EQ(a.capacity(), 25);
-  a.appendValue(1);
-  EXPECT_EQ(a.capacity(), 37);
-
-  // One column to two: the sizes before the inserts run 12 .. 22 and the last insert is
-  // a set at index 23, giving 24 elements and capacity 55.
-  ElementArray b = table(1);
-  for (int i = 1; i <= 12; ++i) b.appendValue(i);
-  b.resizeBoundary(1, 2);
-  EXPECT_EQ(b.size(), 24);
-  EXPECT_EQ(b.capacity(), 55);
-  EXPECT_EQ(b.getValue(22), 12);
-
-  // Four columns to one on 200 elements: 150 deletes from sizes 200 .. 51 shrink
-  // 414 -> 310 (at 102) -> 232 (at 76) -> 174 (at 57).
-  ElementArray c = table(4);
-  for (int i = 1; i <= 200; ++i) c.appendValue(i);
-  c.resizeBoundary(1, 1);
-  EXPECT_EQ(c.size(), 50);
-  EXPECT_EQ(c.capacity(), 174);
-  EXPECT_EQ(c.getValue(49), 197);
 }
 
 // The resize written out step by step with single inserts and deletes.
@@ -235,6 +134,8 @@ void resizeStepByStep(ElementArray& a, int32_t d, int32_t n) {
   a.setBoundary(d, n);
 }
 
+// Elements, keys, capacity and row states after a resize are those its single inserts
+// and deletes reach.
 TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
   std::mt19937 random(11);
   for (int round = 0; round < 400; ++round) {
@@ -251,6 +152,7 @@ TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
       a->setDimensions(dims);
       if (round % 3 == 0) a->setBoundary(0, 1 + round % 4);
       for (int32_t i = 1; i <= count; ++i) a->appendValue(i);
+      for (int32_t i = 0; i < count; i += 3) a->setKeyValue(i + 1, i);
       for (uint8_t& state : a->rowStates) state = RowSelected + (state + round) % 2;
     }
     for (int step = 0; step < 2; ++step) {
@@ -258,10 +160,78 @@ TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
       fast.resizeBoundary(d, n);
       resizeStepByStep(slow, d, n);
       ASSERT_EQ(contents(fast), contents(slow)) << "round " << round << " d " << d << " n " << n;
+      for (int32_t i = 0; i < fast.size(); ++i) ASSERT_EQ(fast.getKeyValue(i), slow.getKeyValue(i));
       ASSERT_EQ(fast.capacity(), slow.capacity()) << "round " << round;
       ASSERT_EQ(fast.boundaryEntry(d), slow.boundaryEntry(d));
       ASSERT_EQ(fast.rowStates, slow.rowStates) << "round " << round;
     }
+  }
+}
+
+// States belong to positions, not rows: edits that change the row count drop or add
+// positions at the end, new ones from the automatic selection; key setters change none.
+TEST(RowStates, StatesBelongToPositionsNotRows) {
+  ElementArray a = shaped(2, 0, 3);
+  a.setAutoSelect(1);
+  for (int i = 1; i <= 6; ++i) a.appendValue(i);
+  a.rowStates = {U, S};
+  a.deleteAt(4);
+  EXPECT_EQ(a.rowStates, (States{U}));
+  for (int i = 0; i < 4; ++i) a.insertValue(9, 0);
+  EXPECT_EQ(a.rowStates, (States{U, S, S}));
+  a.setAutoSelect(0);
+  EXPECT_EQ(a.rowStates, (States{U, S, S}));
+  for (int i = 0; i < 3; ++i) a.appendValue(9);
+  EXPECT_EQ(a.rowStates, (States{U, S, S, U}));
+  a.setKeyValue(1, 0);
+  EXPECT_EQ(a.rowStates.size(), 4u);
+
+  // Setting changes bring the list up to date.
+  a.setAutoSelect(1);
+  a.setBoundary(1, 4);
+  EXPECT_EQ(a.rowStates, (States{U, S, S}));
+  a.setBoundary(1, 2);
+  EXPECT_EQ(a.rowStates, (States{U, S, S, S, S, S}));
+  a.setDimensions(3);
+  EXPECT_TRUE(a.rowStates.empty());
+  a.setDimensions(2);
+  EXPECT_EQ(a.rowStates, (States{S, S, S, S, S, S}));
+  a.clear();
+  EXPECT_TRUE(a.rowStates.empty());
+}
+
+// Whatever happens, there is exactly one state per table row.
+TEST(RowStates, AlwaysOnePerTableRow) {
+  std::mt19937 random(7);
+  ElementArray a = shaped(2, 0, 3);
+  for (int step = 0; step < 3000; ++step) {
+    const int32_t pick = static_cast<int32_t>(random() % 100);
+    const int32_t index = static_cast<int32_t>(random() % 40) - 2;
+    const int32_t small = static_cast<int32_t>(random() % 6) - 1;
+    if (pick < 30) {
+      a.appendValue(index);
+    } else if (pick < 45) {
+      a.insertString("t", index);
+    } else if (pick < 60) {
+      a.deleteAt(index);
+    } else if (pick < 68) {
+      a.setValue(small, index);
+    } else if (pick < 74) {
+      a.setBoundary(small, small + 1);
+    } else if (pick < 82) {
+      a.resizeBoundary(small, small + static_cast<int32_t>(random() % 3));
+    } else if (pick < 88) {
+      a.setDimensions(pick < 85 ? 2 : small);
+    } else if (pick < 90) {
+      a.clear();
+    } else if (pick < 95) {
+      a.setAutoSelect(small > 1 ? 1 : 0);
+    } else if (a.size() > 60) {
+      a.deleteAt(0);
+    }
+    ASSERT_EQ(a.rowStates.size(), static_cast<size_t>(a.tableRowCount())) << "step " << step;
+    for (uint8_t state : a.rowStates) ASSERT_TRUE(state == S || state == U);
+    ASSERT_LT(a.size(), 100000);
   }
 }
 

@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <climits>
 #include <cstring>
 #include <random>
@@ -8,74 +7,141 @@
 #include <utility>
 #include <vector>
 
-#include "contents.h"
+#include "support/array_text.h"
 
 namespace quorrel {
 namespace {
 
-TEST(Store, FreshArrayAndReadsOutside) {
+// 200 values deleted from the front down to 102: still 414, since the last delete
+// started from 103 = 414 / 4; the next balance below that shrinks to 310.
+ElementArray sparse() {
   ElementArray a;
-  EXPECT_EQ(a.size(), 0);
+  for (int i = 1; i <= 200; ++i) a.appendValue(i);
+  while (a.size() > 102) a.deleteAt(0);
+  return a;
+}
+
+TEST(Capacity, GrowsByHalfWhenSizePassesHalf) {
+  ElementArray a;
   EXPECT_EQ(a.capacity(), 25);
+  const int expected[][2] = {{12, 25}, {13, 37},  {18, 37},  {19, 55},  {27, 55},  {28, 82},
+                             {41, 82}, {42, 123}, {62, 184}, {93, 276}, {139, 414}};
+  int appended = 0;
+  for (auto [count, capacity] : expected) {
+    while (appended < count) a.appendValue(++appended);
+    EXPECT_EQ(a.capacity(), capacity) << "after " << count << " appends";
+  }
+
+  // Setting far past the end grows step by step; clear starts over.
+  ElementArray far;
+  far.setString("a", 1000);
+  EXPECT_EQ(far.size(), 1001);
+  EXPECT_EQ(far.capacity(), 2094);
+  far.clear();
+  EXPECT_EQ(far.capacity(), 25);
+
+  // An insert inside balances for the size before it grows, so inserting at the front
+  // reaches 37 one element later than appending does.
+  ElementArray front;
+  for (int i = 1; i <= 13; ++i) front.insertValue(i, 0);
+  EXPECT_EQ(front.capacity(), 25);
+  front.insertValue(14, 0);
+  EXPECT_EQ(front.capacity(), 37);
+}
+
+// Shrinking to 75 % happens when the size before a delete is under a quarter of the
+// capacity; between a quarter and a half nothing changes.
+TEST(Capacity, ShrinksWithHysteresis) {
+  ElementArray a = sparse();
+  ASSERT_EQ(a.capacity(), 414);
+  // Growing back needs more than 207 elements.
+  while (a.size() < 207) a.appendValue(1);
+  EXPECT_EQ(a.capacity(), 414);
+  a.appendValue(1);
+  EXPECT_EQ(a.capacity(), 621);
+  while (a.size() > 102) a.deleteAt(a.size() - 1);
+  // 621 / 4 = 155, so the deletes from 154 down already shrank to 465 (465 / 4 = 116,
+  // then from 115 down to 348).
+  EXPECT_EQ(a.capacity(), 348);
+
+  ElementArray b = sparse();
+  const int steps[][2] = {{101, 310}, {76, 310}, {75, 232}, {57, 232}, {56, 174},
+                          {42, 174},  {41, 130}, {31, 130}, {30, 97},  {0, 97}};
+  for (auto [size, capacity] : steps) {
+    while (b.size() > size) b.deleteAt(0);
+    EXPECT_EQ(b.capacity(), capacity) << "at size " << size;  // below 26 nothing shrinks
+  }
+  for (int i = 1; i <= 48; ++i) b.appendValue(i);
+  EXPECT_EQ(b.capacity(), 97);
+  b.appendValue(49);
+  EXPECT_EQ(b.capacity(), 145);
+
+  // A set or insert inside the array also rebalances, which can shrink it; key setters
+  // and reads leave the capacity alone.
+  ElementArray set = sparse();
+  set.setValue(5, 0);
+  EXPECT_EQ(set.capacity(), 310);
+  ElementArray inserted = sparse();
+  inserted.insertValue(5, 0);
+  EXPECT_EQ(inserted.capacity(), 310);
+  ElementArray keyed = sparse();
+  keyed.setKeyValue(1, 0);
+  EXPECT_EQ(keyed.capacity(), 414);
+}
+
+// Reads outside give nothing; sets and inserts past the end fill with None; a 0 or a
+// missing text stores None; negative and unreachable indexes change nothing.
+TEST(Store, EdgesOfTheArray) {
+  ElementArray a;
   EXPECT_EQ(a.getString(0), nullptr);
   EXPECT_EQ(a.getKeyString(0), nullptr);
-  EXPECT_STREQ(a.listDelimiter(), ",");
-  EXPECT_EQ(a.selectionMode, 1);
-  EXPECT_EQ(a.autoSelectNewRows + a.caseMode + a.searchMode + a.fileMode, 0);
   ByteBlock block{"untouched", 9};
   EXPECT_FALSE(a.getBytes(block, 0));
   EXPECT_STREQ(block.bytes, "untouched");
-  a.appendValue(3);
-  EXPECT_EQ(a.getString(-1), nullptr);
-  EXPECT_EQ(a.getValue(-1), 0);
-  EXPECT_EQ(a.getValue(1), 0);
-}
-
-TEST(Store, SetAndInsertPastTheEndFillWithNone) {
-  ElementArray a;
   a.setString("a", 5);
-  EXPECT_EQ(contents(a), "_|_|_|_|_|a");
+  EXPECT_EQ(contents(a), "~|~|~|~|~|a");
   EXPECT_STREQ(a.getString(2), "");
+  EXPECT_EQ(a.getValue(-1), 0);
   a.setValue(0, 7);  // stores None, but still grows
   a.setString(nullptr, 5);
   a.setString("b", -1);
   a.setString("b", INT32_MAX);
   a.insertString("b", INT32_MAX);
-  EXPECT_EQ(contents(a), "_|_|_|_|_|_|_|_");
+  EXPECT_EQ(contents(a), "~|~|~|~|~|~|~|~");
 
   ElementArray b;
-  fill(b, "ab").insertValue(7, 3);
-  EXPECT_EQ(contents(b), "a|b|_|7");
-  b.insertString("x", 10);
+  b.appendString("a");
+  b.insertValue(7, 2);
+  b.insertString("x", 6);
   b.insertString("n", -1);
   b.deleteAt(-1);
   b.deleteAt(b.size());
-  EXPECT_EQ(contents(b), "a|b|_|7|_|_|_|_|_|_|x");
-}
+  EXPECT_EQ(contents(b), "a|~|#7|~|~|~|x");
 
-TEST(Store, FileBlocksAndRawBytes) {
-  ElementArray a;
-  a.appendFile({"x\0y", 3});
-  a.appendFile({nullptr, 4});
-  a.appendFile({"abc", 0});
-  a.appendString("abc");
-  a.appendValue(-9);
-  EXPECT_EQ(a.at(0).type(), ElementType::File);
-  EXPECT_EQ(a.at(1).type(), ElementType::None);
-  EXPECT_EQ(a.at(2).type(), ElementType::None);
-
-  ByteBlock block;
-  ASSERT_TRUE(a.getBytes(block, 0));
-  EXPECT_EQ(block.length, 3);
-  EXPECT_EQ(std::memcmp(block.bytes, "x\0y", 3), 0);
-  ASSERT_TRUE(a.getBytes(block, 1));
+  // File bytes: empty or missing ones store None; a text reads with its terminator.
+  ElementArray f;
+  f.appendFile({"x\0y", 3});
+  f.appendFile({nullptr, 4});
+  f.appendFile({"abc", 0});
+  f.appendString("abc");
+  EXPECT_EQ(contents(f), std::string("<x\0y>|~|~|abc", 13));
+  ASSERT_TRUE(f.getBytes(block, 1));
   EXPECT_EQ(block.bytes, nullptr);
   EXPECT_EQ(block.length, 0);
-  ASSERT_TRUE(a.getBytes(block, 3));  // a text with its terminator
+  ASSERT_TRUE(f.getBytes(block, 3));
   EXPECT_EQ(block.length, 4);
   EXPECT_EQ(std::memcmp(block.bytes, "abc", 4), 0);
-  ASSERT_TRUE(a.getBytes(block, 4));
-  EXPECT_EQ(block.length, 4);
+
+  // Clear keeps the settings; elements set again start keyless.
+  f.setDimensions(2);
+  f.setBoundary(1, 4);
+  f.setListDelimiter(";:");
+  f.setKeyValue(3, 1);
+  f.clear();
+  EXPECT_EQ(f.boundary(1), 4);
+  EXPECT_STREQ(f.listDelimiter(), ";:");
+  f.setString("x", 1);
+  EXPECT_EQ(f.getKeyString(1), nullptr);
 }
 
 // Each element's text form and key text ("-" for no key).
@@ -131,33 +197,39 @@ TEST(Store, EditsEverywhereAgreeWithAPlainVector) {
   }
 }
 
-// Keys are never set beyond the end, die with their element and are not unique; a key
-// of 0 or of file bytes reads as nothing.
-TEST(Store, KeysOutsideTheEditsAbove) {
-  ElementArray a;
-  fill(a, "abc");
-  a.setKeyString("far", 5);
-  EXPECT_EQ(a.size(), 3);
-  EXPECT_EQ(a.getKeyValue(1), 0);
-  a.setKeyValue(22, 2);
-  EXPECT_EQ(a.getKeyValue(2), 22);
-  a.deleteAt(2);
-  a.appendString("d");
-  EXPECT_EQ(a.getKeyString(2), nullptr);
-  a.setKeyString("ka", 0);
-  a.setKeyString("ka", 1);
-  a.setKeyFile({"zz", 2}, 2);
-  EXPECT_EQ(entries(a), (Entries{{"a", "ka"}, {"b", "ka"}, {"d", ""}}));
-  EXPECT_EQ(a.at(2).key()->type(), ElementType::File);
-  // After clear, elements set again start keyless.
-  a.clear();
-  a.setString("x", 1);
-  EXPECT_EQ(entries(a), (Entries{{"", "-"}, {"x", "-"}}));
-}
+// Appends take a shortcut while they cannot change the capacity or the row count, and
+// appendNone(n) and appendElements of n elements append in bulk: each must leave what
+// inserting at the end one by one leaves (elements, keys, capacity, row states),
+// through growth, shrinking and tables.
+TEST(Store, AppendsMatchSingleInsertsAtTheEnd) {
+  for (int32_t dims : {1, 2}) {
+    ElementArray appended, inserted;
+    for (ElementArray* a : {&appended, &inserted}) {
+      a->setDimensions(dims);
+      a->setBoundary(1, 3);  // refused in one dimension
+    }
+    for (int step = 0; step < 400; ++step) {
+      if (step % 97 == 96) {
+        // Delete most of the array so that the capacity shrinks on the next appends.
+        for (ElementArray* a : {&appended, &inserted}) {
+          while (a->size() > 3) a->deleteAt(0);
+        }
+      }
+      const std::string text = step % 5 == 0 ? std::string() : "t" + std::to_string(step);
+      if (step % 3 == 0) {
+        appended.appendValue(step);
+        inserted.insertValue(step, inserted.size());
+      } else {
+        const char* t = step % 7 == 0 ? nullptr : text.c_str();
+        appended.appendString(t);
+        inserted.insertString(t, inserted.size());
+      }
+      ASSERT_EQ(contents(appended), contents(inserted)) << "dims " << dims << " step " << step;
+      ASSERT_EQ(appended.capacity(), inserted.capacity()) << "dims " << dims << " step " << step;
+      ASSERT_EQ(appended.rowStates, inserted.rowStates) << "dims " << dims << " step " << step;
+    }
+  }
 
-// appendNone(n) and appendElements of n elements must leave exactly what n single
-// appends leave: size, capacity (the policy's steps), row states and the elements.
-TEST(Store, BulkAppendsMatchSingleAppends) {
   const auto prepare = [](ElementArray& a, int32_t start) {
     a.setDimensions(2);
     a.setBoundary(1, 4);
@@ -183,14 +255,11 @@ TEST(Store, BulkAppendsMatchSingleAppends) {
       }
       run.appendElements(elements);
       EXPECT_EQ(elements.back().type(), ElementType::None);  // moved out
-      EXPECT_EQ(contents(none), contents(single));
-      EXPECT_EQ(none.capacity(), single.capacity()) << start << " + " << n;
-      EXPECT_EQ(none.rowStates, single.rowStates);
-      ASSERT_EQ(contents(run), contents(singleKeyed));
-      EXPECT_EQ(run.capacity(), singleKeyed.capacity()) << start << " + " << n;
-      EXPECT_EQ(run.rowStates, singleKeyed.rowStates);
-      for (int32_t i = 0; i < run.size(); ++i)
-        EXPECT_EQ(run.getKeyValue(i), singleKeyed.getKeyValue(i));
+      for (auto [bulk, one] : {std::pair{&none, &single}, std::pair{&run, &singleKeyed}}) {
+        ASSERT_EQ(entries(*bulk), entries(*one)) << start << " + " << n;
+        EXPECT_EQ(bulk->capacity(), one->capacity()) << start << " + " << n;
+        EXPECT_EQ(bulk->rowStates, one->rowStates) << start << " + " << n;
+      }
     }
   }
   ElementArray capped;
@@ -201,27 +270,6 @@ TEST(Store, BulkAppendsMatchSingleAppends) {
   capped.appendElements(more);
   EXPECT_EQ(capped.size(), ElementArray::kMaxSize);
   EXPECT_EQ(more[0].number(), 9);  // refused, so not taken
-}
-
-TEST(Store, ClearKeepsSettingsAndDelimiterTakesAnyText) {
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 4);
-  a.labels = LabelList{"n", "m"};
-  a.caseMode = 1;
-  a.setListDelimiter("");
-  EXPECT_STREQ(a.listDelimiter(), "");
-  a.setListDelimiter(";:");
-  for (int i = 1; i <= 1000; ++i) a.appendValue(i);
-  a.clear();
-  EXPECT_EQ(a.size(), 0);
-  EXPECT_EQ(a.capacity(), 25);
-  EXPECT_EQ(a.boundary(1), 4);
-  EXPECT_EQ(a.labels, (LabelList{"n", "m"}));
-  EXPECT_EQ(a.caseMode, 1);
-  EXPECT_STREQ(a.listDelimiter(), ";:");
-  a.setAutoSelect(7);
-  EXPECT_EQ(a.autoSelectNewRows, 1);
 }
 
 }  // namespace

@@ -157,86 +157,63 @@ TEST(SetupDialog, CreateObjectFillsDefaultsAndShowsThem) {
   EXPECT_EQ(delimiterOf(cancelled), ",");
 }
 
-TEST(SetupDialog, DimensionButtonsEnableTheFieldsAndPickWhatIsStored) {
-  Record record = storedRecord({7, 4, 5, 0, 0, 0});  // an unknown count opens as 1D and stores 1
-  edit(record, 1, [](HWND dialog) {
-    EXPECT_EQ(state(dialog), "1D insensitive literal off |");
-    EXPECT_FALSE(QuorrelDialogType(dialog, kX, "9"));  // disabled: takes nothing
-    QuorrelDialogClick(dialog, kOk);
-  });
-  EXPECT_EQ(fieldsOf(record), (Ints{1, 4, 5, 0, 0, 0}));
-
-  record = storedRecord({2, 10, 10, 0, 0, 0});
+TEST(SetupDialog, DimensionButtonsEnableTheFields) {
+  Record record = storedRecord({2, 10, 10, 0, 0, 0});
   edit(record, 0, [](HWND dialog) {
     EXPECT_TRUE(QuorrelDialogClick(dialog, k3D));
     EXPECT_EQ(state(dialog), "3D insensitive literal off | X Y");
     EXPECT_TRUE(QuorrelDialogClick(dialog, k1D));
     EXPECT_EQ(state(dialog), "1D insensitive literal off |");
+    EXPECT_FALSE(QuorrelDialogType(dialog, kX, "9"));  // disabled: takes nothing
     EXPECT_TRUE(QuorrelDialogClick(dialog, k2D));
     EXPECT_EQ(state(dialog), "2D insensitive literal off | X");
     QuorrelDialogKey(dialog, VK_ESCAPE);
   });
-
-  // 2D stores X and keeps Y, even when the Y field changed.
-  record = storedRecord({3, 4, 5, 0, 0, 0});
-  edit(record, 1, [](HWND dialog) {
-    EXPECT_TRUE(QuorrelDialogType(dialog, kX, "50"));
-    EXPECT_TRUE(QuorrelDialogType(dialog, kY, "99"));
-    QuorrelDialogClick(dialog, k2D);
-    EXPECT_EQ(fieldText(dialog, kY), "99");
-    QuorrelDialogClick(dialog, kOk);
-  });
-  EXPECT_EQ(fieldsOf(record), (Ints{2, 50, 5, 0, 0, 0}));
-
-  // 3D stores both; 1D keeps both.
-  record = storedRecord({2, 4, 5, 0, 0, 0});
-  edit(record, 1, [](HWND dialog) {
-    QuorrelDialogClick(dialog, k3D);
-    QuorrelDialogType(dialog, kX, "6");
-    QuorrelDialogType(dialog, kY, "7");
-    QuorrelDialogKey(dialog, VK_RETURN);
-  });
-  EXPECT_EQ(fieldsOf(record), (Ints{3, 6, 7, 0, 0, 0}));
-  edit(record, 1, [](HWND dialog) {
-    QuorrelDialogType(dialog, kX, "60");
-    QuorrelDialogType(dialog, kY, "70");
-    QuorrelDialogClick(dialog, k1D);
-    QuorrelDialogClick(dialog, kOk);
-  });
-  EXPECT_EQ(fieldsOf(record), (Ints{1, 6, 7, 0, 0, 0}));
 }
 
-TEST(SetupDialog, BoundaryFieldsReadAsSignedNumbers) {
-  Record record = storedRecord({3, -5, 12, 0, 0, 0});
-  edit(record, 1, [](HWND dialog) {
-    EXPECT_EQ(fieldText(dialog, kX), "-5");   // only a stored record brings a minus sign
-    QuorrelDialogType(dialog, kY, "-1a2 3");  // the field takes digits only
-    EXPECT_EQ(fieldText(dialog, kY), "123");
-    QuorrelDialogClick(dialog, kOk);
-  });
-  EXPECT_EQ(fieldsOf(record), (Ints{3, -5, 123, 0, 0, 0}));
-  edit(record, 1, [](HWND dialog) {  // an emptied field stores 0
-    QuorrelDialogType(dialog, kX, "");
-    QuorrelDialogClick(dialog, kOk);
-  });
-  EXPECT_EQ(fieldsOf(record), (Ints{3, 0, 123, 0, 0, 0}));
-}
-
-TEST(SetupDialog, ModesAreShownByZeroOrNotAndStoredAsZeroOrOne) {
-  Record record = storedRecord({2, 10, 10, 5, -3, 2});  // only exactly 1 is On
-  edit(record, 1, [](HWND dialog) {
-    EXPECT_EQ(state(dialog), "2D sensitive wildcard off | X");
-    QuorrelDialogClick(dialog, kOk);
-  });
-  EXPECT_EQ(fieldsOf(record), (Ints{2, 10, 10, 1, 1, 0}));
-  edit(record, 1, [](HWND dialog) {
-    QuorrelDialogClick(dialog, kCaseInsensitive);
-    QuorrelDialogClick(dialog, kLiteral);
-    QuorrelDialogClick(dialog, kOn);
-    EXPECT_EQ(state(dialog), "2D insensitive literal on | X");
-    QuorrelDialogClick(dialog, kOk);
-  });
-  EXPECT_EQ(fieldsOf(record), (Ints{2, 10, 10, 0, 0, 1}));
+// What the dialog shows for a stored record and what OK stores after the author's steps
+// (a step with text types it into the field, one without clicks the button). The
+// dimension picks the boundaries stored: 2D stores X and keeps Y, 3D both, 1D neither.
+// Boundaries read as signed numbers; modes show as zero or not and store as 0 or 1.
+TEST(SetupDialog, OkStoresWhatTheDialogShows) {
+  using Steps = std::vector<std::pair<int, const char*>>;
+  const struct {
+    Ints stored;
+    const char* shown;  // state, then the X and Y fields
+    Steps steps;
+    Ints after;
+  } cases[] = {
+      {{7, 4, 5, 0, 0, 0}, "1D insensitive literal off | 4 5", {}, {1, 4, 5, 0, 0, 0}},
+      {{3, 4, 5, 0, 0, 0}, nullptr, {{kX, "50"}, {kY, "99"}, {k2D, nullptr}}, {2, 50, 5, 0, 0, 0}},
+      {{2, 4, 5, 0, 0, 0}, nullptr, {{k3D, nullptr}, {kX, "6"}, {kY, "7"}}, {3, 6, 7, 0, 0, 0}},
+      {{3, 6, 7, 0, 0, 0}, nullptr, {{kX, "60"}, {kY, "70"}, {k1D, nullptr}}, {1, 6, 7, 0, 0, 0}},
+      // Only a stored record brings a minus sign; the field takes digits only.
+      {{3, -5, 12, 0, 0, 0},
+       "3D insensitive literal off | X Y -5 12",
+       {{kY, "-1a2 3"}},
+       {3, -5, 123, 0, 0, 0}},
+      {{3, -5, 12, 0, 0, 0}, nullptr, {{kX, ""}}, {3, 0, 12, 0, 0, 0}},
+      {{2, 10, 10, 5, -3, 2}, "2D sensitive wildcard off | X 10 10", {}, {2, 10, 10, 1, 1, 0}},
+      {{2, 10, 10, 1, 1, 0},
+       nullptr,
+       {{kCaseInsensitive, nullptr}, {kLiteral, nullptr}, {kOn, nullptr}},
+       {2, 10, 10, 0, 0, 1}},
+  };
+  for (const auto& c : cases) {
+    Record record = storedRecord(c.stored);
+    edit(record, 1, [&](HWND dialog) {
+      if (c.shown != nullptr) {
+        EXPECT_EQ(state(dialog) + " " + fieldText(dialog, kX) + " " + fieldText(dialog, kY),
+                  c.shown);
+      }
+      for (auto [id, text] : c.steps) {
+        EXPECT_TRUE(text != nullptr ? QuorrelDialogType(dialog, id, text)
+                                    : QuorrelDialogClick(dialog, id));
+      }
+      QuorrelDialogClick(dialog, kOk);
+    });
+    EXPECT_EQ(fieldsOf(record), c.after) << ::testing::PrintToString(c.stored);
+  }
 }
 
 TEST(SetupDialog, DelimiterIsCutTo1023Characters) {

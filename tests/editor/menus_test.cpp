@@ -3,18 +3,63 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
+#include <fstream>
 #include <map>
+#include <set>
 #include <sstream>
 #include <string>
 #include <tuple>
 #include <utility>
+#include <vector>
 
-#include "expectations.h"
 #include "host/entry_points.h"
 #include "platform/windows_services.h"
 
 namespace quorrel::editor_test {
 namespace {
+
+// The expectations are the golden output of `quorrel menu` and `quorrel strings`
+// (QUORREL_EDITOR_GOLDEN), so the menus and strings are written down once: each
+// "== menu KIND" section is a tree as dump() prints it, each "== strings KIND" line
+// CODE "display string or name" "title". A backslash takes the next character as it
+// is: the editor's texts need no other escape.
+struct Golden {
+  std::map<std::string, std::string> trees;
+  std::map<std::string, std::vector<std::pair<std::string, std::string>>> strings;
+};
+
+std::vector<std::string> quotedTexts(const std::string& line) {
+  std::vector<std::string> out;
+  for (std::size_t i = line.find('"'); i != std::string::npos; i = line.find('"', i + 1)) {
+    std::string text;
+    for (++i; i < line.size() && line[i] != '"'; ++i) text += line[i] == '\\' ? line[++i] : line[i];
+    out.push_back(text);
+  }
+  return out;
+}
+
+const Golden& golden() {
+  static const Golden g = [] {
+    Golden out;
+    std::ifstream file(QUORREL_EDITOR_GOLDEN);
+    std::string section;
+    for (std::string line; std::getline(file, line);) {
+      if (line.rfind("== ", 0) == 0) {
+        section = line.substr(3);
+        if (section.rfind("menu ", 0) == 0) out.trees[section.substr(5)];  // may stay empty
+      } else if (line.rfind("status ", 0) == 0) {
+        section.clear();
+      } else if (section.rfind("menu ", 0) == 0) {
+        out.trees[section.substr(5)] += line + "\n";
+      } else if (section.rfind("strings ", 0) == 0) {
+        const auto texts = quotedTexts(line);
+        if (texts.size() == 2) out.strings[section.substr(8)].emplace_back(texts[0], texts[1]);
+      }
+    }
+    return out;
+  }();
+  return g;
+}
 
 // One line per item: two spaces per level, ID "Text", "Text" for a submenu, - for a
 // separator. Every command must be plain (no check, no grey).
@@ -42,19 +87,6 @@ std::string dump(HMENU menu, int depth = 0) {
   return out;
 }
 
-// The written-out tree's commands: id and text.
-std::multimap<int, std::string> commands(const char* tree) {
-  std::multimap<int, std::string> texts;
-  std::istringstream lines(tree);
-  for (std::string line; std::getline(lines, line);) {
-    std::size_t start = line.find_first_not_of(' ');
-    if (line[start] < '0' || line[start] > '9') continue;
-    std::size_t quote = line.find('"');
-    texts.emplace(std::stoi(line.substr(start)), line.substr(quote + 1, line.size() - quote - 2));
-  }
-  return texts;
-}
-
 struct OwnedMenu {
   HMENU menu;
   explicit OwnedMenu(void* m) : menu(static_cast<HMENU>(m)) {}
@@ -63,10 +95,12 @@ struct OwnedMenu {
   }
 };
 
-TEST(EditorMenus, MenusAreTheWrittenOutTreesAndEveryCallIsFresh) {
+TEST(EditorMenus, MenusAreTheGoldenTreesAndEveryCallIsFresh) {
+  const std::string& kActionMenuTree = golden().trees.at("actions");
+  ASSERT_EQ(golden().trees.at("conditions"), "");
   OwnedMenu expression(GetExpressionMenu(0, 0, 0));
   ASSERT_NE(expression.menu, nullptr);
-  EXPECT_EQ(dump(expression.menu), kExpressionMenuTree);
+  EXPECT_EQ(dump(expression.menu), golden().trees.at("expressions"));
   EXPECT_EQ(GetConditionMenu(0, 0, 0), nullptr);
 
   // Each call builds its own popup; the caller may destroy one and keep the other.
@@ -80,11 +114,15 @@ TEST(EditorMenus, MenusAreTheWrittenOutTreesAndEveryCallIsFresh) {
   first.menu = nullptr;
   EXPECT_EQ(dump(second.menu), kActionMenuTree);
 
-  // The written-out trees hold every code exactly once.
-  for (auto [tree, base, count] :
-       {std::tuple{kActionMenuTree, 25000, 79}, std::tuple{kExpressionMenuTree, 27000, 60}}) {
-    const auto ids = commands(tree);
-    ASSERT_EQ(ids.size(), static_cast<std::size_t>(count));
+  // The trees hold every code exactly once.
+  for (auto [kind, base, count] : {std::tuple{"actions", 25000, 79}, {"expressions", 27000, 60}}) {
+    std::multiset<int> ids;
+    std::istringstream lines(golden().trees.at(kind));
+    for (std::string line; std::getline(lines, line);) {
+      const std::size_t start = line.find_first_not_of(' ');
+      if (line[start] >= '0' && line[start] <= '9') ids.insert(std::stoi(line.substr(start)));
+    }
+    ASSERT_EQ(ids.size(), static_cast<std::size_t>(count)) << kind;
     for (int code = 0; code < count; ++code) EXPECT_EQ(ids.count(base + code), 1u) << code;
   }
 }
@@ -107,40 +145,42 @@ TEST(EditorMenus, CodesFromMenuCommands) {
   for (int id : {0, 25000, 26000, 27000, -1}) EXPECT_EQ(GetConditionCodeFromMenu(nullptr, id), -1);
 }
 
-TEST(EditorTitles, TitlesAreTheMenuTexts) {
-  for (int code = 0; code < 79; ++code) {
-    for (int param = 0; param < 2; ++param) {
-      char buffer[256];
-      std::memset(buffer, 'x', sizeof buffer);
-      EXPECT_NE(GetActionTitle(nullptr, code, param, buffer, sizeof buffer), 0);
-      EXPECT_STREQ(buffer, kActionMenuTexts[code]) << code << " " << param;
-    }
-  }
-  const auto texts = commands(kExpressionMenuTree);
-  for (int code = 0; code < 60; ++code) {
-    char buffer[256] = "";
-    EXPECT_NE(GetExpressionTitle(nullptr, code, buffer, sizeof buffer), 0);
-    EXPECT_EQ(buffer, texts.find(27000 + code)->second) << code;
-  }
-  char buffer[16] = "untouched";
-  EXPECT_NE(GetConditionTitle(nullptr, 0, 0, buffer, sizeof buffer), 0);  // no text, answers
-  EXPECT_STREQ(buffer, "untouched");
-  GetActionTitle(nullptr, 44, 0, buffer, 5);  // cut to the buffer, terminator included
-  EXPECT_STREQ(buffer, "Sort");
-}
-
-TEST(EditorStrings, EveryDisplayStringAndName) {
+// Every code's title and display string or name; the golden strings hold exactly one
+// line per code.
+TEST(EditorStrings, EveryTitleDisplayStringAndName) {
+  const auto& actions = golden().strings.at("actions");
+  const auto& expressions = golden().strings.at("expressions");
+  ASSERT_EQ(actions.size(), 79u);
+  ASSERT_EQ(expressions.size(), 60u);
   char buffer[256];
   for (int code = 0; code < 79; ++code) {
+    const auto& [display, title] = actions[static_cast<std::size_t>(code)];
     EXPECT_EQ(GetActionString(nullptr, code, buffer, sizeof buffer),
-              static_cast<int>(std::strlen(kActionStrings[code])));
-    EXPECT_STREQ(buffer, kActionStrings[code]) << code;
+              static_cast<int>(display.size()));
+    EXPECT_EQ(buffer, display) << code;
+    for (int param = 0; param < 2; ++param) {
+      std::memset(buffer, 'x', sizeof buffer);
+      EXPECT_NE(GetActionTitle(nullptr, code, param, buffer, sizeof buffer), 0);
+      EXPECT_EQ(buffer, title) << code << " " << param;
+    }
   }
   for (int code = 0; code < 60; ++code) {
+    const auto& [name, title] = expressions[static_cast<std::size_t>(code)];
     EXPECT_EQ(GetExpressionString(nullptr, code, buffer, sizeof buffer),
-              static_cast<int>(std::strlen(kExpressionNames[code])));
-    EXPECT_STREQ(buffer, kExpressionNames[code]) << code;
+              static_cast<int>(name.size()));
+    EXPECT_EQ(buffer, name) << code;
+    EXPECT_NE(GetExpressionTitle(nullptr, code, buffer, sizeof buffer), 0);
+    EXPECT_EQ(buffer, title) << code;
   }
+  char small[16] = "untouched";
+  EXPECT_NE(GetConditionTitle(nullptr, 0, 0, small, sizeof small), 0);  // no text, answers
+  EXPECT_STREQ(small, "untouched");
+  GetActionTitle(nullptr, 44, 0, small, 5);  // cut to the buffer, terminator included
+  EXPECT_STREQ(small, "Sort");
+}
+
+TEST(EditorStrings, NoStringsPastTheTablesAndCutsToTheBuffer) {
+  char buffer[256];
   // No conditions, so no condition strings; nor strings past the tables.
   EXPECT_EQ(GetConditionString(nullptr, 0, buffer, sizeof buffer), 0);
   EXPECT_EQ(GetActionString(nullptr, 79, buffer, sizeof buffer), 0);

@@ -25,16 +25,11 @@ TEST(PortableMenus, BuildReadAndRelease) {
   // A popup belongs to one parent only.
   EXPECT_FALSE(AppendMenuA(top, MF_POPUP, reinterpret_cast<UINT_PTR>(sub), "Again"));
 
+  // Reading the editor's menus by position is checked against their golden trees; these
+  // pin what those menus never hold: flags, missing positions and commands.
   EXPECT_EQ(GetMenuItemCount(top), 4);
-  EXPECT_EQ(GetMenuItemID(top, 0), 501u);
-  EXPECT_EQ(GetMenuItemID(top, 1), 0u);           // separator
-  EXPECT_EQ(GetMenuItemID(top, 2), 0xFFFFFFFFu);  // submenu
   EXPECT_EQ(GetMenuItemID(top, 4), 0xFFFFFFFFu);  // no such position
-  EXPECT_EQ(GetSubMenu(top, 2), sub);
-  EXPECT_EQ(GetSubMenu(top, 0), nullptr);
-
   EXPECT_EQ(GetMenuState(top, 0, MF_BYPOSITION), static_cast<UINT>(MF_CHECKED | MF_GRAYED));
-  EXPECT_EQ(GetMenuState(top, 1, MF_BYPOSITION), static_cast<UINT>(MF_SEPARATOR));
   EXPECT_EQ(GetMenuState(top, 2, MF_BYPOSITION), static_cast<UINT>(2 << 8 | MF_POPUP));
   EXPECT_EQ(GetMenuState(top, 602, MF_BYCOMMAND), 0u);
   EXPECT_EQ(GetMenuState(top, 999, MF_BYCOMMAND), 0xFFFFFFFFu);

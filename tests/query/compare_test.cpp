@@ -45,27 +45,15 @@ TEST(CompareText, FoldingMissingTextsAndUnsignedBytes) {
   }
 }
 
-// '?' never matches the end; '*' and '?' in the text are ordinary characters and there
-// is no escape character; folding maps only A-Z, so '_', '[' and bytes above 0x7F
-// compare unchanged.
+// The random inputs below cover the wildcard rules over their alphabet; these pin what
+// lies outside it: no escape character, folding only A-Z, and long runs that defeat
+// naive greedy matching.
 TEST(WildcardMatch, ByHand) {
-  const char* const folded[][2] = {
-      {"a*c", "abc"},   {"a*c", "ac"},     {"a*c", "abbbc"},     {"a?c", "abc"}, {"*", ""},
-      {"", ""},         {"*ab", "aab"},    {"a*b*c", "axxbyyc"}, {"A*", "abc"},  {"***", ""},
-      {"**a**", "A"},   {"*?", "x"},       {"a*?", "ab"},        {"a?c", "a*c"}, {"a*c", "a?c"},
-      {"a\\*", "a\\*"}, {"\xC9?", "\xC9t"}};
-  const char* const unmatched[][2] = {
-      {"a*c", "abcd"},      {"a?c", "ac"}, {"", "a"},    {"?", ""},
-      {"a*b*c", "axxcyyb"}, {"ab", "abc"}, {"*??", "x"}, {"abc?", "abc"},
-      {"ab", "a*"},         {"_", "\x7F"}, {"[", "{"},   {"\xC9*", "\xE9t\xE9"}};
-  for (const auto& c : folded) EXPECT_TRUE(wildcardMatch(c[0], c[1], false)) << c[0] << " " << c[1];
-  for (const auto& c : unmatched) EXPECT_FALSE(wildcardMatch(c[0], c[1], false)) << c[0];
+  EXPECT_TRUE(wildcardMatch("a\\*", "a\\bc", false));  // a backslash escapes nothing
   EXPECT_TRUE(wildcardMatch("HELLO_world", "hello_WORLD", false));
-  EXPECT_FALSE(wildcardMatch("A*", "abc", true));
-  EXPECT_FALSE(wildcardMatch("**a**", "A", true));
-  EXPECT_TRUE(wildcardMatch("*a*a*a*a*b", "aaaaaaaaaaaaaaaaaab", true));
-  EXPECT_FALSE(wildcardMatch("*a*a*a*a*b", "aaaaaaaaaaaaaaaaaaa", true));
-  // A long run that defeats naive greedy matching still ends quickly and correctly.
+  EXPECT_FALSE(wildcardMatch("_", "\x7F", false));
+  EXPECT_FALSE(wildcardMatch("[", "{", false));
+  EXPECT_FALSE(wildcardMatch("\xC9*", "\xE9t\xE9", false));
   std::string text(2000, 'a');
   EXPECT_FALSE(wildcardMatch("*a*a*a*a*a*a*a*b", text.c_str(), true));
   EXPECT_TRUE(wildcardMatch("*a*a*a*a*a*a*a*", text.c_str(), true));

@@ -13,124 +13,42 @@ namespace {
 ElementValue keyText(const char* text) {
   return ElementValue::ofText(text);
 }
-ElementValue keyNumber(int32_t n) {
-  return ElementValue::ofValue(n);
-}
 
-TEST(KeyLookup, FirstMatchCaseAndTypes) {
-  ElementArray array = arrayOf({"#100", "#101", "#102", "#103", "#104", "#105"});
-  array.setKeyString("Apple", 3);
-  array.setKeyString("apple", 5);
-  array.setKeyValue(5, 1);
-  array.setKeyString("5 apples", 2);
-  EXPECT_EQ(indexOfKey(array, keyText("APPLE")), 3);
-  array.caseMode = CaseSensitive;
-  EXPECT_EQ(indexOfKey(array, keyText("APPLE")), -1);
-  EXPECT_EQ(indexOfKey(array, keyText("apple")), 5);
-  // Value key 5 answers the number and its text; the string key «5 apples» reads as 5
-  // but comes later.
-  EXPECT_EQ(indexOfKey(array, keyNumber(5)), 1);
-  EXPECT_EQ(indexOfKey(array, keyText("5")), 1);
-  array.setKeyValue(6, 1);
-  EXPECT_EQ(indexOfKey(array, keyNumber(5)), 2);
-  // Element 0 has no key and is passed over; the text key «Apple» reads as 0.
-  EXPECT_EQ(indexOfKey(array, keyNumber(0)), 3);
-  EXPECT_EQ(stringWithKey(array, keyNumber(5)), std::string("102"));
-  EXPECT_EQ(valueWithKey(array, keyNumber(5)), 102);
-  EXPECT_EQ(stringWithKey(array, keyNumber(77)), nullptr);
-  EXPECT_EQ(valueWithKey(array, keyNumber(77)), 0);
-  ElementArray empty;
-  EXPECT_EQ(indexOfKey(empty, keyText("")), -1);
-}
-
-TEST(KeyLookup, ZeroKeysEqualKeysAndWildcardKeys) {
-  ElementArray array = arrayOf({"a", "b", "c"});
-  array.setKeyValue(0, 1);
-  array.setKeyString("7k", 0);
-  array.setKeyString("7k", 2);
-  EXPECT_EQ(indexOfKey(array, keyNumber(0)), 1);
+// The search script case covers folding, case modes, value and text probes against
+// string and value keys, and pattern keys; these pin unkeyed elements, None keys and
+// repeated keys, and the answers when nothing is found.
+TEST(KeyLookup, ZeroKeysEqualKeysAndMisses) {
+  ElementArray array = arrayOf({"a", "b", "c", "d"});
+  array.setKeyValue(0, 2);
+  array.setKeyString("7k", 1);
+  array.setKeyString("7k", 3);
+  EXPECT_EQ(indexOfKey(array, ElementValue::ofValue(0)), 2);  // element 0 has no key
   EXPECT_EQ(indexOfKey(array, keyText("0")), -1);
-  EXPECT_EQ(indexOfKey(array, keyText("")), 1);
-  EXPECT_EQ(indexOfKey(array, keyText("7K")), 0);
-  EXPECT_EQ(indexOfKey(array, keyNumber(7)), 0);
-  EXPECT_EQ(stringWithKey(array, keyText("")), std::string("b"));
-
-  // The key's text is the pattern: the probe «item*» is taken literally.
-  ElementArray wild = arrayOf({"first", "second"});
-  wild.setKeyString("item7", 0);
-  wild.setKeyString("item*", 1);
-  wild.searchMode = SearchWildcard;
-  EXPECT_EQ(indexOfKey(wild, keyText("item*")), 1);
-  EXPECT_EQ(indexOfKey(wild, keyText("ITEM9")), 1);
-  EXPECT_EQ(indexOfKey(wild, keyText("item7")), 0);
+  EXPECT_EQ(indexOfKey(array, keyText("")), 2);
+  EXPECT_EQ(indexOfKey(array, keyText("7K")), 1);
+  EXPECT_EQ(indexOfKey(array, ElementValue::ofValue(7)), 1);
+  EXPECT_EQ(stringWithKey(array, keyText("")), std::string("c"));
+  EXPECT_EQ(stringWithKey(array, keyText("x")), nullptr);
+  EXPECT_EQ(valueWithKey(array, keyText("x")), 0);
+  EXPECT_EQ(indexOfKey(ElementArray{}, keyText("")), -1);
 }
 
-TEST(Find, StringsLiteralAndWildcardWithTheProbeAsPattern) {
-  ElementArray array = arrayOf({"#12", "item7", "a*", "Abc", "#0", ""});
-  const struct {
-    int16_t caseMode, searchMode;
-    const char* probe;
-    int32_t found;
-  } cases[] = {
-      {0, 0, "12", 0},    {0, 0, "012", -1},  {0, 0, "a*", 2},   {0, 0, "ABC", 3}, {0, 0, "", 4},
-      {0, 0, "0", -1},    {0, 0, "ITEM7", 1}, {1, 0, "ABC", -1}, {1, 0, "Abc", 3}, {0, 1, "A*", 2},
-      {0, 1, "item*", 1}, {0, 1, "1?", 0},    {0, 1, "*", 0},    {0, 1, "?b?", 3}, {0, 1, "", 4},
-      {0, 1, "ab", -1},  // the element «a*» is a text here, never a pattern
-      {1, 1, "A*", 3},    {1, 1, nullptr, -1}};
-  for (const auto& c : cases) {
-    array.caseMode = c.caseMode;
-    array.searchMode = c.searchMode;
-    EXPECT_EQ(findString(array, c.probe, 999), c.found) << (c.probe ? c.probe : "null");
-  }
-}
-
-TEST(Find, NumericValuesOfEveryType) {
+// Elements are found by their text or leading number; file bytes have no numeric value
+// and a missing probe finds nothing.
+TEST(Find, ValuesOfEveryTypeAndMissingProbes) {
   ElementArray array = arrayOf({"", "  -7 apples", "#9"});
   array.appendFile({"42", 2});
   EXPECT_EQ(findValue(array, 0), 0);
   EXPECT_EQ(findValue(array, -7), 1);
   EXPECT_EQ(findValue(array, 9, -1), 2);
-  EXPECT_EQ(findValue(array, 42), -1);  // file bytes have no numeric value
+  EXPECT_EQ(findValue(array, 42), -1);
   EXPECT_EQ(findValue(ElementArray{}, 0), -1);
-}
-
-TEST(FindContaining, StringsValuesAndFileBytes) {
-  ElementArray array = arrayOf({"xyz", "1234"});
-  EXPECT_EQ(findContainingString(array, "23"), 1);
-  EXPECT_EQ(findContainingValue(array, 23), 1);
-  EXPECT_EQ(findContainingString(array, "YZ"), 0);     // folded, at the very end
-  EXPECT_EQ(findContainingString(array, "xyz1"), -1);  // longer than every element
-  EXPECT_EQ(findContainingString(array, ""), 0);
-  array.caseMode = CaseSensitive;
-  EXPECT_EQ(findContainingString(array, "YZ"), -1);
-  // Values are searched in their decimal text.
+  array.searchMode = SearchWildcard;
+  EXPECT_EQ(findString(array, nullptr), -1);
+  EXPECT_EQ(findString(array, "*"), 0);
   array.setValue(-512, 0);
   EXPECT_EQ(findContainingValue(array, -5), 0);
-  EXPECT_EQ(findContainingString(array, "12"), 0);
   EXPECT_EQ(findContainingString(array, "-5120"), -1);
-
-  ElementArray files = arrayOf({"#0"});  // None: only the empty probe is found there
-  files.appendFile({"ab\0cd\0e", 7});
-  const struct {
-    int16_t searchMode;
-    const char* probe;
-    int32_t found;
-  } cases[] = {{0, "", 0},    {0, "CD", 1},   {0, "e", 1},    // the last byte of the file
-               {0, "bc", -1}, {1, "c?", 1},   {1, "b?", -1},  // the span would hold a zero byte
-               {1, "??", 1},  {1, "???", -1}, {1, "*", 1},
-               {1, "e*", -1}};  // needs two bytes after offset 6
-  for (const auto& c : cases) {
-    files.searchMode = c.searchMode;
-    EXPECT_EQ(findContainingString(files, c.probe), c.found) << c.probe;
-  }
-
-  // Wildcard spans have the probe's length.
-  ElementArray wild = arrayOf({"", "abc"});
-  wild.searchMode = SearchWildcard;
-  EXPECT_EQ(findContainingString(wild, "*"), 1);  // needs one character
-  EXPECT_EQ(findContainingString(wild, "a*c"), 1);
-  EXPECT_EQ(findContainingString(wild, "a**c"), -1);  // four characters
-  EXPECT_EQ(findContainingString(wild, "C"), 1);
 }
 
 TEST(FindContaining, LongTextsAtEveryPlacement) {

@@ -150,7 +150,18 @@ void expectAggregatesOfTheModel(const RandomTable& t, int32_t column, int round)
 }
 
 TEST(RandomTables, SelectionsAndAggregatesAgreeWithTheModel) {
-  enum Kind { Containing, Matching, BetweenTexts, Equal, Greater, BetweenValues };
+  enum Kind {
+    Containing,
+    Matching,
+    BetweenTexts,
+    Equal,
+    NotEqual,
+    Greater,
+    GreaterOrEqual,
+    Less,
+    LessOrEqual,
+    BetweenValues
+  };
   std::mt19937 rng(99);
   int passes = 0;
   int failures = 0;
@@ -164,7 +175,7 @@ TEST(RandomTables, SelectionsAndAggregatesAgreeWithTheModel) {
     a.caseMode = static_cast<int16_t>(rng() % 2);
     a.searchMode = static_cast<int16_t>(rng() % 2);
     a.selectionMode = static_cast<int32_t>(rng() % 2);
-    const auto kind = static_cast<Kind>(rng() % 6);
+    const auto kind = static_cast<Kind>(rng() % 10);
     // Texts: the probe is the low end of a between test, another random text the high end.
     const std::string probe = randomProbe(rng, t);
     const std::string high = randomProbe(rng, t);
@@ -183,8 +194,16 @@ TEST(RandomTables, SelectionsAndAggregatesAgreeWithTheModel) {
           return compareText(a, low, text) <= 0 && compareText(a, top, text) >= 0;
         case Equal:
           return cell.value == x;
+        case NotEqual:
+          return cell.value != x;
         case Greater:
           return cell.value > x;
+        case GreaterOrEqual:
+          return cell.value >= x;
+        case Less:
+          return cell.value < x;
+        case LessOrEqual:
+          return cell.value <= x;
         default:
           return cell.value >= x && cell.value <= x + 5;
       }
@@ -193,7 +212,11 @@ TEST(RandomTables, SelectionsAndAggregatesAgreeWithTheModel) {
     if (kind == Matching) selectWhereMatching(a, column, low);
     if (kind == BetweenTexts) selectBetweenStrings(a, column, low, top);
     if (kind == Equal) selectWhereEqual(a, column, x);
+    if (kind == NotEqual) selectWhereNotEqual(a, column, x);
     if (kind == Greater) selectWhereGreater(a, column, x);
+    if (kind == GreaterOrEqual) selectWhereGreaterOrEqual(a, column, x);
+    if (kind == Less) selectWhereLess(a, column, x);
+    if (kind == LessOrEqual) selectWhereLessOrEqual(a, column, x);
     if (kind == BetweenValues) selectBetweenValues(a, column, x, x + 5);
     ASSERT_EQ(a.rowStates, expected)
         << "round " << round << " kind " << kind << " probe «" << (low ? probe : "(none)")

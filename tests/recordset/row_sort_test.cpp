@@ -5,32 +5,10 @@
 #include <functional>
 #include <random>
 
-#include "recordset/aggregates.h"
 #include "table_test_support.h"
 
 namespace quorrel {
 namespace {
-
-TEST(RowSort, WholeRowsByTextOrValueInEitherDirection) {
-  ElementArray a = makeTable(2, {"b,2", "a,3", "c,1"});
-  sortRows(a, 0, SortByText, false);
-  EXPECT_EQ(columnTexts(a, 0), (Texts{"a", "b", "c"}));
-  EXPECT_EQ(columnTexts(a, 1), (Texts{"3", "2", "1"}));
-  sortRows(a, 1, SortByValue, false);
-  EXPECT_EQ(columnTexts(a, 0), (Texts{"c", "b", "a"}));
-  sortRows(a, 1, SortByValue, true);
-  EXPECT_EQ(columnTexts(a, 0), (Texts{"a", "b", "c"}));
-  sortRows(a, 0, SortByText, true);
-  EXPECT_EQ(columnTexts(a, 0), (Texts{"c", "b", "a"}));
-
-  ElementArray v = makeTable(1);
-  for (int32_t x : {10, 9, 0}) v.appendValue(x);  // 0 is None: value 0, empty text
-  v.insertString("7 days", 2);
-  sortRows(v, 0, SortByText, false);
-  EXPECT_EQ(columnTexts(v, 0), (Texts{"", "10", "7 days", "9"}));
-  sortRows(v, 0, SortByValue, false);
-  EXPECT_EQ(columnTexts(v, 0), (Texts{"", "7 days", "9", "10"}));
-}
 
 // Ties end in the order the first-row-pivot partition steps give them (worked by hand).
 TEST(RowSort, TiesEndInThePartitionOrder) {
@@ -51,21 +29,15 @@ TEST(RowSort, TiesEndInThePartitionOrder) {
   EXPECT_EQ(columnTexts(e, 1), (Texts{"r", "q", "p", "s"}));
 }
 
-TEST(RowSort, KeysTravelStatesStayAndOnlyTheVisibleCountIsSorted) {
-  ElementArray a = makeTable(2, {"3,c", "1,a", "2,b"});
-  a.setKeyString("key-c", 1);
-  a.setKeyValue(11, 2);
-  sortRows(a, 0, SortByValue, false);
-  EXPECT_EQ(columnTexts(a, 1), (Texts{"a", "b", "c"}));
-  EXPECT_EQ(std::string(a.getKeyString(5)), "key-c");
-  EXPECT_EQ(a.getKeyValue(0), 11);
-
+// The row sort script case pins sorts by column and label with keys travelling; these
+// pin which rows take part.
+TEST(RowSort, StatesStayAndOnlyTheVisibleCountIsSorted) {
   // Two visible rows: table rows 0 and 1 are sorted, whichever rows are selected.
   ElementArray b = makeTable(1, {"4", "3", "2", "1"});
   b.rowStates = {U, U, S, S};
   sortRows(b, 0, SortByValue, false);
   EXPECT_EQ(columnTexts(b, 0), (Texts{"3", "4", "2", "1"}));
-  EXPECT_EQ(b.rowStates, (std::vector<uint8_t>{U, U, S, S}));
+  EXPECT_EQ(b.rowStates, (States{U, U, S, S}));
 
   // Columns outside the table, and a one-dimensional array, change nothing.
   ElementArray c = makeTable(2, {"b,2", "a,1"});
@@ -212,39 +184,6 @@ TEST(RowSortDepth, MillionReversedRowsOnAOneMegabyteStack) {
   pthread_join(thread, nullptr);
   pthread_attr_destroy(&attributes);
   EXPECT_TRUE(sorted);
-}
-
-// --- Aggregates ----------------------------------------------------------------------------
-
-struct Aggregates {
-  int32_t max, min, sum, average;
-  bool operator==(const Aggregates&) const = default;
-};
-
-Aggregates aggregates(const ElementArray& a, int32_t column) {
-  return {columnMax(a, column), columnMin(a, column), columnSum(a, column),
-          columnAverage(a, column)};
-}
-
-// The random tables check the aggregates against the model; these pin wraps and neighbours.
-TEST(ColumnAggregates, SumsWrapAndColumnsOutsideTheTableReadNeighbours) {
-  ElementArray w = makeTable(1);
-  for (int32_t v : {INT32_MAX, 2, 1000, -7}) w.appendValue(v);
-  w.rowStates = {S, S, U, S};
-  // 2147483647 + 2 wraps to -2147483647; minus 7 gives -2147483654 mod 2^32 = 2147483642.
-  EXPECT_EQ(aggregates(w, 0), (Aggregates{INT32_MAX, -7, 2147483642, 715827880}));
-  w.rowStates = {S, S, U, U};
-  EXPECT_EQ(columnSum(w, 0), -2147483647);
-  EXPECT_EQ(columnAverage(w, 0), -1073741823);
-  w.rowStates = {U, U, U, U};
-  EXPECT_EQ(aggregates(w, 0), (Aggregates{0, 0, 0, 0}));
-
-  ElementArray a = makeTable(2);  // rows (1, 2), (3, 4), (5, 6)
-  for (int v : {1, 2, 3, 4, 5, 6}) a.appendValue(v);
-  // Column -1: row 0 has no previous cell (0), then 2 and 4.
-  EXPECT_EQ(aggregates(a, -1), (Aggregates{4, 0, 6, 2}));
-  // Column 2: 3, 5, then past the end (0).
-  EXPECT_EQ(aggregates(a, 2), (Aggregates{5, 0, 8, 2}));
 }
 
 }  // namespace
