@@ -5,10 +5,28 @@
 
 namespace quorrel::tool {
 
+namespace {
+
+// One line per item, indented two spaces a level: a popup's quoted title, a command's
+// id and quoted title, or "-" for a separator.
+void printMenu(const std::vector<MenuItem>& items, int depth) {
+  for (const MenuItem& item : items) {
+    std::cout << std::string(2 * depth, ' ');
+    if (item.popup) {
+      std::cout << quoteText(item.text) << '\n';
+      printMenu(item.items, depth + 1);
+    } else if (item.id == 0) {
+      std::cout << "-\n";
+    } else {
+      std::cout << item.id << ' ' << quoteText(item.text) << '\n';
+    }
+  }
+}
+
+}  // namespace
+
 int menuCommand(const Module& module, const std::string& which) {
-  std::string out;
-  module.printMenu(which, out);
-  std::cout << out;
+  printMenu(module.menu(which), 0);
   return 0;
 }
 

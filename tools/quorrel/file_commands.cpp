@@ -35,10 +35,10 @@ ArrayFormat recogniseOrFail(const std::string& path, std::string_view bytes) {
 }
 
 Argument number(int32_t value) {
-  return {false, value, {}};
+  return Argument(value);
 }
 Argument text(const std::string& value) {
-  return {true, 0, value};
+  return Argument(value);
 }
 
 int32_t askNumber(Instance& instance, int32_t code, std::vector<Argument> args = {}) {

@@ -15,34 +15,21 @@ constexpr int32_t kActionMenuBase = 25000;
 constexpr int32_t kExpressionMenuBase = 27000;
 
 // Code -> "Top > Sub > Item", read from the menu tree as the editor receives it.
-std::map<int32_t, std::string> menuPaths(const Module& module, bool actions) {
-  std::string tree;
-  module.printMenu(actions ? "actions" : "expressions", tree);
-  std::map<int32_t, std::string> paths;
-  std::vector<std::string> stack;
-  std::istringstream lines(tree);
-  for (std::string line; std::getline(lines, line);) {
-    const size_t depth = line.find_first_not_of(' ') / 2;
-    const std::string_view item = std::string_view(line).substr(depth * 2);
-    if (item == "-") continue;
-    stack.resize(depth);
-    std::string prefix;
-    for (const auto& part : stack) prefix += part + " > ";
-    const size_t quote = item.find('"');
-    if (quote == std::string_view::npos) continue;
-    std::string title;
-    try {
-      title = parseQuoted(item.substr(quote));
-    } catch (const ScriptError&) {
-      continue;
-    }
-    if (quote == 0) {
-      stack.push_back(title);
-    } else if (looksLikeInteger(item.substr(0, quote - 1))) {
-      const int32_t id = parseInteger(item.substr(0, quote - 1));
-      paths[id - (actions ? kActionMenuBase : kExpressionMenuBase)] = prefix + title;
+void addMenuPaths(const std::vector<MenuItem>& items, const std::string& prefix, int32_t base,
+                  std::map<int32_t, std::string>& paths) {
+  for (const MenuItem& item : items) {
+    if (item.popup) {
+      addMenuPaths(item.items, prefix + item.text + " > ", base, paths);
+    } else if (item.id != 0) {
+      paths[static_cast<int32_t>(item.id) - base] = prefix + item.text;
     }
   }
+}
+
+std::map<int32_t, std::string> menuPaths(const Module& module, bool actions) {
+  std::map<int32_t, std::string> paths;
+  addMenuPaths(module.menu(actions ? "actions" : "expressions"), "",
+               actions ? kActionMenuBase : kExpressionMenuBase, paths);
   return paths;
 }
 

@@ -9,7 +9,7 @@
 #include <string_view>
 #include <vector>
 
-#include "host/abi.h"
+#include "hostsim/records.h"
 
 namespace quorrel::tool {
 
@@ -18,26 +18,11 @@ struct ScriptError : std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
-// The setup record fields a `new` command can set, with the editor's defaults.
-struct SetupFields {
-  int32_t dims = 2;
-  int32_t x = 10;
-  int32_t y = 10;
-  int32_t caseSensitive = 0;
-  int32_t wildcard = 0;
-  int32_t autoSelect = 0;
-  std::string delimiter = ",";
-};
-
-// The longest delimiter the setup record holds (1024 bytes with the terminator).
-inline constexpr size_t kMaxDelimiterLength = 1023;
-
-// One typed argument of an action or expression call.
-struct Argument {
-  bool isText = false;
-  int32_t number = 0;
-  std::string text;
-};
+// The setup record fields a `new` command can set and the arguments of a call are
+// the host simulator's own.
+using hostsim::Argument;
+using hostsim::kMaxDelimiterLength;
+using hostsim::SetupFields;
 
 enum class CommandKind { Empty, New, Action, Expression };
 

@@ -1,4 +1,4 @@
-#include "module.h"
+#include "hostsim/host_simulator.h"
 
 #ifdef _WIN32
 #include <fcntl.h>
@@ -14,18 +14,11 @@
 #include <cstring>
 #include <filesystem>
 
-namespace quorrel::tool {
+namespace quorrel::hostsim {
 namespace {
 
 using abi::readField;
 using abi::writeField;
-
-template <typename Fn>
-Fn required(const Module& module, const char* name) {
-  void* address = module.symbol(name);
-  if (!address) throw ModuleError(module.path() + " does not export " + name);
-  return reinterpret_cast<Fn>(address);
-}
 
 template <typename Fn>
 Fn optional(const Module& module, const char* name) {
@@ -47,40 +40,6 @@ std::string loadText(abi::GetStringFn get, int32_t code) {
   char buffer[1024] = {};
   get(nullptr, code, buffer, sizeof buffer);
   return buffer;
-}
-
-// The routine tables that GetRunObjectInfos announces, checked against the counts.
-struct RoutineTables {
-  const abi::ActionRoutine* actions = nullptr;
-  const abi::ExpressionRoutine* expressions = nullptr;
-};
-
-RoutineTables routineTables(const Module& module) {
-  alignas(8) unsigned char info[abi::kRunInfoWrittenSize + 64] = {};
-  required<abi::GetRunObjectInfosFn>(module, "GetRunObjectInfos")(0, info);
-  const auto actionCount = readField<uint16_t>(info, abi::kInfoActionCount);
-  const auto expressionCount = readField<uint16_t>(info, abi::kInfoExpressionCount);
-  if (actionCount != abi::kActionCount || expressionCount != abi::kExpressionCount) {
-    throw ModuleError(module.path() + " announces " + std::to_string(actionCount) +
-                      " actions and " + std::to_string(expressionCount) + " expressions");
-  }
-  return {readField<const abi::ActionRoutine*>(info, abi::kInfoActionRoutines),
-          readField<const abi::ExpressionRoutine*>(info, abi::kInfoExpressionRoutines)};
-}
-
-std::vector<unsigned char> setupRecord(const SetupFields& fields) {
-  std::vector<unsigned char> record(abi::kSetupRecordSize, 0);
-  writeField(record.data(), abi::kSetupObjectWidth, abi::kDefaultObjectWidth);
-  writeField(record.data(), abi::kSetupObjectHeight, abi::kDefaultObjectHeight);
-  writeField(record.data(), abi::kSetupDimensionCount, fields.dims);
-  writeField(record.data(), abi::kSetupXBoundary, fields.x);
-  writeField(record.data(), abi::kSetupYBoundary, fields.y);
-  writeField(record.data(), abi::kSetupCaseSensitive, fields.caseSensitive);
-  writeField(record.data(), abi::kSetupWildcardSearch, fields.wildcard);
-  writeField(record.data(), abi::kSetupAutoSelectRows, fields.autoSelect);
-  const size_t length = std::min(fields.delimiter.size(), abi::kSetupListDelimiterSize - 1);
-  std::memcpy(record.data() + abi::kSetupListDelimiter, fields.delimiter.data(), length);
-  return record;
 }
 
 }  // namespace
@@ -177,11 +136,11 @@ void useBinaryStandardStreams() {}
 #endif
 
 Signature Module::actionSignature(int32_t code) const {
-  return signatureOf(required<abi::GetInfoEntryFn>(*this, "GetActionInfos")(nullptr, code));
+  return signatureOf(entry<abi::GetInfoEntryFn>("GetActionInfos")(nullptr, code));
 }
 
 Signature Module::expressionSignature(int32_t code) const {
-  return signatureOf(required<abi::GetInfoEntryFn>(*this, "GetExpressionInfos")(nullptr, code));
+  return signatureOf(entry<abi::GetInfoEntryFn>("GetExpressionInfos")(nullptr, code));
 }
 
 std::optional<int32_t> Module::expressionCodeOfName(std::string_view name) const {
@@ -193,24 +152,22 @@ std::optional<int32_t> Module::expressionCodeOfName(std::string_view name) const
 }
 
 std::string Module::actionString(int32_t code) const {
-  return loadText(required<abi::GetStringFn>(*this, "GetActionString"), code);
+  return loadText(entry<abi::GetStringFn>("GetActionString"), code);
 }
 
 std::string Module::expressionString(int32_t code) const {
-  return loadText(required<abi::GetStringFn>(*this, "GetExpressionString"), code);
+  return loadText(entry<abi::GetStringFn>("GetExpressionString"), code);
 }
 
 std::string Module::actionTitle(int32_t code, int param) const {
   char buffer[1024] = {};
-  required<abi::GetParamTitleFn>(*this, "GetActionTitle")(nullptr, code, param, buffer,
-                                                          sizeof buffer);
+  entry<abi::GetParamTitleFn>("GetActionTitle")(nullptr, code, param, buffer, sizeof buffer);
   return buffer;
 }
 
 std::string Module::expressionTitle(int32_t code) const {
   char buffer[1024] = {};
-  required<abi::GetExpressionTitleFn>(*this, "GetExpressionTitle")(nullptr, code, buffer,
-                                                                   sizeof buffer);
+  entry<abi::GetExpressionTitleFn>("GetExpressionTitle")(nullptr, code, buffer, sizeof buffer);
   return buffer;
 }
 
@@ -232,30 +189,32 @@ struct Services {
   SubMenuFn subMenu;
 };
 
-void walk(const Services& services, Menu menu, int depth, std::string& out) {
+std::vector<MenuItem> walk(const Services& services, Menu menu) {
+  std::vector<MenuItem> items;
   const int count = services.count(menu);
   for (int position = 0; position < count; ++position) {
-    out.append(2 * depth, ' ');
+    MenuItem item;
     char text[256] = {};
     services.text(menu, static_cast<unsigned>(position), text, sizeof text, kByPosition);
+    item.text = text;
     if (Menu sub = services.subMenu(menu, position)) {
-      out += quoteText(text) + '\n';
-      walk(services, sub, depth + 1, out);
-    } else if (const unsigned id = services.id(menu, position); id == 0) {
-      out += "-\n";
+      item.popup = true;
+      item.items = walk(services, sub);
     } else {
-      out += std::to_string(id) + ' ' + quoteText(text) + '\n';
+      item.id = services.id(menu, position);
     }
+    items.push_back(std::move(item));
   }
+  return items;
 }
 }  // namespace menus
 
-void Module::printMenu(std::string_view which, std::string& out) const {
-  const char* entry = which == "actions"       ? "GetActionMenu"
-                      : which == "expressions" ? "GetExpressionMenu"
-                                               : "GetConditionMenu";
-  void* menu = required<abi::GetMenuFn>(*this, entry)(0, 0, 0);
-  if (!menu) return;
+std::vector<MenuItem> Module::menu(std::string_view which) const {
+  const char* name = which == "actions"       ? "GetActionMenu"
+                     : which == "expressions" ? "GetExpressionMenu"
+                                              : "GetConditionMenu";
+  void* menu = entry<abi::GetMenuFn>(name)(0, 0, 0);
+  if (!menu) return {};
 #ifdef _WIN32
   // The system's menu services, on the menu the module built with them.
   const menus::Services services{
@@ -269,105 +228,126 @@ void Module::printMenu(std::string_view which, std::string& out) const {
       [](menus::Menu m, int position) -> menus::Menu {
         return GetSubMenu(static_cast<HMENU>(m), position);
       }};
-  menus::walk(services, menu, 0, out);
+  std::vector<MenuItem> items = menus::walk(services, menu);
   DestroyMenu(static_cast<HMENU>(menu));  // the host owns the menu it was handed
+  return items;
 #else
-  const menus::Services services{required<menus::ItemCountFn>(*this, "GetMenuItemCount"),
-                                 required<menus::ItemIdFn>(*this, "GetMenuItemID"),
-                                 required<menus::ItemTextFn>(*this, "GetMenuStringA"),
-                                 required<menus::SubMenuFn>(*this, "GetSubMenu")};
-  menus::walk(services, menu, 0, out);
+  const menus::Services services{
+      entry<menus::ItemCountFn>("GetMenuItemCount"), entry<menus::ItemIdFn>("GetMenuItemID"),
+      entry<menus::ItemTextFn>("GetMenuStringA"), entry<menus::SubMenuFn>("GetSubMenu")};
+  std::vector<MenuItem> items = menus::walk(services, menu);
   // The host owns the menu it was handed.
   if (const auto destroy = optional<menus::DestroyFn>(*this, "DestroyMenu")) destroy(menu);
+  return items;
 #endif
+}
+
+const RoutineTables& Module::routines() const {
+  if (routines_) return *routines_;
+  alignas(8) unsigned char info[abi::kRunInfoWrittenSize + 64] = {};
+  entry<abi::GetRunObjectInfosFn>("GetRunObjectInfos")(0, info);
+  const auto actionCount = readField<uint16_t>(info, abi::kInfoActionCount);
+  const auto expressionCount = readField<uint16_t>(info, abi::kInfoExpressionCount);
+  if (actionCount != abi::kActionCount || expressionCount != abi::kExpressionCount) {
+    throw ModuleError(path_ + " announces " + std::to_string(actionCount) + " actions and " +
+                      std::to_string(expressionCount) + " expressions");
+  }
+  routines_ =
+      RoutineTables{readField<const abi::ActionRoutine*>(info, abi::kInfoActionRoutines),
+                    readField<const abi::ExpressionRoutine*>(info, abi::kInfoExpressionRoutines)};
+  return *routines_;
 }
 
 // ---------------------------------------------------------------------------------
 // The host side of one instance: its run record, the run-time header holding the
-// services, and the buffer of the last text result.
-struct Instance::State {
-  const Module& module;
-  RoutineTables tables;
-  std::vector<unsigned char> runRecord;
-  std::vector<unsigned char> runHeader;
-  std::vector<Argument> pending;  // parameters of the expression being called
-  size_t nextParameter = 0;
-  std::vector<char> result;
+// services, and the buffers of the last expression's text results.
+Instance::Instance(const Module& module, SetupRecord setup, bool createNow)
+    : module_(module), setup_(std::move(setup)) {
+  module.routines();  // a module with the wrong tables fails before any instance exists
+  const auto size = module.entry<abi::GetRunObjectDataSizeFn>("GetRunObjectDataSize")(0, 0);
+  runRecord_.assign(std::max<size_t>(static_cast<uint16_t>(size), abi::kRunRecordSize), 0);
+  runHeader_.assign(abi::kRunHeaderMinSize, 0);
+  writeField(runHeader_.data(), abi::kFetchFirstParameter,
+             static_cast<abi::FetchParameterService>(&fetchFirst));
+  writeField(runHeader_.data(), abi::kFetchNextParameter,
+             static_cast<abi::FetchParameterService>(&fetchNext));
+  writeField(runHeader_.data(), abi::kAllocateResultString,
+             static_cast<abi::AllocateResultStringService>(&allocate));
+  writeField(runRecord_.data(), abi::kRunHeader, static_cast<void*>(runHeader_.data()));
+  // The host's own part of the record is the host's to use: it finds the instance there.
+  writeField(runRecord_.data(), 0, this);
+  if (createNow) create();
+}
 
-  explicit State(const Module& m) : module(m), tables(routineTables(m)) {}
-
-  static State& of(void* runRecord) {
-    return *readField<State*>(runRecord, abi::kRunHostPartSize - sizeof(State*));
-  }
-
-  static abi::HostWord QUORREL_CALL fetch(void* runRecord, int32_t typeFlag, abi::HostWord) {
-    State& state = of(runRecord);
-    if (state.nextParameter >= state.pending.size()) return 0;
-    const Argument& arg = state.pending[state.nextParameter++];
-    if (typeFlag == abi::kFetchText) {
-      return reinterpret_cast<abi::HostWord>(arg.isText ? arg.text.c_str() : "");
-    }
-    return arg.number;
-  }
-  static abi::HostWord QUORREL_CALL fetchFirst(void* runRecord, int32_t typeFlag,
-                                               abi::HostWord token) {
-    of(runRecord).nextParameter = 0;
-    return fetch(runRecord, typeFlag, token);
-  }
-  static char* QUORREL_CALL allocate(void* runRecord, int32_t byteCount, int32_t) {
-    State& state = of(runRecord);
-    state.result.assign(static_cast<size_t>(std::max(byteCount, 1)), '\0');
-    return state.result.data();
-  }
-};
-
-Instance::Instance(const Module& module, const SetupFields& setup)
-    : state_(std::make_unique<State>(module)) {
-  State& s = *state_;
-  const auto size = required<abi::GetRunObjectDataSizeFn>(module, "GetRunObjectDataSize")(0, 0);
-  s.runRecord.assign(std::max<size_t>(static_cast<uint16_t>(size), abi::kRunRecordSize), 0);
-  s.runHeader.assign(abi::kRunHeaderMinSize, 0);
-  writeField(s.runHeader.data(), abi::kFetchFirstParameter,
-             static_cast<abi::FetchParameterService>(&State::fetchFirst));
-  writeField(s.runHeader.data(), abi::kFetchNextParameter,
-             static_cast<abi::FetchParameterService>(&State::fetch));
-  writeField(s.runHeader.data(), abi::kAllocateResultString,
-             static_cast<abi::AllocateResultStringService>(&State::allocate));
-  writeField(s.runRecord.data(), abi::kRunHeader, static_cast<void*>(s.runHeader.data()));
-  // The host's own part of the record is the host's to use: it finds its state there.
-  writeField(s.runRecord.data(), abi::kRunHostPartSize - sizeof(State*), &s);
-  auto record = setupRecord(setup);
-  required<abi::CreateRunObjectFn>(module, "CreateRunObject")(s.runRecord.data(), record.data(), 0);
+void Instance::create() {
+  created_ = true;
+  module_.entry<abi::CreateRunObjectFn>("CreateRunObject")(record(), setup_.data(), 0);
 }
 
 Instance::~Instance() {
-  const auto destroy = optional<abi::DestroyRunObjectFn>(state_->module, "DestroyRunObject");
-  if (destroy) destroy(state_->runRecord.data(), 0);
+  if (!created_) return;
+  if (const auto destroy = optional<abi::DestroyRunObjectFn>(module_, "DestroyRunObject")) {
+    destroy(record(), 0);
+  }
 }
 
-void Instance::callAction(int32_t code, const std::vector<Argument>& args) {
-  abi::HostWord params[2] = {0, 0};
-  for (size_t i = 0; i < args.size() && i < 2; ++i) {
-    params[i] = args[i].isText ? reinterpret_cast<abi::HostWord>(args[i].text.c_str())
-                               : static_cast<abi::HostWord>(args[i].number);
+Instance& Instance::of(void* runRecord) {
+  return *readField<Instance*>(runRecord, 0);
+}
+
+abi::HostWord Instance::fetch(bool first, int32_t typeFlag, abi::HostWord token) {
+  fetches.push_back({first, typeFlag, token});
+  if (first) nextParameter_ = 0;
+  if (nextParameter_ >= pending_.size()) return 0;
+  const Argument& arg = pending_[nextParameter_++];
+  if (typeFlag == abi::kFetchText) {
+    return reinterpret_cast<abi::HostWord>(arg.isText ? arg.text.c_str() : "");
   }
-  state_->tables.actions[code](state_->runRecord.data(), params[0], params[1]);
+  return static_cast<abi::HostWord>(arg.number);
+}
+
+abi::HostWord QUORREL_CALL Instance::fetchFirst(void* runRecord, int32_t typeFlag,
+                                                abi::HostWord token) {
+  return of(runRecord).fetch(true, typeFlag, token);
+}
+
+abi::HostWord QUORREL_CALL Instance::fetchNext(void* runRecord, int32_t typeFlag,
+                                               abi::HostWord token) {
+  return of(runRecord).fetch(false, typeFlag, token);
+}
+
+char* QUORREL_CALL Instance::allocate(void* runRecord, int32_t byteCount, int32_t reserved) {
+  Instance& self = of(runRecord);
+  self.allocations.emplace_back(byteCount, reserved);
+  // Filled with a marker, not zeros, so that a text that is not terminated shows.
+  self.results_.emplace_back(static_cast<size_t>(std::max(byteCount, 1)), '\x7f');
+  return self.results_.back().data();
+}
+
+int16_t Instance::callAction(int32_t code, const std::vector<Argument>& args) {
+  const Argument none;
+  const Argument& first = args.size() > 0 ? args[0] : none;
+  const Argument& second = args.size() > 1 ? args[1] : none;
+  return module_.routines().actions[code](record(), first.word(), second.word());
+}
+
+abi::HostWord Instance::callExpressionRaw(int32_t code, std::vector<Argument> args,
+                                          abi::HostWord token) {
+  pending_ = std::move(args);
+  nextParameter_ = 0;
+  fetches.clear();
+  allocations.clear();
+  results_.clear();
+  return module_.routines().expressions[code](record(), token);
 }
 
 ExpressionResult Instance::callExpression(int32_t code, const std::vector<Argument>& args) {
-  State& s = *state_;
-  s.pending = args;
-  s.nextParameter = 0;
-  s.result.clear();
-  auto* record = s.runRecord.data();
-  const auto flags = readField<uint16_t>(record, abi::kRunHostFlags);
-  writeField<uint16_t>(record, abi::kRunHostFlags, flags & ~abi::kResultIsString);
-  const abi::HostWord answer = s.tables.expressions[code](record, 0);
+  setFlags(flags() & ~abi::kResultIsString);
+  const abi::HostWord answer = callExpressionRaw(code, args);
   ExpressionResult result;
-  if (readField<uint16_t>(record, abi::kRunHostFlags) & abi::kResultIsString) {
+  if (flags() & abi::kResultIsString) {
     result.isText = true;
-    const char* text = reinterpret_cast<const char*>(answer);
-    if (text) result.text = text;
+    if (const char* text = reinterpret_cast<const char*>(answer)) result.text = text;
   } else {
     result.number = static_cast<int32_t>(answer);
   }
@@ -399,4 +379,4 @@ std::string defaultModulePath() {
 #endif
 }
 
-}  // namespace quorrel::tool
+}  // namespace quorrel::hostsim
