@@ -31,7 +31,7 @@ TEST(SetupRecordTest, DelimiterModesAndBetweenColumn) {
   EXPECT_EQ(Instance(SetupRecord().delimiter("")).text(51), ",");  // delimiter$(
   EXPECT_EQ(Instance(SetupRecord().delimiter(";;")).text(51), ";;");
   SetupRecord unterminated;
-  std::memset(unterminated.bytes.data() + kSetupListDelimiter, 'x', kSetupListDelimiterSize);
+  std::memset(unterminated.data() + kSetupListDelimiter, 'x', kSetupListDelimiterSize);
   EXPECT_EQ(Instance(unterminated).text(51), std::string(kSetupListDelimiterSize, 'x'));
 
   // findStr( of "abc" / "a*" / "Abc" in {"Abc"}: any nonzero mode turns the mode on.

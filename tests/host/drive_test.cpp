@@ -48,7 +48,7 @@ TEST(DriveTest, EveryActionAndExpressionOnALiveInstance) {
       if (t.flags() == kResultIsString) {
         ASSERT_EQ(t.allocations.size(), 1u) << "expression " << code;
         EXPECT_EQ(std::strlen(reinterpret_cast<const char*>(result)) + 1,
-                  static_cast<std::size_t>(t.allocations[0]));
+                  static_cast<std::size_t>(t.allocationSizes()[0]));
       } else {
         EXPECT_TRUE(t.allocations.empty()) << "expression " << code;
       }

@@ -40,7 +40,7 @@ TEST(RecordsetRoutinesTest, AutomaticSelectionFollowsTheSetupRecord) {
   EXPECT_EQ(on.action(34, "a,b,7"), 0);
   EXPECT_EQ(on.number(0), 3);
   EXPECT_EQ(on.text(41, {0}), "a,b,7");  // rowList$(
-  EXPECT_EQ(on.allocations, std::vector<int32_t>{6});
+  EXPECT_EQ(on.allocationSizes(), std::vector<int32_t>{6});
   EXPECT_EQ(on.number(40), 1);  // numberOfRows(
   Instance off(tableSetup().set(kSetupAutoSelectRows, 2));
   off.action(34, "a,b,7");

@@ -107,6 +107,9 @@ with tempfile.TemporaryDirectory() as home:
     shell.send("\x1b[A\x1b[A\x1b[A\r")
     shell.expect("E size(", "recalled line")
     shell.expect("0\r\n", "recalled line's result in a fresh instance")
+    # Only at the prompt is the terminal in the line editor's hands: a Ctrl-D typed
+    # before then meets the terminal's own line discipline and can be lost.
+    shell.expect("quorrel> ", "prompt before Ctrl-D")
     shell.send("\x04")
     shell.finish("Ctrl-D")
 
