@@ -3,6 +3,7 @@
 across two sessions, quitting. Usage: shell_pty.py QUORREL. Exit 77 (skipped) when
 the system has no pseudo-terminals or the shell was built without line editing."""
 import os
+import signal
 import select
 import sys
 import tempfile
@@ -33,6 +34,10 @@ class Shell:
             print(f"skipped: no pseudo-terminal ({error})")
             sys.exit(77)
         if self.pid == 0:
+            # As from a login terminal, whatever the test runner blocked or ignored.
+            signal.pthread_sigmask(signal.SIG_SETMASK, [])
+            for number in (signal.SIGINT, signal.SIGTSTP, signal.SIGTTIN, signal.SIGTTOU):
+                signal.signal(number, signal.SIG_DFL)
             os.execve(QUORREL, [QUORREL, "shell"], env)
         self.seen = b""
 

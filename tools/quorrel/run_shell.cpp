@@ -14,7 +14,11 @@
 
 #ifdef QUORREL_HAVE_LIBEDIT
 #include <editline/readline.h>
+#include <fcntl.h>
+#include <poll.h>
 #include <signal.h>
+
+#include <cerrno>
 #endif
 
 namespace quorrel::tool {
@@ -40,9 +44,39 @@ constexpr const char* kShellWords[] = {"new", "A", "E", "show", "list", "help", 
 #ifdef QUORREL_HAVE_LIBEDIT
 const Module* completionModule = nullptr;
 volatile sig_atomic_t interrupted = 0;
+// Ctrl-C reaches the key reader through a pipe as well as the flag: a signal that
+// arrives between two reads, when no read is there to interrupt, is not lost.
+int interruptPipe[2] = {-1, -1};
 
 void onInterrupt(int) {
   interrupted = 1;
+  const char byte = 0;
+  if (write(interruptPipe[1], &byte, 1) < 0) {
+    // The pipe is full: an interrupt is already waiting.
+  }
+}
+
+// The line editor's key reader: the next key, or end of input when Ctrl-C was pressed,
+// which makes the editor give up the line.
+int readKey(FILE*) {
+  for (;;) {
+    pollfd sources[2] = {{STDIN_FILENO, POLLIN, 0}, {interruptPipe[0], POLLIN, 0}};
+    if (poll(sources, 2, -1) < 0) {
+      if (errno == EINTR) continue;
+      return EOF;
+    }
+    if (sources[1].revents & POLLIN) {
+      char drained[16];
+      while (read(interruptPipe[0], drained, sizeof drained) > 0) {
+      }
+      return EOF;
+    }
+    unsigned char key;
+    const ssize_t count = read(STDIN_FILENO, &key, 1);
+    if (count == 1) return key;
+    if (count < 0 && errno == EINTR) continue;
+    return EOF;
+  }
 }
 
 // Candidates for the word being completed, by the line's first word.
@@ -105,6 +139,11 @@ class LineReader {
     }
     rl_basic_word_break_characters = " \t";
     rl_attempted_completion_function = complete;
+    if (pipe(interruptPipe) == 0) {
+      fcntl(interruptPipe[0], F_SETFL, O_NONBLOCK);
+      fcntl(interruptPipe[1], F_SETFL, O_NONBLOCK);
+      rl_getc_function = readKey;
+    }
     struct sigaction action {};
     action.sa_handler = onInterrupt;
     sigemptyset(&action.sa_mask);
