@@ -9,64 +9,32 @@
 #include <vector>
 
 #include "host/entry_points.h"
+#include "hostsim/host_simulator.h"
 
 namespace {
 
 static_assert(sizeof(void*) == 4, "this test runs in the 32-bit build");
 
 using quorrel::abi::HostWord;
-
 using quorrel::abi::readField;
 using quorrel::abi::writeField;
+using quorrel::hostsim::Instance;
+using quorrel::hostsim::SetupRecord;
 
-// The host side of one expression call: its parameters, the services' record of what
-// was fetched, and result buffers.
-struct FakeHost {
-  std::vector<HostWord> parameters;
-  std::vector<std::pair<int, int32_t>> fetches;  // service (1 first, 2 next), type flag
-  std::vector<std::vector<char>> buffers;
-  std::size_t nextParameter = 0;
-};
-FakeHost* host = nullptr;
-
-HostWord QUORREL_CALL fetchFirst(void*, int32_t typeFlag, HostWord) {
-  host->fetches.emplace_back(1, typeFlag);
-  host->nextParameter = 1;
-  return host->parameters.at(0);
-}
-HostWord QUORREL_CALL fetchNext(void*, int32_t typeFlag, HostWord) {
-  host->fetches.emplace_back(2, typeFlag);
-  return host->parameters.at(host->nextParameter++);
-}
-char* QUORREL_CALL allocateResult(void*, int32_t size, int32_t) {
-  host->buffers.emplace_back(static_cast<std::size_t>(size), '\x7F');
-  return host->buffers.back().data();
+const quorrel::hostsim::Module& module() {
+  static const auto loaded = quorrel::hostsim::Module::open(QUORREL_MODULE_PATH);
+  return *loaded;
 }
 
+// The routine tables and a RunInfo read by hand, next to the host simulator's instance.
 class Abi32 : public ::testing::Test {
  protected:
   void SetUp() override {
-    host = &fake;
-    // The run-time header: the services at bytes 876, 880 and 916.
-    writeField(runHeader.data(), 876, &fetchFirst);
-    writeField(runHeader.data(), 880, &fetchNext);
-    writeField(runHeader.data(), 916, &allocateResult);
-    writeField(runRecord.data(), 8, runHeader.data());
     GetRunObjectInfos(0, runInfo.data());
     std::memcpy(&actions, runInfo.data() + 4, 4);
     std::memcpy(&expressions, runInfo.data() + 8, 4);
   }
-  void TearDown() override { host = nullptr; }
 
-  HostWord expression(int code, std::vector<HostWord> parameters) {
-    fake.parameters = std::move(parameters);
-    fake.fetches.clear();
-    return expressions[code](runRecord.data(), 0x1234);
-  }
-
-  FakeHost fake;
-  std::vector<uint8_t> runHeader = std::vector<uint8_t>(920, 0);
-  std::vector<uint8_t> runRecord = std::vector<uint8_t>(192, 0xCD);
   std::vector<uint8_t> runInfo = std::vector<uint8_t>(64, 0xEE);
   const quorrel::abi::ActionRoutine* actions = nullptr;
   const quorrel::abi::ExpressionRoutine* expressions = nullptr;
@@ -103,43 +71,53 @@ TEST_F(Abi32, InfoEntriesAreTwelveBytesApart) {
 }
 
 TEST_F(Abi32, InstanceLivesInTheLastEightBytes) {
-  std::vector<uint8_t> setup(1076, 0);
-  put<int16_t>(setup, 20, 32);
-  put<int32_t>(setup, 24, 2);  // two dimensions
-  put<int32_t>(setup, 28, 3);  // X boundary 3
-  put<int32_t>(setup, 32, 9);  // Y boundary, not used in 2D
-  std::memcpy(setup.data() + 44, ";", 2);
-  put<int32_t>(setup, 1072, 1);
-  const std::vector<uint8_t> hostPart(runRecord.begin(), runRecord.begin() + 184);
+  SetupRecord setup;
+  setup.set(24, 2).set(28, 3).set(32, 9);  // two dimensions, X boundary 3, Y not used in 2D
+  setup.delimiter(";").set(1072, 1);       // automatic selection
+  Instance instance(module(), setup, false);
+  auto* runRecord = static_cast<uint8_t*>(instance.record());
+  std::memset(runRecord + 12, 0xCD, 172);  // host bytes the simulator leaves to the test
+  // The services sit at bytes 876, 880 and 916 of the run-time header at byte 8.
+  const auto* runHeader = readField<const uint8_t*>(runRecord, 8);
+  ASSERT_NE(readField<void*>(runHeader, 876), nullptr);
+  ASSERT_NE(readField<void*>(runHeader, 880), nullptr);
+  ASSERT_NE(readField<void*>(runHeader, 916), nullptr);
+  const std::vector<uint8_t> hostPart(runRecord, runRecord + 184);
 
-  ASSERT_EQ(CreateRunObject(runRecord.data(), setup.data(), 0), 0);
-  EXPECT_NE(readField<void*>(runRecord.data(), 184), nullptr);
-  EXPECT_EQ(readField<int32_t>(runRecord.data(), 188), 0);
-  EXPECT_EQ(std::vector<uint8_t>(runRecord.begin(), runRecord.begin() + 184), hostPart)
+  instance.create();
+  EXPECT_NE(readField<void*>(runRecord, 184), nullptr);
+  EXPECT_EQ(readField<int32_t>(runRecord, 188), 0);
+  EXPECT_EQ(std::vector<uint8_t>(runRecord, runRecord + 184), hostPart)
       << "the host's 184 bytes are not the extension's to write";
 
-  EXPECT_EQ(actions[8](runRecord.data(), reinterpret_cast<HostWord>("abc"), 0), 0);
-  EXPECT_EQ(actions[9](runRecord.data(), 12, 0), 0);
+  EXPECT_EQ(actions[8](runRecord, reinterpret_cast<HostWord>("abc"), 0), 0);
+  EXPECT_EQ(actions[9](runRecord, 12, 0), 0);
+  const auto expression = [&](int code, std::vector<quorrel::hostsim::Argument> args) {
+    HostWord answer = instance.callExpressionRaw(code, std::move(args), 0x1234);
+    for (const auto& fetch : instance.fetches) EXPECT_EQ(fetch.token, 0x1234);
+    return answer;
+  };
   EXPECT_EQ(expression(0, {}), 2);    // size(
   EXPECT_EQ(expression(26, {}), 2);   // dim(
   EXPECT_EQ(expression(28, {}), 3);   // boundaryX(
-  EXPECT_EQ(expression(3, {1}), 12);  // get( 1
-  EXPECT_EQ(fake.fetches, (std::vector<std::pair<int, int32_t>>{{1, 0}}));
+  EXPECT_EQ(expression(3, {1}), 12);  // get( 1, an integer through the first service
+  ASSERT_EQ(instance.fetches.size(), 1u);
+  EXPECT_TRUE(instance.fetches[0].first);
+  EXPECT_EQ(instance.fetches[0].typeFlag, 0);
 
   // indexOfXY(1, 1) with X boundary 3: integers through the first, then the next service.
   EXPECT_EQ(expression(39, {1, 1}), 4);
-  EXPECT_EQ(fake.fetches, (std::vector<std::pair<int, int32_t>>{{1, 0}, {2, 0}}));
+  ASSERT_EQ(instance.fetches.size(), 2u);
+  EXPECT_FALSE(instance.fetches[1].first);
+  EXPECT_EQ(instance.fetches[1].typeFlag, 0);
 
   // A text result: a host buffer of length + 1 bytes and bit 0x8000 of the word at 124.
-  put<uint16_t>(runRecord, 124, 0x0001);
+  writeField<uint16_t>(runRecord, 124, 0x0001);
   const HostWord text = expression(2, {0});  // get$( 0
-  ASSERT_EQ(fake.buffers.size(), 1u);
-  EXPECT_EQ(fake.buffers[0].size(), 4u);
-  EXPECT_EQ(reinterpret_cast<const char*>(text), fake.buffers[0].data());
-  EXPECT_EQ(std::string(fake.buffers[0].data()), "abc");
-  EXPECT_EQ(readField<uint16_t>(runRecord.data(), 124), 0x8001);
-
-  EXPECT_EQ(DestroyRunObject(runRecord.data(), 0), 0);
+  ASSERT_EQ(instance.allocations.size(), 1u);
+  EXPECT_EQ(instance.allocations[0].first, 4);
+  EXPECT_EQ(std::string(reinterpret_cast<const char*>(text)), "abc");
+  EXPECT_EQ(readField<uint16_t>(runRecord, 124), 0x8001);
 }
 
 }  // namespace
