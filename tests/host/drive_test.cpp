@@ -2,7 +2,6 @@
 // (twice) and on an instance whose array was never created.
 #include <cstdio>
 
-#include "param_types.h"
 #include "test_host.h"
 
 namespace testhost {
@@ -10,7 +9,7 @@ namespace {
 
 // Each expression fetches its declared parameters, in order, with the host's token.
 void expectFetchesDeclared(Instance& instance, int code) {
-  const char* types = kExpressionParams[code];
+  const std::string types = expressionParams(code);
   const std::size_t declared = (types[0] != '-') + (types[1] != '-');
   ASSERT_EQ(instance.fetches.size(), declared) << "expression " << code;
   for (std::size_t i = 0; i < declared; ++i) {
@@ -23,7 +22,7 @@ void expectFetchesDeclared(Instance& instance, int code) {
 
 void callEveryAction(Instance& t, const std::string& text) {
   for (int code = 0; code < 79; ++code) {
-    const char* types = kActionParams[code];
+    const std::string types = actionParams(code);
     EXPECT_EQ(
         t.action(code, types[0] == 'T' ? Arg(text) : Arg(1), types[1] == 'T' ? Arg(text) : Arg(1)),
         0)
@@ -43,7 +42,7 @@ TEST(DriveTest, EveryActionAndExpressionOnALiveInstance) {
     callEveryAction(t, path);
     for (int code = 0; code < 60; ++code) {
       t.setFlags(0);
-      const HostWord result = t.expression(code, argsFor(kExpressionParams[code], 0, "name"));
+      const HostWord result = t.expression(code, argsFor(expressionParams(code), 0, "name"));
       expectFetchesDeclared(t, code);
       if (t.flags() == kResultIsString) {
         ASSERT_EQ(t.allocations.size(), 1u) << "expression " << code;
@@ -64,7 +63,7 @@ TEST(DriveTest, WithoutAnArrayActionsDoNothingAndExpressionsAnswerZero) {
   callEveryAction(instance, "nothing");
   for (int code = 0; code < 60; ++code) {
     instance.setFlags(0x0101);
-    EXPECT_EQ(instance.expression(code, argsFor(kExpressionParams[code], 1, "x")), 0) << code;
+    EXPECT_EQ(instance.expression(code, argsFor(expressionParams(code), 1, "x")), 0) << code;
     EXPECT_EQ(instance.flags(), 0x0101);
     EXPECT_TRUE(instance.allocations.empty());
     expectFetchesDeclared(instance, code);

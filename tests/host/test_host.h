@@ -50,6 +50,24 @@ Fn entry(const char* name) {
   return module().entry<Fn>(name);
 }
 
+// A code's declared parameter types as letters, from its information entry (the
+// names_list case pins them): T text, N number (actions) or I integer (expressions),
+// '-' none.
+inline std::string parameterLetters(const quorrel::hostsim::Signature& signature) {
+  std::string letters = "--";
+  for (int i = 0; i < signature.paramCount; ++i) {
+    const uint16_t type = signature.paramTypes[i];
+    letters[i] = type == 45 || type == 3 ? 'T' : type == 22 ? 'N' : type == 1 ? 'I' : '?';
+  }
+  return letters;
+}
+inline std::string actionParams(int code) {
+  return parameterLetters(module().actionSignature(code));
+}
+inline std::string expressionParams(int code) {
+  return parameterLetters(module().expressionSignature(code));
+}
+
 inline SetupRecord oneD() {
   return SetupRecord().set(kSetupDimensionCount, 1);
 }
@@ -108,7 +126,7 @@ class Instance : public quorrel::hostsim::Instance {
 };
 
 // Arguments for an expression's declared parameter types.
-inline std::vector<Arg> argsFor(const char* types, int32_t number, const char* text) {
+inline std::vector<Arg> argsFor(const std::string& types, int32_t number, const char* text) {
   std::vector<Arg> args;
   for (int i = 0; i < 2; ++i) {
     if (types[i] == 'I') args.emplace_back(number);
