@@ -2,11 +2,14 @@
 """The interactive shell through a pseudo-terminal: help, completion, Ctrl-C, history
 across two sessions, quitting. Usage: shell_pty.py QUORREL. Exit 77 (skipped) when
 the system has no pseudo-terminals or the shell was built without line editing."""
+import fcntl
 import os
 import signal
 import select
+import struct
 import sys
 import tempfile
+import termios
 import time
 
 try:
@@ -36,9 +39,10 @@ class Shell:
         if self.pid == 0:
             # As from a login terminal, whatever the test runner blocked or ignored.
             signal.pthread_sigmask(signal.SIG_SETMASK, [])
-            for number in (signal.SIGINT, signal.SIGTSTP, signal.SIGTTIN, signal.SIGTTOU):
-                signal.signal(number, signal.SIG_DFL)
+            signal.signal(signal.SIGINT, signal.SIG_DFL)
             os.execve(QUORREL, [QUORREL, "shell"], env)
+        # A terminal of a real size: a runner's pseudo-terminal starts at 0 x 0.
+        fcntl.ioctl(self.fd, termios.TIOCSWINSZ, struct.pack("HHHH", 24, 80, 0, 0))
         self.seen = b""
 
     def expect(self, text, what, timeout=5.0):
@@ -59,6 +63,17 @@ class Shell:
 
     def send(self, keys):
         os.write(self.fd, keys.encode())
+
+    def send_control(self, key, what):
+        """Sends Ctrl-C or Ctrl-D once the line editor holds the terminal. Between two
+        lines the terminal is in canonical mode, where its line discipline takes such
+        keys itself; the editor's own mode shows on the master side too."""
+        deadline = time.time() + 5
+        while termios.tcgetattr(self.fd)[3] & termios.ICANON:
+            if time.time() > deadline:
+                fail(f"{what}: the line editor never took the terminal")
+            time.sleep(0.01)
+        self.send(key)
 
     def finish(self, what):
         """Waits for the shell to end and checks its exit status is 0."""
@@ -94,7 +109,7 @@ with tempfile.TemporaryDirectory() as home:
     # Ctrl-C abandons the half-typed line; the shell goes on.
     shell.send("A appendString")
     shell.expect("appendString", "echo before Ctrl-C")
-    shell.send("\x03")
+    shell.send_control("\x03", "Ctrl-C")
     shell.expect("quorrel> ", "prompt after Ctrl-C")
     shell.send("E size(\r")
     shell.expect("1\r\n", "line after Ctrl-C")
@@ -112,10 +127,8 @@ with tempfile.TemporaryDirectory() as home:
     shell.send("\x1b[A\x1b[A\x1b[A\r")
     shell.expect("E size(", "recalled line")
     shell.expect("0\r\n", "recalled line's result in a fresh instance")
-    # Only at the prompt is the terminal in the line editor's hands: a Ctrl-D typed
-    # before then meets the terminal's own line discipline and can be lost.
     shell.expect("quorrel> ", "prompt before Ctrl-D")
-    shell.send("\x04")
+    shell.send_control("\x04", "Ctrl-D")
     shell.finish("Ctrl-D")
 
 if failures:

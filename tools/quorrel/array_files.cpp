@@ -3,6 +3,9 @@
 #include <cctype>
 #include <cstring>
 
+#include "array/element_array.h"
+#include "io/native_file.h"
+
 namespace quorrel::tool {
 namespace {
 
@@ -43,30 +46,6 @@ std::string_view firstMeaningfulLine(std::string_view text) {
   return {};
 }
 
-// Walks the records of a native file; a file that ends early ends the walk.
-class NativeReader {
- public:
-  explicit NativeReader(std::string_view bytes) : bytes_(bytes) {}
-
-  template <typename T>
-  T read() {
-    T value{};
-    if (pos_ + sizeof value <= bytes_.size())
-      std::memcpy(&value, bytes_.data() + pos_, sizeof value);
-    pos_ += sizeof value;
-    return value;
-  }
-  void skip(int64_t count) {
-    if (count > 0) pos_ += static_cast<size_t>(count);
-  }
-  void skipData(uint16_t type, int32_t size) { skip(type == 1 ? 4 : size); }
-  bool atEnd() const { return pos_ >= bytes_.size(); }
-
- private:
-  std::string_view bytes_;
-  size_t pos_ = 0;
-};
-
 }  // namespace
 
 const FormatInfo& formatInfo(ArrayFormat format) {
@@ -95,23 +74,16 @@ ArrayFormat formatOfOutputPath(std::string_view path) {
   return ArrayFormat::Native;
 }
 
-std::vector<ElementTypes> readNativeElementTypes(std::string_view bytes) {
-  NativeReader reader(bytes);
-  reader.skip(8 + 2);
-  const auto dimensions = reader.read<int32_t>();
-  if (dimensions > 0) reader.skip(4 * int64_t{dimensions});
-  const auto labelCount = reader.read<int32_t>();
-  for (int32_t i = 0; i < labelCount && !reader.atEnd(); ++i) reader.skip(reader.read<int32_t>());
-  const auto elementCount = reader.read<int32_t>();
+std::vector<ElementTypes> readNativeElementTypes(const std::string& path) {
+  // The module's own reader, linked in: no expression tells an element's type.
+  ElementArray array;
+  loadNativeFile(array, path.c_str(), 0);
   std::vector<ElementTypes> types;
-  for (int32_t i = 0; i < elementCount && !reader.atEnd(); ++i) {
-    ElementTypes element;
-    element.type = reader.read<uint16_t>();
-    element.size = reader.read<int32_t>();
-    reader.skipData(element.type, element.size);
-    element.keyType = reader.read<uint16_t>();
-    reader.skipData(element.keyType, reader.read<int32_t>());
-    types.push_back(element);
+  for (int32_t i = 0; i < array.size(); ++i) {
+    const Element& element = array.at(i);
+    const Element* key = element.key();
+    types.push_back({static_cast<uint16_t>(element.type()), element.size(),
+                     static_cast<uint16_t>(key ? key->type() : ElementType::None)});
   }
   return types;
 }

@@ -31,13 +31,14 @@ std::optional<ArrayFormat> recogniseFormat(std::string_view bytes);
 // The output format that a file name implies: .csv, .ini, anything else native.
 ArrayFormat formatOfOutputPath(std::string_view path);
 
-// Type codes of each element and its key, read from a native array file.
+// Type codes of each element and its key.
 struct ElementTypes {
   uint16_t type = 0;
   int32_t size = 0;
   uint16_t keyType = 0;
 };
-std::vector<ElementTypes> readNativeElementTypes(std::string_view bytes);
+// The types of every element and key of a native array file.
+std::vector<ElementTypes> readNativeElementTypes(const std::string& path);
 
 const char* elementTypeName(uint16_t type);
 

@@ -90,7 +90,7 @@ std::vector<ElementTypes> snapshotTypes(Instance& instance) {
   try {
     const TempFile snapshot;
     instance.callAction(formatInfo(ArrayFormat::Native).saveAction, {text(snapshot.path())});
-    return readNativeElementTypes(readWholeFile(snapshot.path()));
+    return readNativeElementTypes(snapshot.path());
   } catch (const FileError&) {
     return {};
   }

@@ -56,8 +56,14 @@ void onInterrupt(int) {
   }
 }
 
-// The line editor's key reader: the next key, or end of input when Ctrl-C was pressed,
-// which makes the editor give up the line.
+void drainInterrupts() {
+  char drained[16];
+  while (read(interruptPipe[0], drained, sizeof drained) > 0) {
+  }
+}
+
+// The line editor's key reader: the next key, or Enter when Ctrl-C was pressed, which
+// ends the line being typed; the shell then drops it.
 int readKey(FILE*) {
   for (;;) {
     pollfd sources[2] = {{STDIN_FILENO, POLLIN, 0}, {interruptPipe[0], POLLIN, 0}};
@@ -66,10 +72,8 @@ int readKey(FILE*) {
       return EOF;
     }
     if (sources[1].revents & POLLIN) {
-      char drained[16];
-      while (read(interruptPipe[0], drained, sizeof drained) > 0) {
-      }
-      return EOF;
+      drainInterrupts();
+      return '\r';
     }
     unsigned char key;
     const ssize_t count = read(STDIN_FILENO, &key, 1);
@@ -143,6 +147,7 @@ class LineReader {
       fcntl(interruptPipe[0], F_SETFL, O_NONBLOCK);
       fcntl(interruptPipe[1], F_SETFL, O_NONBLOCK);
       rl_getc_function = readKey;
+      rl_catch_signals = 0;  // the handler above sees Ctrl-C first, not the editor
     }
     struct sigaction action {};
     action.sa_handler = onInterrupt;
@@ -171,13 +176,15 @@ class LineReader {
   std::optional<std::string> next() {
 #ifdef QUORREL_HAVE_LIBEDIT
     while (interactive_) {
+      // A Ctrl-C pressed while a command ran is not meant for the next line.
+      if (interruptPipe[0] >= 0) drainInterrupts();
       interrupted = 0;
       char* raw = readline(kPrompt);
-      if (!raw) {
-        if (!interrupted) return std::nullopt;
-        std::cout << "^C\n" << std::flush;
+      if (interrupted) {
+        std::free(raw);
         continue;
       }
+      if (!raw) return std::nullopt;
       std::string line = raw;
       std::free(raw);
       if (line.find_first_not_of(" \t") != std::string::npos) add_history(line.c_str());
