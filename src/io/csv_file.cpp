@@ -87,9 +87,9 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
     // The last row is padded to X cells; past the array's cap (X = 2147483647, say)
     // that is gigabytes of empty cells, so such a file is not written at all.
     if (rows * columns > ElementArray::kMaxSize) return;
-    FileHandle file = FileHandle::openForWriting(path, mode);
+    SaveFile file(path, mode);
     if (!file.isOpen()) return;
-    BufferedWriter out(file);
+    BufferedWriter out(file.handle());
     const std::span<const Element> cells = std::as_const(array).slots();
     NumberText scratch;
     for (int64_t r = 0; r < rows; ++r) {
@@ -100,21 +100,23 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
       }
       out.text(kLineEnd);
     }
+    file.finish(out.complete());
   } catch (const std::bad_alloc&) {
   }
 }
 
 void writeCsvFile(const char* path, const CsvTable& table, uint16_t fileMode) {
   try {
-    FileHandle file = FileHandle::openForWriting(path, fileMode);
+    SaveFile file(path, fileMode);
     if (!file.isOpen()) return;
-    BufferedWriter out(file);
+    BufferedWriter out(file.handle());
     for (const CsvRow& row : table.rows) {
       for (int32_t j = 0; j < row.cellCount(); ++j) {
         writeCell(out, j, row.cells[static_cast<std::size_t>(j)]);
       }
       out.text(kLineEnd);
     }
+    file.finish(out.complete());
   } catch (const std::bad_alloc&) {
   }
 }
