@@ -1,6 +1,7 @@
 #include "array/element_array.h"
 
 #include <algorithm>
+#include <iterator>
 
 #include "array/int32.h"
 #include "array/text.h"
@@ -115,6 +116,44 @@ void ElementArray::clear() {
   elements_.clear();
   capacity_ = kInitialCapacity;
   syncRowStates();
+}
+
+// --- All or nothing --------------------------------------------------------------------
+
+ElementArray ElementArray::emptyCopy() const {
+  ElementArray copy;
+  copy.caseMode = caseMode;
+  copy.searchMode = searchMode;
+  copy.fileMode = fileMode;
+  copy.selectionMode = selectionMode;
+  copy.autoSelectNewRows = autoSelectNewRows;
+  copy.labels = labels;
+  copy.dimensions_ = dimensions_;
+  std::copy(std::begin(boundaries_), std::end(boundaries_), copy.boundaries_);
+  copy.delimiterText_ = delimiterText_;
+  copy.syncRowStates();
+  return copy;
+}
+
+ElementArray::Mark ElementArray::mark() const {
+  Mark m;
+  m.size = size();
+  m.capacity = capacity_;
+  m.dimensions = dimensions_;
+  std::copy(std::begin(boundaries_), std::end(boundaries_), m.boundaries);
+  m.labels = labels;
+  m.rowStates = rowStates;
+  return m;
+}
+
+void ElementArray::rollBack(Mark& m) noexcept {
+  elements_.truncate(static_cast<std::size_t>(m.size));
+  capacity_ = m.capacity;
+  dimensions_ = m.dimensions;
+  std::copy(std::begin(m.boundaries), std::end(m.boundaries), boundaries_);
+  labels.swap(m.labels);
+  rowStates.swap(m.rowStates);
+  refreshAppendRange();
 }
 
 // --- Settings ------------------------------------------------------------------------

@@ -105,6 +105,23 @@ class ElementArray {
   void deleteAt(int32_t index);
   void clear();
 
+  // --- All or nothing ------------------------------------------------------------------
+  // The array as clear() leaves it, with the same settings, dimensions and labels: a
+  // replacing load fills it and is swapped in only once it is complete.
+  ElementArray emptyCopy() const;
+  // What appending to the end can change, kept so that an append that fails part-way
+  // can be undone: elements past the mark are dropped and the rest is restored.
+  struct Mark {
+    int32_t size = 0;
+    int32_t capacity = 0;
+    int32_t dimensions = 0;
+    int32_t boundaries[kBoundaryCount] = {};
+    std::optional<LabelList> labels;
+    std::vector<uint8_t> rowStates;
+  };
+  Mark mark() const;
+  void rollBack(Mark& mark) noexcept;
+
   // --- Settings ----------------------------------------------------------------------
   void setListDelimiter(const char* text);
   const char* listDelimiter() const { return delimiterText_.c_str(); }

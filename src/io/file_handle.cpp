@@ -1,8 +1,11 @@
 #include "io/file_handle.h"
 
+#include "array/allocation.h"
+
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
+#include <new>
 #include <utility>
 
 #include <fcntl.h>
@@ -363,12 +366,12 @@ char* allocateFresh(std::size_t capacity) {
   if (capacity >= 4 * kHugePage) {
     void* p = nullptr;
     const std::size_t rounded = (capacity + kHugePage - 1) / kHugePage * kHugePage;
-    if (posix_memalign(&p, kHugePage, rounded) != 0) return nullptr;
+    if (allocationRefused() || posix_memalign(&p, kHugePage, rounded) != 0) return nullptr;
     madvise(p, rounded, MADV_HUGEPAGE);
     return static_cast<char*>(p);
   }
 #endif
-  return static_cast<char*>(std::malloc(capacity));
+  return static_cast<char*>(allocateBytes(capacity));
 }
 
 }  // namespace
@@ -382,7 +385,7 @@ bool ByteBuffer::reserve(std::size_t capacity) {
     capacity_ = capacity;
     return true;
   }
-  char* grown = static_cast<char*>(std::realloc(data_.get(), capacity));
+  char* grown = static_cast<char*>(reallocateBytes(data_.get(), capacity));
   if (grown == nullptr) return false;
   (void)data_.release();
   data_.reset(grown);
@@ -390,31 +393,32 @@ bool ByteBuffer::reserve(std::size_t capacity) {
   return true;
 }
 
-void readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare) {
+bool readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare) {
   constexpr std::size_t kMinChunk = 4096;
   // A regular file's size is known: room for all of it plus one read that finds the end.
   const std::size_t hint = std::min(file.sizeHint(), limit);
-  if (!buffer.reserve(buffer.size() + hint + spare + kMinChunk)) return;
+  if (!buffer.reserve(buffer.size() + hint + spare + kMinChunk)) return false;
   while (buffer.size() < limit) {
     std::size_t room = buffer.capacity() - buffer.size() - spare;
     if (room < kMinChunk) {
       const std::size_t wanted =
           std::min(std::max(buffer.capacity() * 2, buffer.capacity() + kMinChunk), limit + spare);
-      if (!buffer.reserve(wanted)) return;
+      if (!buffer.reserve(wanted)) return false;
       room = buffer.capacity() - buffer.size() - spare;
     }
     room = std::min(room, limit - buffer.size());
     const std::ptrdiff_t got = file.read(buffer.data() + buffer.size(), room);
-    if (got <= 0) return;
+    if (got <= 0) return true;
     buffer.setSize(buffer.size() + static_cast<std::size_t>(got));
   }
+  return true;
 }
 
 std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare) {
   FileHandle file = FileHandle::openForReading(path);
   if (!file.isOpen()) return std::nullopt;
   ByteBuffer buffer;
-  readToEnd(file, buffer, kMaxFileBytes, spare);
+  if (!readToEnd(file, buffer, kMaxFileBytes, spare)) throw std::bad_alloc();
   return buffer;
 }
 

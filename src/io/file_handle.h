@@ -108,14 +108,16 @@ class ByteBuffer {
 
 // Reads from the handle's position to the end of the file (or a read error, or
 // `limit` bytes) into the buffer, keeping `spare` writable bytes past the data.
-// Growth is geometric. What was read before an error or a failed allocation stays.
-void readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare);
+// Growth is geometric. What was read before an error stays; false when the buffer
+// could not grow (the file was not read to its end).
+bool readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare);
 
 // The largest file a reader takes in: what a block length can count.
 inline constexpr std::size_t kMaxFileBytes = INT32_MAX;
 
 // Opens the file read only, reads all of it (up to kMaxFileBytes) and closes it;
-// `spare` writable bytes stay past the data. Nothing when the file cannot be opened.
+// `spare` writable bytes stay past the data. Nothing when the file cannot be opened;
+// throws std::bad_alloc when memory runs out, so that no load takes half a file.
 std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare);
 
 // Collects output in large blocks so a file is written in few system calls; flushes

@@ -210,10 +210,11 @@ void loadHostArrayFile(ElementArray& array, const char* path, int32_t append) {
   const bool replace = append == 0;
   try {
     const std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
-    if (replace) array.clear();
-    LoadSink sink{array, replace};
-    if (bytes) parseHost(bytes->view(), sink);
-    if (replace && !sink.headerSeen) array.setDimensions(0);
+    io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
+      LoadSink sink{target, replace};
+      if (bytes) parseHost(bytes->view(), sink);
+      if (replace && !sink.headerSeen) target.setDimensions(0);
+    });
   } catch (const std::bad_alloc&) {
   }
 }

@@ -154,12 +154,13 @@ std::optional<IniDocument> readIniFile(const char* path) {
 void loadIniFile(ElementArray& array, const char* path, int32_t append) {
   try {
     std::optional<ByteBuffer> text = readTextFile(path);
-    if (append == 0) array.clear();
-    if (!text) return;
-    io_detail::AppendRun run(array);
-    LoadSink sink{run};
-    parseIni(text->data(), text->size(), sink);
-    run.flush();
+    io_detail::loadAllOrNothing(array, append == 0, [&](ElementArray& target) {
+      if (!text) return;
+      io_detail::AppendRun run(target);
+      LoadSink sink{run};
+      parseIni(text->data(), text->size(), sink);
+      run.flush();
+    });
   } catch (const std::bad_alloc&) {
   }
 }

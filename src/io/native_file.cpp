@@ -288,14 +288,15 @@ void loadNativeFile(ElementArray& array, const char* path, int32_t append) {
   const bool replace = append == 0;
   try {
     const std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
-    if (replace) array.clear();
-    LoadSink sink{array, replace};
-    if (bytes) parseNative(bytes->view(), sink);
-    sink.run.flush();
-    if (replace && !sink.headerSeen) array.setDimensions(0);
-    for (const auto& [column, text] : sink.pendingLabels) {
-      io_detail::applyLabel(array, text, column);
-    }
+    io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
+      LoadSink sink{target, replace};
+      if (bytes) parseNative(bytes->view(), sink);
+      sink.run.flush();
+      if (replace && !sink.headerSeen) target.setDimensions(0);
+      for (const auto& [column, text] : sink.pendingLabels) {
+        io_detail::applyLabel(target, text, column);
+      }
+    });
   } catch (const std::bad_alloc&) {
   }
 }
