@@ -121,6 +121,20 @@ class ElementArray {
   };
   Mark mark() const;
   void rollBack(Mark& mark) noexcept;
+  // The lighter mark of a run of inserts at one index, which changes no setting.
+  struct EditMark {
+    int32_t size = 0;
+    int32_t capacity = 0;
+    std::size_t rows = 0;
+  };
+  EditMark editMark() const { return {size(), capacity_, rowStates.size()}; }
+  // Removes what the inserts at `index` since the mark added (at or past the marked
+  // size: everything past it, the empty elements of a growth included).
+  void undoInserts(const EditMark& mark, int32_t index) noexcept;
+  // Moves the elements of `fresh` over those from index on (all in range), leaving
+  // the array as that many setElement calls would, without allocating: the caller
+  // makes every element first, so that a failure changes nothing.
+  void replaceElements(int32_t index, std::span<Element> fresh) noexcept;
 
   // --- Settings ----------------------------------------------------------------------
   void setListDelimiter(const char* text);
@@ -168,6 +182,9 @@ class ElementArray {
   // The capacity that `count` single appends reach from the current state.
   int32_t capacityAfterAppends(int64_t count) const;
   void resizeRowStates(int32_t keep);
+  // Room for the row states of `size` elements under the given dimension count and X
+  // boundary, taken before a change so that syncRowStates cannot fail after it.
+  void reserveRowStates(int64_t size, int32_t dimensions, int32_t columns);
 
   // Sizes from which an append neither changes the capacity nor adds a table row, so
   // that it only stores: kept up to date by every operation that changes the capacity

@@ -125,7 +125,13 @@ void insertRowFromList(ElementArray& array, const char* list, int32_t n) {
   if (int64_t{array.size()} + columns > ElementArray::kMaxSize) return;
   const std::vector<std::string> fields = splitFields(array, list, columns);
   const int32_t base = visibleCellIndex(array, n, 0);
-  for (int32_t i = 0; i < columns; ++i) array.insertString(fieldText(fields, i), base + i);
+  const ElementArray::EditMark mark = array.editMark();
+  try {
+    for (int32_t i = 0; i < columns; ++i) array.insertString(fieldText(fields, i), base + i);
+  } catch (...) {
+    array.undoInserts(mark, base);
+    throw;
+  }
 }
 
 void appendRowFromList(ElementArray& array, const char* list) {
@@ -138,7 +144,27 @@ void replaceRowWithList(ElementArray& array, const char* list, int32_t n) {
   const std::vector<std::string> fields = splitFields(array, list, columns);
   const int32_t base = visibleCellIndex(array, n, 0);
   if (int64_t{base} + columns > ElementArray::kMaxSize) return;  // as for inserts
-  for (int32_t i = 0; i < columns; ++i) array.setString(fieldText(fields, i), base + i);
+  if (base < 0 || base > array.size() - columns) {
+    // Only a row number out of range lands past the end: the cells are set one by one,
+    // growing the array, and a failure takes the growth back.
+    const ElementArray::EditMark mark = array.editMark();
+    try {
+      for (int32_t i = 0; i < columns; ++i) array.setString(fieldText(fields, i), base + i);
+    } catch (...) {
+      array.undoInserts(mark, std::max(base, mark.size));
+      throw;
+    }
+    return;
+  }
+  // A complete table row: its new cells, keys kept, are made before any cell changes.
+  std::vector<Element> fresh;
+  fresh.reserve(static_cast<std::size_t>(columns));
+  for (int32_t i = 0; i < columns; ++i) {
+    const Element& old = array.at(base + i);
+    const ElementValue value = ElementValue::ofText(fieldText(fields, i));
+    fresh.push_back(old.hasKey() ? Element::keyed(value, old.key()->view()) : Element::of(value));
+  }
+  array.replaceElements(base, fresh);
 }
 
 void deleteRow(ElementArray& array, int32_t n) {
