@@ -171,11 +171,14 @@ void ElementArray::undoInserts(const EditMark& m, int32_t index) noexcept {
   refreshAppendRange();
 }
 
-void ElementArray::replaceElements(int32_t index, std::span<Element> fresh) noexcept {
-  for (std::size_t i = 0; i < fresh.size(); ++i) {
-    at(index + static_cast<int32_t>(i)) = std::move(fresh[i]);
+void ElementArray::swapElements(int32_t index, std::span<Element> other) noexcept {
+  for (std::size_t i = 0; i < other.size(); ++i) {
+    std::swap(at(index + static_cast<int32_t>(i)), other[i]);
   }
-  if (!fresh.empty()) capacity_ = rebalancedCapacity(capacity_, size(), size());
+}
+
+void ElementArray::rebalanceCapacity() noexcept {
+  capacity_ = rebalancedCapacity(capacity_, size(), size());
   refreshAppendRange();
 }
 

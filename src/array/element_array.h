@@ -131,10 +131,11 @@ class ElementArray {
   // Removes what the inserts at `index` since the mark added (at or past the marked
   // size: everything past it, the empty elements of a growth included).
   void undoInserts(const EditMark& mark, int32_t index) noexcept;
-  // Moves the elements of `fresh` over those from index on (all in range), leaving
-  // the array as that many setElement calls would, without allocating: the caller
-  // makes every element first, so that a failure changes nothing.
-  void replaceElements(int32_t index, std::span<Element> fresh) noexcept;
+  // Exchanges the elements from index on (all in range) with those of `other`, without
+  // allocating: a caller makes every new element first and can swap them back.
+  void swapElements(int32_t index, std::span<Element> other) noexcept;
+  // What an edit that keeps the size does to the capacity (setElement in range).
+  void rebalanceCapacity() noexcept;
 
   // --- Settings ----------------------------------------------------------------------
   void setListDelimiter(const char* text);
