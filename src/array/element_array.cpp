@@ -377,7 +377,10 @@ void ElementArray::refreshAppendRange() {
 
 void ElementArray::reserveRowStates(int64_t size, int32_t dimensions, int32_t columns) {
   if (dimensions != 2 || columns <= 0) return;
-  rowStates.reserve(static_cast<std::size_t>(size / columns));
+  const auto rows = static_cast<std::size_t>(size / columns);
+  // Geometric, as resize would grow it: a reserve of the exact count on every append
+  // would copy the states every time.
+  if (rows > rowStates.capacity()) rowStates.reserve(std::max(rows, rowStates.capacity() * 2));
 }
 
 void ElementArray::resizeRowStates(int32_t keep) {
