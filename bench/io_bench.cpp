@@ -119,6 +119,33 @@ void registerIoScenarios() {
   addFormat("CSV file (bytes)", scaled(100'000'000), fillCsvTable, saveCsvFile, loadCsvFile);
   addFormat("INI file", scaled(1'000'000), fillTexts, saveIniFile, loadIniFile);
 
+  // What a save's durability costs: the native file's bytes written as every whole-file
+  // save writes them (a temporary file, flushed to the disk, renamed over the target)
+  // against one plain fwrite of the same bytes. The saves above include this cost.
+  {
+    const std::string target = scratchPath("durable.out");
+    const std::string plain = scratchPath("durable.copy");
+    const auto fileBytes = [] {
+      ElementArray array;
+      fillMixed(array, scaled(1'000'000));
+      const std::string path = scratchPath("durable.src");
+      saveNativeFile(array, path.c_str(), 0);
+      return std::vector<char>(static_cast<std::size_t>(fileSize(path)), 'd');
+    };
+    add({"flushed replace (native file)", scaled(1'000'000), 1, 2.0,
+         [=](benchmark::State& state) {
+           const std::vector<char> bytes = fileBytes();
+           for (auto _ : state) {
+             SaveFile file(target.c_str(), FileModeTruncate);
+             file.finish(file.handle().writeAll(bytes.data(), bytes.size()));
+           }
+         },
+         [=](benchmark::State& state) {
+           const std::vector<char> bytes = fileBytes();
+           for (auto _ : state) writeBytes(plain, bytes);
+         }});
+  }
+
   const int64_t bytes = scaled(100'000'000);
   const std::string path = scratchPath("whole.bin");
   add({"readWholeFile (bytes)", bytes, 1, 2.0,

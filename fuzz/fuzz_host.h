@@ -130,6 +130,42 @@ inline bool tracing() {
   return on;
 }
 
+// Told about every call into the module and every call back out of it, so that
+// allocation-failure runs (alloc_faults.cpp) count only the module's allocations and
+// can compare the array around the call that fails. Null in the fuzz programs.
+struct CallObserver {
+  virtual ~CallObserver() = default;
+  virtual void enter(const ElementArray* array) = 0;
+  virtual void leave(const ElementArray* array, int code) = 0;  // -1: not a routine
+  virtual void enterHost() = 0;
+  virtual void leaveHost() = 0;
+};
+inline CallObserver* callObserver = nullptr;
+
+// Brackets one call into the module (or, with host true, one service of the host).
+class ObservedCall {
+ public:
+  ObservedCall(const ElementArray* array, bool host = false) : host_(host) {
+    if (callObserver == nullptr) return;
+    if (host_) {
+      callObserver->enterHost();
+    } else {
+      callObserver->enter(array);
+    }
+  }
+  ~ObservedCall() {
+    if (callObserver != nullptr && host_) callObserver->leaveHost();
+  }
+  void leave(const ElementArray* array, int code) {
+    if (callObserver != nullptr && !host_) callObserver->leave(array, code);
+  }
+  ObservedCall(const ObservedCall&) = delete;
+  ObservedCall& operator=(const ObservedCall&) = delete;
+
+ private:
+  bool host_;
+};
+
 // One run-time instance with its record and fake run-time header.
 class FuzzInstance {
  public:
@@ -147,10 +183,16 @@ class FuzzInstance {
     host::writeField<abi::AllocateResultStringService>(header_.data(), abi::kAllocateResultString,
                                                        &allocate);
     std::vector<unsigned char> setup = setupRecord;
+    ObservedCall call(nullptr);
     CreateRunObject(record_.data(), setup.data(), 0);
+    call.leave(array(), -1);
     check();
   }
-  ~FuzzInstance() { DestroyRunObject(record_.data(), 0); }
+  ~FuzzInstance() {
+    ObservedCall call(array());
+    DestroyRunObject(record_.data(), 0);
+    call.leave(nullptr, -1);
+  }
   FuzzInstance(const FuzzInstance&) = delete;
   FuzzInstance& operator=(const FuzzInstance&) = delete;
 
@@ -161,7 +203,9 @@ class FuzzInstance {
       std::fprintf(stderr, "A %d %s %s (size %d)\n", code, p1.describe().c_str(),
                    p2.describe().c_str(), array() ? array()->size() : -1);
     }
+    ObservedCall call(array());
     ModuleTables::get().actions[code](record_.data(), p1.word(), p2.word());
+    call.leave(array(), code);
     check();
   }
 
@@ -173,7 +217,9 @@ class FuzzInstance {
     next_ = 0;
     buffers_.clear();
     host::writeField<uint16_t>(record_.data(), abi::kRunHostFlags, flagsBefore);
+    ObservedCall call(array());
     const HostWord result = ModuleTables::get().expressions[code](record_.data(), 0x5EED);
+    call.leave(array(), 100 + code);
     const auto flags = host::readField<uint16_t>(record_.data(), abi::kRunHostFlags);
     // Only the string bit may change, and only from clear to set.
     if ((flags & ~abi::kResultIsString) != (flagsBefore & ~abi::kResultIsString)) {
@@ -203,15 +249,18 @@ class FuzzInstance {
 
   static FuzzInstance* owner(void* record) { return host::readField<FuzzInstance*>(record, 0); }
   static HostWord QUORREL_CALL fetchFirst(void* record, int32_t flag, HostWord token) {
+    ObservedCall host(nullptr, true);
     FuzzInstance* self = owner(record);
     self->next_ = 0;
     return self->fetch(flag, token);
   }
   static HostWord QUORREL_CALL fetchNext(void* record, int32_t flag, HostWord token) {
+    ObservedCall host(nullptr, true);
     return owner(record)->fetch(flag, token);
   }
   // Exactly the requested size, so that the sanitizer sees any write past it.
   static char* QUORREL_CALL allocate(void* record, int32_t count, int32_t reserved) {
+    ObservedCall host(nullptr, true);
     FuzzInstance* self = owner(record);
     if (reserved != 0 || count <= 0) __builtin_trap();
     self->buffers_.push_back(std::make_unique<std::vector<char>>(static_cast<size_t>(count), 0x7f));

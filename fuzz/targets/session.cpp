@@ -31,7 +31,11 @@ using quorrel::FuzzInput;
 using namespace quorrel::fuzz;
 namespace abi = quorrel::abi;
 
-constexpr int kMaxSteps = 300;
+// Allocation-failure runs build this target with a longer session.
+#ifndef QUORREL_SESSION_STEPS
+#define QUORREL_SESSION_STEPS 300
+#endif
+constexpr int kMaxSteps = QUORREL_SESSION_STEPS;
 constexpr uintmax_t kMaxFolderBytes = 256 << 10;
 constexpr int32_t kMaxElements = 65536;
 

@@ -1,5 +1,7 @@
 #include "array/element.h"
 
+#include "array/allocation.h"
+
 #include <cstdlib>
 #include <new>
 #include <utility>
@@ -56,7 +58,7 @@ char* RecordSlab::take(std::size_t bytes, uint16_t& units) {
   if (bytes > kLargestRecord) return nullptr;
   if (block_ == nullptr || used_ + bytes > kBlockBytes) {
     releaseBlock();
-    block_ = static_cast<char*>(std::malloc(kBlockBytes));
+    block_ = static_cast<char*>(allocateBytes(kBlockBytes));
     if (block_ == nullptr) return nullptr;
     new (block_) SlabHeader{1};
     used_ = roundUp8(sizeof(SlabHeader));
@@ -94,7 +96,7 @@ Element::Record* Element::makeRecord(const ElementValue& value, bool keySlot, Re
   if (base != nullptr) {
     flags |= static_cast<uint16_t>(kInSlab | units << kSlabShift);
   } else {
-    base = static_cast<char*>(std::malloc(total));
+    base = static_cast<char*>(allocateBytes(total));
     if (base == nullptr) throw std::bad_alloc();
   }
   if (keySlot) new (base) Element();

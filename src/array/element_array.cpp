@@ -1,6 +1,7 @@
 #include "array/element_array.h"
 
 #include <algorithm>
+#include <iterator>
 
 #include "array/int32.h"
 #include "array/text.h"
@@ -64,6 +65,7 @@ void ElementArray::setAt(const ElementValue& value, int32_t index) {
     Element fresh;
     fresh.assign(value);
     int32_t newCapacity = rebalancedCapacity(capacity_, size(), int64_t{index} + 1);
+    reserveRowStates(int64_t{index} + 1, dimensions_, boundaries_[1]);
     elements_.reserve(static_cast<std::size_t>(index) + 1);
     elements_.growTo(static_cast<std::size_t>(index));
     elements_.pushBack(std::move(fresh));
@@ -82,6 +84,7 @@ void ElementArray::insertAt(const ElementValue& value, int32_t index) {
   Element fresh;
   fresh.assign(value);
   int32_t newCapacity = rebalancedCapacity(capacity_, size(), size());
+  reserveRowStates(int64_t{size()} + 1, dimensions_, boundaries_[1]);
   elements_.insertAt(static_cast<std::size_t>(index), std::move(fresh));
   capacity_ = newCapacity;
   syncRowStates();
@@ -117,6 +120,68 @@ void ElementArray::clear() {
   syncRowStates();
 }
 
+// --- All or nothing --------------------------------------------------------------------
+
+ElementArray ElementArray::emptyCopy() const {
+  ElementArray copy;
+  copy.caseMode = caseMode;
+  copy.searchMode = searchMode;
+  copy.fileMode = fileMode;
+  copy.selectionMode = selectionMode;
+  copy.autoSelectNewRows = autoSelectNewRows;
+  copy.labels = labels;
+  copy.dimensions_ = dimensions_;
+  std::copy(std::begin(boundaries_), std::end(boundaries_), copy.boundaries_);
+  copy.delimiterText_ = delimiterText_;
+  copy.syncRowStates();
+  return copy;
+}
+
+ElementArray::Mark ElementArray::mark() const {
+  Mark m;
+  m.size = size();
+  m.capacity = capacity_;
+  m.dimensions = dimensions_;
+  std::copy(std::begin(boundaries_), std::end(boundaries_), m.boundaries);
+  m.labels = labels;
+  m.rowStates = rowStates;
+  return m;
+}
+
+void ElementArray::rollBack(Mark& m) noexcept {
+  elements_.truncate(static_cast<std::size_t>(m.size));
+  capacity_ = m.capacity;
+  dimensions_ = m.dimensions;
+  std::copy(std::begin(m.boundaries), std::end(m.boundaries), boundaries_);
+  labels.swap(m.labels);
+  rowStates.swap(m.rowStates);
+  refreshAppendRange();
+}
+
+void ElementArray::undoInserts(const EditMark& m, int32_t index) noexcept {
+  if (index >= m.size) {
+    elements_.truncate(static_cast<std::size_t>(m.size));
+  } else {
+    for (int32_t i = size() - m.size - 1; i >= 0; --i) {
+      elements_.eraseAt(static_cast<std::size_t>(index + i));
+    }
+  }
+  capacity_ = m.capacity;
+  if (rowStates.size() > m.rows) rowStates.resize(m.rows);
+  refreshAppendRange();
+}
+
+void ElementArray::swapElements(int32_t index, std::span<Element> other) noexcept {
+  for (std::size_t i = 0; i < other.size(); ++i) {
+    std::swap(at(index + static_cast<int32_t>(i)), other[i]);
+  }
+}
+
+void ElementArray::rebalanceCapacity() noexcept {
+  capacity_ = rebalancedCapacity(capacity_, size(), size());
+  refreshAppendRange();
+}
+
 // --- Settings ------------------------------------------------------------------------
 
 // Out of line: inlined into callers that pass a literal, the assignment trips a false
@@ -129,6 +194,7 @@ void ElementArray::setListDelimiter(const char* text) {
 
 void ElementArray::setDimensions(int32_t n) {
   if (n >= kBoundaryCount) return;
+  reserveRowStates(size(), n, boundaries_[1]);
   dimensions_ = n;
   syncRowStates();
 }
@@ -140,6 +206,7 @@ int32_t ElementArray::boundary(int32_t d) const {
 
 void ElementArray::setBoundary(int32_t d, int32_t n) {
   if (n < 1 || d < 0 || d >= dimensions_) return;
+  reserveRowStates(size(), dimensions_, d == 1 ? n : boundaries_[1]);
   boundaries_[d] = n;
   syncRowStates();
 }
@@ -168,6 +235,7 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
   // is one element, can ask for it) would delete at negative indexes: nothing moves.
   const int32_t count = mulWrap(unit, growing ? subWrap(n, old) : subWrap(old, n));
   if (n == old || block <= 0 || block >= sizeBefore || count <= 0 || (!growing && count > block)) {
+    reserveRowStates(sizeBefore, dimensions_, d == 1 ? n : boundaries_[1]);
     boundaries_[d] = n;
     syncRowStates();
     return;
@@ -179,6 +247,7 @@ void ElementArray::resizeBoundary(int32_t d, int32_t n) {
 
   ElementStore result;
   result.reserve(static_cast<std::size_t>(finalSize));
+  reserveRowStates(finalSize, dimensions_, d == 1 ? n : boundaries_[1]);
   int64_t cap = capacity_;
   int64_t current = sizeBefore;
   const int64_t kept = growing ? block : block - count;
@@ -243,6 +312,7 @@ void ElementArray::appendNone(int64_t count) {
   const int64_t n = std::min<int64_t>(count, int64_t{kMaxSize} - size());
   if (n <= 0) return;
   const int32_t cap = capacityAfterAppends(n);
+  reserveRowStates(size() + n, dimensions_, boundaries_[1]);
   elements_.growTo(static_cast<std::size_t>(size() + n));
   capacity_ = cap;
   syncRowStates();
@@ -252,6 +322,7 @@ void ElementArray::appendElements(std::span<Element> run) {
   const int64_t n = std::min<int64_t>(static_cast<int64_t>(run.size()), int64_t{kMaxSize} - size());
   if (n <= 0) return;
   const int32_t cap = capacityAfterAppends(n);
+  reserveRowStates(size() + n, dimensions_, boundaries_[1]);
   elements_.appendMoved(run.data(), static_cast<std::size_t>(n));
   capacity_ = cap;
   syncRowStates();
@@ -302,6 +373,14 @@ void ElementArray::refreshAppendRange() {
   }
   plainAppendFloor_ = std::max(0, capacity_ / 4 - 1);
   plainAppendLimit_ = std::min(capacity_ / 2, kMaxSize - 1);
+}
+
+void ElementArray::reserveRowStates(int64_t size, int32_t dimensions, int32_t columns) {
+  if (dimensions != 2 || columns <= 0) return;
+  const auto rows = static_cast<std::size_t>(size / columns);
+  // Geometric, as resize would grow it: a reserve of the exact count on every append
+  // would copy the states every time.
+  if (rows > rowStates.capacity()) rowStates.reserve(std::max(rows, rowStates.capacity() * 2));
 }
 
 void ElementArray::resizeRowStates(int32_t keep) {

@@ -1,5 +1,7 @@
 #include "array/element_store.h"
 
+#include "array/allocation.h"
+
 #include <algorithm>
 #include <cstdlib>
 #include <cstring>
@@ -80,7 +82,7 @@ void ElementStore::makeRoomAtBack(std::size_t total) {
     return;
   }
   const std::size_t grown = head_ + std::max({total, count_ + count_ / 2, kMinimumRoom});
-  void* block = std::realloc(static_cast<void*>(buffer_), grown * sizeof(Element));
+  void* block = reallocateBytes(static_cast<void*>(buffer_), grown * sizeof(Element));
   if (block == nullptr) throw std::bad_alloc();
   buffer_ = static_cast<Element*>(block);
   room_ = grown;
@@ -91,7 +93,7 @@ void ElementStore::makeRoomAtBack(std::size_t total) {
 void ElementStore::makeRoomAtFront() {
   if (room_ - count_ < count_ / 4 + 2) {
     const std::size_t grown = std::max(count_ + count_ / 2 + 2, kMinimumRoom);
-    void* block = std::realloc(static_cast<void*>(buffer_), grown * sizeof(Element));
+    void* block = reallocateBytes(static_cast<void*>(buffer_), grown * sizeof(Element));
     if (block == nullptr) throw std::bad_alloc();
     buffer_ = static_cast<Element*>(block);
     room_ = grown;
@@ -105,7 +107,7 @@ void ElementStore::makeRoomAtFront() {
 void ElementStore::growTo(std::size_t total) {
   if (total <= count_) return;
   if (head_ + total > room_ && total / 2 > room_) {
-    void* block = std::calloc(total, sizeof(Element));
+    void* block = allocateZeroed(total, sizeof(Element));
     if (block == nullptr) throw std::bad_alloc();
     if (count_ > 0)
       std::memcpy(block, static_cast<const void*>(rawSlots()), count_ * sizeof(Element));
@@ -156,12 +158,16 @@ void ElementStore::eraseAt(std::size_t index) {
   shrinkIfSparse();
 }
 
+void ElementStore::truncate(std::size_t count) noexcept {
+  while (count_ > count) rawSlots()[--count_].~Element();
+}
+
 // After many deletions give memory back: a block less than a quarter full halves.
 void ElementStore::shrinkIfSparse() noexcept {
   if (room_ <= 1024 || count_ >= room_ / 4) return;
   moveTo(0);
   const std::size_t smaller = std::max(count_ * 2, kMinimumRoom);
-  void* block = std::realloc(static_cast<void*>(buffer_), smaller * sizeof(Element));
+  void* block = reallocateBytes(static_cast<void*>(buffer_), smaller * sizeof(Element));
   if (block == nullptr) return;  // keeping the larger block is fine
   buffer_ = static_cast<Element*>(block);
   room_ = smaller;

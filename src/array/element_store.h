@@ -78,6 +78,8 @@ class ElementStore {
   }
   // Destroys the element at index and closes the gap.
   void eraseAt(std::size_t index);
+  // Destroys the elements from index `count` on.
+  void truncate(std::size_t count) noexcept;
   void clear() { release(); }
 
  private:

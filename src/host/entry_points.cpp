@@ -2,6 +2,8 @@
 // entries.
 #include "host/entry_points.h"
 
+#include <array>
+#include <cstddef>
 #include <memory>
 #include <new>
 
@@ -53,6 +55,14 @@ int16_t lowCode(int32_t code) {
   return static_cast<int16_t>(code);
 }
 
+// The entry of a code in the table; null for any other code, which would otherwise
+// point outside it. The condition table holds one empty entry, for code 0.
+template <std::size_t N>
+const InfoEntry* entryOf(const std::array<InfoEntry, N>& table, int32_t code) {
+  const int16_t c = lowCode(code);
+  return c >= 0 && static_cast<std::size_t>(c) < N ? table.data() + c : nullptr;
+}
+
 int16_t noEffect(void*) {
   return 0;
 }
@@ -102,10 +112,10 @@ QUORREL_EXPORT int16_t QUORREL_CALL CreateRunObject(void* runRecord, void* setup
 
 QUORREL_EXPORT int16_t QUORREL_CALL DestroyRunObject(void* runRecord, HostWord) {
   if (runRecord == nullptr) return 0;
-  try {
-    std::unique_ptr<ElementArray> owned(host::elementArrayOf(runRecord));
-  } catch (...) {
-  }
+  // The field is cleared so that a second call, or a routine called after it, finds
+  // no array instead of a freed one.
+  std::unique_ptr<ElementArray> owned(host::elementArrayOf(runRecord));
+  host::setElementArray(runRecord, nullptr);
   return 0;
 }
 
@@ -148,13 +158,13 @@ QUORREL_EXPORT int16_t QUORREL_CALL GetRunObjectDataSize(HostWord, HostWord) {
 }
 
 QUORREL_EXPORT const InfoEntry* QUORREL_CALL GetConditionInfos(void*, int32_t code) {
-  return host::ConditionInfoTable.data() + lowCode(code);
+  return entryOf(host::ConditionInfoTable, code);
 }
 QUORREL_EXPORT const InfoEntry* QUORREL_CALL GetActionInfos(void*, int32_t code) {
-  return host::ActionInfoTable.data() + lowCode(code);
+  return entryOf(host::ActionInfoTable, code);
 }
 QUORREL_EXPORT const InfoEntry* QUORREL_CALL GetExpressionInfos(void*, int32_t code) {
-  return host::ExpressionInfoTable.data() + lowCode(code);
+  return entryOf(host::ExpressionInfoTable, code);
 }
 
 }  // extern "C"

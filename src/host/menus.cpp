@@ -165,6 +165,16 @@ int32_t loadString(UINT id, char* buffer, int32_t size) {
   }
 }
 
+// A code the information tables do not have names no title and no string: without
+// this check it would reach the command or string of another family (action 200 is
+// string 28400, expression 0's). The buffer then holds the empty text. The condition
+// table has its one empty entry, code 0.
+bool knownCode(int16_t code, int count, char* buffer, int32_t size) {
+  if (code >= 0 && code < count) return true;
+  if (buffer != nullptr && bufferSize(size) > 0) buffer[0] = '\0';
+  return false;
+}
+
 int16_t codeFromMenu(int32_t menuId, int base, int count) {
   int id = lowSigned(menuId);
   return id >= base && id < base + count ? static_cast<int16_t>(id - base) : int16_t{-1};
@@ -197,33 +207,42 @@ QUORREL_EXPORT int16_t QUORREL_CALL GetExpressionCodeFromMenu(void*, int32_t men
 QUORREL_EXPORT int32_t QUORREL_CALL GetConditionTitle(void*, int32_t code, int32_t param,
                                                       char* buffer, int32_t size) {
   int16_t c = lowSigned(code);
+  if (!knownCode(c, static_cast<int>(host::ConditionInfoTable.size()), buffer, size)) return 0;
   return title(titleIdOf(host::ConditionInfoTable, c, param), kConditionMenuId,
                kConditionCommandBase + c, buffer, size);
 }
 QUORREL_EXPORT int32_t QUORREL_CALL GetActionTitle(void*, int32_t code, int32_t param, char* buffer,
                                                    int32_t size) {
   int16_t c = lowSigned(code);
+  if (!knownCode(c, abi::kActionCount, buffer, size)) return 0;
   return title(titleIdOf(host::ActionInfoTable, c, param), kActionMenuId, kActionCommandBase + c,
                buffer, size);
 }
 QUORREL_EXPORT int32_t QUORREL_CALL GetExpressionTitle(void*, int32_t code, char* buffer,
                                                        int32_t size) {
   int16_t c = lowSigned(code);
+  if (!knownCode(c, abi::kExpressionCount, buffer, size)) return 0;
   return title(titleIdOf(host::ExpressionInfoTable, c, 0), kExpressionMenuId,
                kExpressionCommandBase + c, buffer, size);
 }
 
 QUORREL_EXPORT int32_t QUORREL_CALL GetConditionString(void*, int32_t code, char* buffer,
                                                        int32_t size) {
-  return loadString(kConditionStringBase + static_cast<UINT>(lowSigned(code)), buffer, size);
+  const int16_t c = lowSigned(code);
+  if (!knownCode(c, static_cast<int>(host::ConditionInfoTable.size()), buffer, size)) return 0;
+  return loadString(kConditionStringBase + static_cast<UINT>(c), buffer, size);
 }
 QUORREL_EXPORT int32_t QUORREL_CALL GetActionString(void*, int32_t code, char* buffer,
                                                     int32_t size) {
-  return loadString(kActionStringBase + static_cast<UINT>(lowSigned(code)), buffer, size);
+  const int16_t c = lowSigned(code);
+  if (!knownCode(c, abi::kActionCount, buffer, size)) return 0;
+  return loadString(kActionStringBase + static_cast<UINT>(c), buffer, size);
 }
 QUORREL_EXPORT int32_t QUORREL_CALL GetExpressionString(void*, int32_t code, char* buffer,
                                                         int32_t size) {
-  return loadString(kExpressionStringBase + static_cast<UINT>(lowSigned(code)), buffer, size);
+  const int16_t c = lowSigned(code);
+  if (!knownCode(c, abi::kExpressionCount, buffer, size)) return 0;
+  return loadString(kExpressionStringBase + static_cast<UINT>(c), buffer, size);
 }
 
 }  // extern "C"

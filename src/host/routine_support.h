@@ -28,6 +28,7 @@ inline const char* textParam(HostWord slot) {
 // Runs op on the instance's array; no array means nothing to do. Always answers 0.
 template <typename Op>
 int16_t runAction(void* runRecord, Op&& op) noexcept {
+  if (runRecord == nullptr) return 0;
   try {
     if (ElementArray* array = elementArrayOf(runRecord)) op(*array);
   } catch (...) {
@@ -58,7 +59,8 @@ class ParameterFetcher {
     abi::FetchParameterService service =
         fetched_ == 0 ? fetchFirstParameter(runRecord_) : fetchNextParameter(runRecord_);
     ++fetched_;
-    return Kind::from(service(runRecord_, Kind::kFlag, token_));
+    // A host without the service hands over 0 (a null text).
+    return Kind::from(service == nullptr ? 0 : service(runRecord_, Kind::kFlag, token_));
   }
 
  private:
@@ -77,7 +79,9 @@ struct Borrowed {
 inline HostWord handOverText(void* runRecord, const char* text) {
   if (text == nullptr) return 0;
   const std::size_t length = std::strlen(text);
-  char* buffer = allocateResultString(runRecord)(runRecord, static_cast<int32_t>(length + 1), 0);
+  const abi::AllocateResultStringService allocate = allocateResultString(runRecord);
+  if (allocate == nullptr) return 0;
+  char* buffer = allocate(runRecord, static_cast<int32_t>(length + 1), 0);
   markResultIsString(runRecord);
   if (buffer == nullptr) return 0;
   std::memcpy(buffer, text, length + 1);
@@ -103,6 +107,7 @@ inline HostWord resultWord(void* runRecord, const std::optional<std::string>& te
 // hands its result over. Without an array every expression answers 0.
 template <typename... Kinds, typename Op>
 HostWord runExpression(void* runRecord, HostWord token, Op&& op) noexcept {
+  if (runRecord == nullptr) return 0;
   try {
     ParameterFetcher fetcher(runRecord, token);
     // Braced initialisation fetches left to right.

@@ -37,10 +37,11 @@ inline void markResultIsString(void* runRecord) {
 }
 
 // --- Host services, through the run-time header --------------------------------------
+// Null when the record has no run-time header.
 template <typename Service>
 Service hostService(const void* runRecord, std::size_t offset) {
   const void* header = readField<const void*>(runRecord, abi::kRunHeader);
-  return readField<Service>(header, offset);
+  return header == nullptr ? nullptr : readField<Service>(header, offset);
 }
 inline abi::FetchParameterService fetchFirstParameter(const void* runRecord) {
   return hostService<abi::FetchParameterService>(runRecord, abi::kFetchFirstParameter);

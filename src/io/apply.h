@@ -7,6 +7,7 @@
 #include <cstring>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "array/element_array.h"
@@ -67,6 +68,26 @@ class AppendRun {
   RecordSlab slab_;
   std::vector<Element> pending_;
 };
+
+// Runs a load all or nothing: a replacing load fills an empty copy of the array that
+// is swapped in once complete; an appending load that fails part-way is undone. An
+// exception (memory ran out) thus leaves the array as it was, and is passed on.
+template <typename Load>
+void loadAllOrNothing(ElementArray& array, bool replace, Load&& load) {
+  if (replace) {
+    ElementArray staged = array.emptyCopy();
+    load(staged);
+    array = std::move(staged);
+    return;
+  }
+  ElementArray::Mark mark = array.mark();
+  try {
+    load(array);
+  } catch (...) {
+    array.rollBack(mark);
+    throw;
+  }
+}
 
 // setLabel, which leaves the labels of a table past kMaxLabelColumns alone (only a
 // damaged file asks for one that wide).

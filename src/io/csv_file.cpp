@@ -68,7 +68,7 @@ Element cellElement(const char* cell, std::size_t length, RecordSlab* slab) {
 std::optional<ByteBuffer> readTextFile(const char* path) {
   std::optional<ByteBuffer> text = readFileBytes(path, 1);
   if (!text) return std::nullopt;
-  if (!text->reserve(text->size() + 1)) return ByteBuffer();
+  if (!text->reserve(text->size() + 1)) throw std::bad_alloc();
   text->data()[text->size()] = '\0';
   text->setSize(std::strlen(text->data()));
   return text;
@@ -87,9 +87,9 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
     // The last row is padded to X cells; past the array's cap (X = 2147483647, say)
     // that is gigabytes of empty cells, so such a file is not written at all.
     if (rows * columns > ElementArray::kMaxSize) return;
-    FileHandle file = FileHandle::openForWriting(path, mode);
+    SaveFile file(path, mode);
     if (!file.isOpen()) return;
-    BufferedWriter out(file);
+    BufferedWriter out(file.handle());
     const std::span<const Element> cells = std::as_const(array).slots();
     NumberText scratch;
     for (int64_t r = 0; r < rows; ++r) {
@@ -100,21 +100,23 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
       }
       out.text(kLineEnd);
     }
+    file.finish(out.complete());
   } catch (const std::bad_alloc&) {
   }
 }
 
 void writeCsvFile(const char* path, const CsvTable& table, uint16_t fileMode) {
   try {
-    FileHandle file = FileHandle::openForWriting(path, fileMode);
+    SaveFile file(path, fileMode);
     if (!file.isOpen()) return;
-    BufferedWriter out(file);
+    BufferedWriter out(file.handle());
     for (const CsvRow& row : table.rows) {
       for (int32_t j = 0; j < row.cellCount(); ++j) {
         writeCell(out, j, row.cells[static_cast<std::size_t>(j)]);
       }
       out.text(kLineEnd);
     }
+    file.finish(out.complete());
   } catch (const std::bad_alloc&) {
   }
 }
@@ -138,29 +140,30 @@ std::optional<CsvTable> readCsvFile(const char* path) {
 void loadCsvFile(ElementArray& array, const char* path, int32_t append) {
   try {
     std::optional<ByteBuffer> text = readTextFile(path);
-    if (append == 0) array.clear();
     char* data = text ? text->data() : nullptr;
     const std::size_t size = text ? text->size() : 0;
     int32_t columns = 0;
     io_detail::forEachLine(data, size, [&](char* line, size_t length) {
       columns = std::max(columns, cellsOfLine(line, length));
     });
-    array.setDimensions(2);
-    array.setBoundary(1, columns);
-    // Past the array's size limit appends change nothing, so the walk stops there.
-    io_detail::AppendRun run(array);
-    io_detail::forEachLine(data, size, [&](char* line, size_t length) {
-      if (run.size() >= ElementArray::kMaxSize) return;
-      int32_t cells = 0;
-      forEachCell(line, length, [&](const char* cell, std::size_t cellLength) {
-        run.add(cellElement(cell, cellLength, run.slab()));
-        ++cells;
+    io_detail::loadAllOrNothing(array, append == 0, [&](ElementArray& target) {
+      target.setDimensions(2);
+      target.setBoundary(1, columns);
+      // Past the array's size limit appends change nothing, so the walk stops there.
+      io_detail::AppendRun run(target);
+      io_detail::forEachLine(data, size, [&](char* line, size_t length) {
+        if (run.size() >= ElementArray::kMaxSize) return;
+        int32_t cells = 0;
+        forEachCell(line, length, [&](const char* cell, std::size_t cellLength) {
+          run.add(cellElement(cell, cellLength, run.slab()));
+          ++cells;
+        });
+        for (; cells < columns && run.size() < ElementArray::kMaxSize; ++cells) {
+          run.add(cellElement("", 0, run.slab()));
+        }
       });
-      for (; cells < columns && run.size() < ElementArray::kMaxSize; ++cells) {
-        run.add(cellElement("", 0, run.slab()));
-      }
+      run.flush();
     });
-    run.flush();
   } catch (const std::bad_alloc&) {
   }
 }

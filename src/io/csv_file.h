@@ -38,7 +38,8 @@ void writeCsvFile(const char* path, const CsvTable& table, uint16_t fileMode);
 std::optional<CsvTable> readCsvFile(const char* path);
 
 // The file as zero-terminated text: a zero byte inside the file ends the text (size()
-// is the text's length). Nothing when the file cannot be opened.
+// is the text's length). Nothing when the file cannot be opened; std::bad_alloc when
+// memory runs out.
 std::optional<ByteBuffer> readTextFile(const char* path);
 
 }  // namespace quorrel

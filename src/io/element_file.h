@@ -15,7 +15,8 @@ namespace quorrel {
 // truncates the file, mode 1 appends. An index outside the array touches no file.
 void saveElementToFile(const ElementArray& array, int32_t index, const char* path, uint16_t mode);
 
-// Exactly the file's bytes (no terminator added); nothing when it cannot be opened.
+// Exactly the file's bytes (no terminator added); nothing when it cannot be opened,
+// std::bad_alloc when memory runs out.
 // A read error ends the reading with what was read so far.
 std::optional<ByteBuffer> readWholeFile(const char* path);
 

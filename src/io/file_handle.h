@@ -1,6 +1,6 @@
 // Low-level file access for the file formats: an owned descriptor opened by path,
-// a growable byte buffer, buffered writing and whole-file reading. Files are opened
-// and closed within one operation; nothing here reports errors beyond "not opened".
+// a crash-safe whole-file save, a growable byte buffer, buffered writing and
+// whole-file reading. Files are opened and closed within one operation.
 #pragma once
 
 #include <cstddef>
@@ -9,6 +9,7 @@
 #include <cstring>
 #include <memory>
 #include <optional>
+#include <string>
 #include <string_view>
 
 namespace quorrel {
@@ -26,7 +27,8 @@ class FileHandle {
   FileHandle(const FileHandle&) = delete;
   FileHandle& operator=(const FileHandle&) = delete;
 
-  // Read only, binary. A directory is not a file and does not open.
+  // Read only, binary. Only regular files and pipes open: a directory is not a file,
+  // and a device could block or never end. A pipe without a writer reads as empty.
   static FileHandle openForReading(const char* path);
   // Write only, binary, created with owner read and write permission when missing;
   // truncated (mode 0) or with every write at the end (mode 1).
@@ -39,11 +41,46 @@ class FileHandle {
   bool writeAll(const char* bytes, std::size_t count);
   // The size of a regular file, for sizing buffers; 0 when unknown.
   std::size_t sizeHint() const;
-  void close();
+  // Asks the system to put the written bytes on the disk; false when it could not.
+  bool sync();
+  // False when closing reported a lost write.
+  bool close();
 
  private:
+  friend class SaveFile;
   explicit FileHandle(int fd) : fd_(fd) {}
   int fd_ = -1;
+};
+
+// Where a save writes. A whole-file save (any mode but append) writes a temporary file
+// beside the target and, once every byte is written and flushed to the disk, puts it in
+// the target's place in one step: a save that fails or is interrupted leaves the old
+// file whole. The replacement keeps the old file's permission bits and owner; a new
+// file gets owner read and write. A symbolic link is followed (the file it names is
+// replaced). Where no temporary file can be made (a read-only folder, a file with
+// several hard links, not a regular file) the target is written in place as an append
+// always is. A target that cannot be opened for writing gets nothing.
+class SaveFile {
+ public:
+  SaveFile(const char* path, uint16_t mode);
+  ~SaveFile();
+  SaveFile(const SaveFile&) = delete;
+  SaveFile& operator=(const SaveFile&) = delete;
+
+  bool isOpen() const { return file_.isOpen(); }
+  FileHandle& handle() { return file_; }
+  // Flushes to the disk and puts the temporary file in place. With `written` false (a
+  // write failed), or when the flush or the replacement fails, the temporary file is
+  // removed and the target keeps its old bytes. True when the save is complete.
+  bool finish(bool written);
+
+ private:
+  void openInPlace(const char* path, uint16_t mode);
+  void discard();
+
+  FileHandle file_;
+  std::string temp_;  // empty when writing in place
+  std::string target_;
 };
 
 // A malloc-owned byte buffer that grows without zero-filling, so reading a big file
@@ -71,19 +108,21 @@ class ByteBuffer {
 
 // Reads from the handle's position to the end of the file (or a read error, or
 // `limit` bytes) into the buffer, keeping `spare` writable bytes past the data.
-// Growth is geometric. What was read before an error or a failed allocation stays.
-void readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare);
+// Growth is geometric. What was read before an error stays; false when the buffer
+// could not grow (the file was not read to its end).
+bool readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare);
 
 // The largest file a reader takes in: what a block length can count.
 inline constexpr std::size_t kMaxFileBytes = INT32_MAX;
 
 // Opens the file read only, reads all of it (up to kMaxFileBytes) and closes it;
-// `spare` writable bytes stay past the data. Nothing when the file cannot be opened.
+// `spare` writable bytes stay past the data. Nothing when the file cannot be opened;
+// throws std::bad_alloc when memory runs out, so that no load takes half a file.
 std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare);
 
 // Collects output in large blocks so a file is written in few system calls; flushes
 // when destroyed. Numbers are written little-endian. After a refused write the rest
-// of the output is dropped.
+// of the output is dropped and failed() is true.
 class BufferedWriter {
  public:
   explicit BufferedWriter(FileHandle& file);
@@ -123,6 +162,13 @@ class BufferedWriter {
   }
   void commit(std::size_t count) { used_ += count; }
   void flush();
+  // True once the system refused a write.
+  bool failed() const { return failed_; }
+  // Flushes and tells whether every byte was written.
+  bool complete() {
+    flush();
+    return !failed_;
+  }
 
   static char* putLE16(char* p, uint16_t v) {
     p[0] = static_cast<char>(v & 0xFF);

@@ -47,9 +47,9 @@ void writeHostFile(const char* path, uint16_t mode, int32_t x, int32_t y, int32_
   // (X × Y is checked first: with all three near 2^31 the product passes 64 bits.)
   const int64_t layer = int64_t{x} * y;
   if (layer > ElementArray::kMaxSize || layer * z > ElementArray::kMaxSize) return;
-  FileHandle file = FileHandle::openForWriting(path, mode);
+  SaveFile file(path, mode);
   if (!file.isOpen()) return;
-  BufferedWriter out(file);
+  BufferedWriter out(file.handle());
   out.text(kHeader);
   out.i32(kVersion);
   out.i32(x);
@@ -66,6 +66,7 @@ void writeHostFile(const char* path, uint16_t mode, int32_t x, int32_t y, int32_
       }
     }
   }
+  file.finish(out.complete());
 }
 
 // The number of cells X x Y x Z, or -1 when a size is negative or the product does
@@ -209,10 +210,11 @@ void loadHostArrayFile(ElementArray& array, const char* path, int32_t append) {
   const bool replace = append == 0;
   try {
     const std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
-    if (replace) array.clear();
-    LoadSink sink{array, replace};
-    if (bytes) parseHost(bytes->view(), sink);
-    if (replace && !sink.headerSeen) array.setDimensions(0);
+    io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
+      LoadSink sink{target, replace};
+      if (bytes) parseHost(bytes->view(), sink);
+      if (replace && !sink.headerSeen) target.setDimensions(0);
+    });
   } catch (const std::bad_alloc&) {
   }
 }

@@ -106,9 +106,9 @@ struct LoadSink {
 void saveIniFile(ElementArray& array, const char* path, uint16_t mode) {
   array.fileMode = static_cast<int16_t>(mode);
   try {
-    FileHandle file = FileHandle::openForWriting(path, mode);
+    SaveFile file(path, mode);
     if (!file.isOpen()) return;
-    BufferedWriter out(file);
+    BufferedWriter out(file.handle());
     writeSectionLine(out, kSectionName);
     NumberText keyScratch;
     NumberText valueScratch;
@@ -117,20 +117,22 @@ void saveIniFile(ElementArray& array, const char* path, uint16_t mode) {
       writeEntry(out, key, e.asString(valueScratch));
     }
     out.text(kLineEnd);
+    file.finish(out.complete());
   } catch (const std::bad_alloc&) {
   }
 }
 
 void writeIniFile(const char* path, const IniDocument& document, uint16_t fileMode) {
   try {
-    FileHandle file = FileHandle::openForWriting(path, fileMode);
+    SaveFile file(path, fileMode);
     if (!file.isOpen()) return;
-    BufferedWriter out(file);
+    BufferedWriter out(file.handle());
     for (const IniSection& section : document.sections) {
       writeSectionLine(out, section.name);
       for (const IniEntry& entry : section.entries) writeEntry(out, entry.key, entry.value);
       out.text(kLineEnd);
     }
+    file.finish(out.complete());
   } catch (const std::bad_alloc&) {
   }
 }
@@ -152,12 +154,13 @@ std::optional<IniDocument> readIniFile(const char* path) {
 void loadIniFile(ElementArray& array, const char* path, int32_t append) {
   try {
     std::optional<ByteBuffer> text = readTextFile(path);
-    if (append == 0) array.clear();
-    if (!text) return;
-    io_detail::AppendRun run(array);
-    LoadSink sink{run};
-    parseIni(text->data(), text->size(), sink);
-    run.flush();
+    io_detail::loadAllOrNothing(array, append == 0, [&](ElementArray& target) {
+      if (!text) return;
+      io_detail::AppendRun run(target);
+      LoadSink sink{run};
+      parseIni(text->data(), text->size(), sink);
+      run.flush();
+    });
   } catch (const std::bad_alloc&) {
   }
 }

@@ -234,9 +234,9 @@ struct LoadSink {
 void saveNativeFile(ElementArray& array, const char* path, uint16_t mode) {
   array.fileMode = static_cast<int16_t>(mode);
   try {
-    FileHandle file = FileHandle::openForWriting(path, mode);
+    SaveFile file(path, mode);
     if (!file.isOpen()) return;
-    BufferedWriter out(file);
+    BufferedWriter out(file.handle());
     int32_t boundaries[kMaxDimensions];
     for (int32_t d = 0; d < kMaxDimensions; ++d) boundaries[d] = array.boundary(d + 1);
     writeHeader(out, array.dimensions(), boundaries);
@@ -250,20 +250,22 @@ void saveNativeFile(ElementArray& array, const char* path, uint16_t mode) {
     }
     out.i32(array.size());
     for (const Element& e : array.slots()) writeRecord(out, halfOf(&e), halfOf(e.key()));
+    file.finish(out.complete());
   } catch (const std::bad_alloc&) {
   }
 }
 
 void writeNativeFile(const char* path, const ArrayImage& image, uint16_t fileMode) {
   try {
-    FileHandle file = FileHandle::openForWriting(path, fileMode);
+    SaveFile file(path, fileMode);
     if (!file.isOpen()) return;
-    BufferedWriter out(file);
+    BufferedWriter out(file.handle());
     writeHeader(out, image.dimensions, image.boundaries);
     out.i32(image.labelCount());
     for (const LabelRecord& label : image.labels) writeLabel(out, label.length, label.text);
     out.i32(image.elementCount());
     for (const ElementRecord& r : image.elements) writeRecord(out, r);
+    file.finish(out.complete());
   } catch (const std::bad_alloc&) {
   }
 }
@@ -286,14 +288,15 @@ void loadNativeFile(ElementArray& array, const char* path, int32_t append) {
   const bool replace = append == 0;
   try {
     const std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
-    if (replace) array.clear();
-    LoadSink sink{array, replace};
-    if (bytes) parseNative(bytes->view(), sink);
-    sink.run.flush();
-    if (replace && !sink.headerSeen) array.setDimensions(0);
-    for (const auto& [column, text] : sink.pendingLabels) {
-      io_detail::applyLabel(array, text, column);
-    }
+    io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
+      LoadSink sink{target, replace};
+      if (bytes) parseNative(bytes->view(), sink);
+      sink.run.flush();
+      if (replace && !sink.headerSeen) target.setDimensions(0);
+      for (const auto& [column, text] : sink.pendingLabels) {
+        io_detail::applyLabel(target, text, column);
+      }
+    });
   } catch (const std::bad_alloc&) {
   }
 }

@@ -7,11 +7,12 @@
 
 #include <algorithm>
 #include <charconv>
+#include <cstdio>
 #include <cstring>
 #include <limits>
 #include <memory>
 #include <string>
-#include <unordered_set>
+#include <unordered_map>
 #include <vector>
 
 #include "platform/headless_dialog.h"
@@ -21,6 +22,7 @@
 // A dialog or one of its controls.
 struct HWND__ {
   HWND__* dialog = nullptr;  // the owning dialog; null for a dialog
+  HWND handle = nullptr;     // what callers hold: a serial number, not this address
   uint16_t id = 0;
   std::string className;
   std::string text;
@@ -53,13 +55,26 @@ Script& installedScript() {
   return script;
 }
 
-std::unordered_set<HWND>& liveWindows() {
-  static std::unordered_set<HWND> windows;
+// Every live window by handle. A handle is a serial number, never an address, and is
+// never given out twice: a handle kept after its dialog closed names nothing, even
+// once the memory has been reused.
+std::unordered_map<HWND, Window*>& liveWindows() {
+  static std::unordered_map<HWND, Window*> windows;
   return windows;
 }
 
+void enlist(Window& window) {
+  static uintptr_t lastSerial = 0;
+  // Past the integer resource names, and aligned like a pointer.
+  const auto handle = reinterpret_cast<HWND>((lastSerial + 1 + 0x20000) * 16);
+  liveWindows().emplace(handle, &window);
+  ++lastSerial;
+  window.handle = handle;
+}
+
 Window* live(HWND handle) {
-  return liveWindows().count(handle) ? handle : nullptr;
+  auto found = liveWindows().find(handle);
+  return found == liveWindows().end() ? nullptr : found->second;
 }
 
 Window* openDialog(HWND handle) {
@@ -94,6 +109,28 @@ class DialogInstance {
     window_.id = resource.id;
     window_.text = resource.caption;
     window_.style = resource.style;
+    try {
+      build(resource);
+    } catch (...) {
+      unlist();
+      throw;
+    }
+  }
+  ~DialogInstance() { unlist(); }
+  DialogInstance(const DialogInstance&) = delete;
+  DialogInstance& operator=(const DialogInstance&) = delete;
+
+  Window& window() { return window_; }
+
+  HWND firstTabStop() {
+    for (auto& child : window_.controls) {
+      if ((child->style & WS_TABSTOP) && child->enabled) return child->handle;
+    }
+    return nullptr;
+  }
+
+ private:
+  void build(const quorrel::platform::DialogResource& resource) {
     for (const auto& item : resource.controls) {
       auto child = std::make_unique<Window>();
       child->dialog = &window_;
@@ -102,38 +139,26 @@ class DialogInstance {
       child->text = item.text;
       child->style = item.style;
       child->enabled = (item.style & WS_DISABLED) == 0;
-      liveWindows().insert(child.get());
       window_.controls.push_back(std::move(child));
+      enlist(*window_.controls.back());
     }
-    liveWindows().insert(&window_);
+    enlist(window_);
   }
-  ~DialogInstance() {
-    for (auto& child : window_.controls) liveWindows().erase(child.get());
-    liveWindows().erase(&window_);
-  }
-  DialogInstance(const DialogInstance&) = delete;
-  DialogInstance& operator=(const DialogInstance&) = delete;
-
-  Window& window() { return window_; }
-
-  HWND firstTabStop() {
-    for (auto& child : window_.controls) {
-      if ((child->style & WS_TABSTOP) && child->enabled) return child.get();
-    }
-    return nullptr;
+  void unlist() noexcept {
+    for (auto& child : window_.controls) liveWindows().erase(child->handle);
+    liveWindows().erase(window_.handle);
   }
 
- private:
   Window window_;
 };
 
 INT_PTR send(Window& dialog, UINT message, WPARAM wParam, LPARAM lParam) {
-  return dialog.procedure ? dialog.procedure(&dialog, message, wParam, lParam) : 0;
+  return dialog.procedure ? dialog.procedure(dialog.handle, message, wParam, lParam) : 0;
 }
 
 void sendCommand(Window& dialog, uint16_t id, WORD notification, Window* from) {
   auto wParam = static_cast<WPARAM>((static_cast<uint32_t>(notification) << 16) | id);
-  send(dialog, WM_COMMAND, wParam, reinterpret_cast<LPARAM>(from));
+  send(dialog, WM_COMMAND, wParam, reinterpret_cast<LPARAM>(from ? from->handle : nullptr));
 }
 
 // The group of a control runs from the nearest WS_GROUP control at or before it up
@@ -188,16 +213,23 @@ bool readInteger(const std::string& text, bool isSigned, UINT& value) {
 
 extern "C" {
 
+// Every function here answers failure rather than let an exception (only a failed
+// allocation can throw) reach the caller.
+
 INT_PTR DialogBoxParamA(HINSTANCE, LPCSTR name, HWND, DLGPROC procedure, LPARAM parameter) {
   const auto* resource = findDialog(name);
   if (!resource || !procedure) return -1;
-  DialogInstance instance(*resource, procedure);
-  Window& dialog = instance.window();
-  send(dialog, WM_INITDIALOG, reinterpret_cast<WPARAM>(instance.firstTabStop()), parameter);
-  Script script = installedScript();
-  if (!dialog.ended && script.run) script.run(&dialog, script.user);
-  if (!dialog.ended) QuorrelDialogKey(&dialog, VK_ESCAPE);
-  return dialog.ended ? dialog.result : -1;
+  try {
+    DialogInstance instance(*resource, procedure);
+    Window& dialog = instance.window();
+    send(dialog, WM_INITDIALOG, reinterpret_cast<WPARAM>(instance.firstTabStop()), parameter);
+    Script script = installedScript();
+    if (!dialog.ended && script.run) script.run(dialog.handle, script.user);
+    if (!dialog.ended) QuorrelDialogKey(dialog.handle, VK_ESCAPE);
+    return dialog.ended ? dialog.result : -1;
+  } catch (...) {
+    return -1;
+  }
 }
 
 BOOL EndDialog(HWND handle, INT_PTR result) {
@@ -223,14 +255,19 @@ LONG_PTR GetWindowLongA(HWND handle, int index) {
 }
 
 HWND GetDlgItem(HWND dialog, int id) {
-  return control(dialog, id);
+  Window* found = control(dialog, id);
+  return found ? found->handle : nullptr;
 }
 
 BOOL SetDlgItemTextA(HWND dialog, int id, LPCSTR text) {
   Window* target = control(dialog, id);
   if (!target) return FALSE;
-  target->text = text ? text : "";
-  return TRUE;
+  try {
+    target->text = text ? text : "";
+    return TRUE;
+  } catch (...) {
+    return FALSE;
+  }
 }
 
 UINT GetDlgItemTextA(HWND dialog, int id, LPSTR buffer, int size) {
@@ -246,8 +283,13 @@ UINT GetDlgItemTextA(HWND dialog, int id, LPSTR buffer, int size) {
 }
 
 BOOL SetDlgItemInt(HWND dialog, int id, UINT value, BOOL isSigned) {
-  std::string text = isSigned ? std::to_string(static_cast<int32_t>(value)) : std::to_string(value);
-  return SetDlgItemTextA(dialog, id, text.c_str());
+  char text[16];
+  if (isSigned) {
+    std::snprintf(text, sizeof text, "%d", static_cast<int>(static_cast<int32_t>(value)));
+  } else {
+    std::snprintf(text, sizeof text, "%u", value);
+  }
+  return SetDlgItemTextA(dialog, id, text);
 }
 
 UINT GetDlgItemInt(HWND dialog, int id, BOOL* translated, BOOL isSigned) {
@@ -305,14 +347,18 @@ BOOL QuorrelDialogType(HWND dialogHandle, int id, LPCSTR text) {
   Window* target = control(dialogHandle, id);
   if (!dialog || !target || !target->enabled || !isEdit(*target)) return FALSE;
   bool digitsOnly = (target->style & ES_NUMBER) != 0;
-  std::string typed;
-  for (const char* c = text ? text : ""; *c; ++c) {
-    auto ch = static_cast<unsigned char>(*c);
-    if (ch < 0x20 || (digitsOnly && (ch < '0' || ch > '9'))) continue;
-    if (typed.size() == kTypingLimit) break;
-    typed += static_cast<char>(ch);
+  try {
+    std::string typed;
+    for (const char* c = text ? text : ""; *c; ++c) {
+      auto ch = static_cast<unsigned char>(*c);
+      if (ch < 0x20 || (digitsOnly && (ch < '0' || ch > '9'))) continue;
+      if (typed.size() == kTypingLimit) break;
+      typed += static_cast<char>(ch);
+    }
+    target->text = std::move(typed);
+  } catch (...) {
+    return FALSE;
   }
-  target->text = std::move(typed);
   sendCommand(*dialog, target->id, kEditChanged, target);
   return TRUE;
 }

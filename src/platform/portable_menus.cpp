@@ -33,16 +33,21 @@ constexpr UINT kKeptItemFlags =
     MF_GRAYED | MF_DISABLED | MF_CHECKED | MF_MENUBARBREAK | MF_MENUBREAK;
 constexpr UINT kNotFound = 0xFFFFFFFF;
 
-// Every live menu, so that a stale or foreign handle is refused instead of followed.
+// Every live menu by handle. A handle is a serial number, never an address, and is
+// never given out twice: a handle kept after DestroyMenu names nothing even once the
+// menu's memory has been reused, and a foreign handle is refused instead of followed.
 std::unordered_map<HMENU, std::unique_ptr<Menu>>& liveMenus() {
   static std::unordered_map<HMENU, std::unique_ptr<Menu>> menus;
   return menus;
 }
 
 HMENU newMenu() {
+  static uintptr_t lastSerial = 0;
   auto menu = std::make_unique<Menu>();
-  HMENU handle = menu.get();
+  // Past the integer resource names, and aligned like a pointer.
+  const auto handle = reinterpret_cast<HMENU>((lastSerial + 1 + 0x10000) * 16);
   liveMenus().emplace(handle, std::move(menu));
+  ++lastSerial;
   return handle;
 }
 
@@ -60,25 +65,32 @@ void forget(HMENU handle) {
   liveMenus().erase(handle);
 }
 
-// Builds one level of a menu template; returns the position after the level.
-std::size_t buildLevel(Menu& menu, std::span<const quorrel::platform::MenuTemplateItem> source,
+// Builds one level of a menu template; returns the position after the level. A submenu
+// is linked in before it is filled, so that a failure part-way leaves every menu built
+// so far reachable from the top one.
+std::size_t buildLevel(HMENU handle, std::span<const quorrel::platform::MenuTemplateItem> source,
                        std::size_t position) {
   while (position < source.size()) {
     const auto& entry = source[position++];
     MenuItem item;
     item.text = entry.text;
-    if (entry.flags & quorrel::platform::kMenuPopup) {
+    const bool popup = (entry.flags & quorrel::platform::kMenuPopup) != 0;
+    if (popup) {
       item.flags = MF_POPUP;
-      item.submenu = newMenu();
-      live(item.submenu)->parent = &menu;
-      position = buildLevel(*live(item.submenu), source, position);
     } else {
       item.flags = entry.flags & kKeptItemFlags;
       item.id = entry.id;
       // An item without text is a separator, as the Windows loader reads it.
       if (item.text.empty()) item.flags |= MF_SEPARATOR;
     }
+    Menu& menu = *live(handle);
     menu.items.push_back(std::move(item));
+    if (popup) {
+      HMENU submenu = newMenu();
+      live(submenu)->parent = handle;
+      menu.items.back().submenu = submenu;
+      position = buildLevel(submenu, source, position);
+    }
     if (entry.flags & quorrel::platform::kMenuEnd) break;
   }
   return position;
@@ -116,20 +128,33 @@ MenuItem* findItem(HMENU handle, UINT item, UINT flags) {
 
 extern "C" {
 
+// Every function here answers failure rather than let an exception (only a failed
+// allocation can throw) reach the caller.
+
 HMENU LoadMenuA(HINSTANCE, LPCSTR name) {
   if (!IS_INTRESOURCE(name)) return nullptr;
   auto id = static_cast<uint16_t>(reinterpret_cast<uintptr_t>(name));
   for (const auto& resource : quorrel::platform::moduleResources().menus) {
     if (resource.id != id) continue;
-    HMENU menu = newMenu();
-    buildLevel(*live(menu), resource.items, 0);
-    return menu;
+    HMENU menu = nullptr;
+    try {
+      menu = newMenu();
+      buildLevel(menu, resource.items, 0);
+      return menu;
+    } catch (...) {
+      forget(menu);  // with the submenus built so far
+      return nullptr;
+    }
   }
   return nullptr;
 }
 
 HMENU CreatePopupMenu(void) {
-  return newMenu();
+  try {
+    return newMenu();
+  } catch (...) {
+    return nullptr;
+  }
 }
 
 BOOL DestroyMenu(HMENU handle) {
@@ -184,24 +209,29 @@ UINT GetMenuState(HMENU menu, UINT item, UINT flags) {
 BOOL AppendMenuA(HMENU handle, UINT flags, UINT_PTR idOrPopup, LPCSTR text) {
   Menu* menu = live(handle);
   if (!menu) return FALSE;
-  MenuItem item;
-  if (flags & MF_SEPARATOR) {
-    item.flags = MF_SEPARATOR;
-  } else if (flags & MF_POPUP) {
-    auto submenu = reinterpret_cast<HMENU>(idOrPopup);
-    Menu* sub = live(submenu);
-    if (!sub || sub == menu || sub->parent) return FALSE;
-    sub->parent = handle;
-    item.flags = MF_POPUP | (flags & kKeptItemFlags);
-    item.submenu = submenu;
-    item.text = text ? text : "";
-  } else {
-    item.flags = flags & kKeptItemFlags;
-    item.id = static_cast<UINT>(idOrPopup);
-    item.text = text ? text : "";
+  try {
+    MenuItem item;
+    Menu* sub = nullptr;
+    if (flags & MF_SEPARATOR) {
+      item.flags = MF_SEPARATOR;
+    } else if (flags & MF_POPUP) {
+      auto submenu = reinterpret_cast<HMENU>(idOrPopup);
+      sub = live(submenu);
+      if (!sub || sub == menu || sub->parent) return FALSE;
+      item.flags = MF_POPUP | (flags & kKeptItemFlags);
+      item.submenu = submenu;
+      item.text = text ? text : "";
+    } else {
+      item.flags = flags & kKeptItemFlags;
+      item.id = static_cast<UINT>(idOrPopup);
+      item.text = text ? text : "";
+    }
+    menu->items.push_back(std::move(item));
+    if (sub) sub->parent = handle;  // only once the item is in
+    return TRUE;
+  } catch (...) {
+    return FALSE;
   }
-  menu->items.push_back(std::move(item));
-  return TRUE;
 }
 
 }  // extern "C"

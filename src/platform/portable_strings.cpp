@@ -5,6 +5,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "array/allocation.h"
 #include "platform/resource_data.h"
 #include "platform/windows_services.h"
 
@@ -37,7 +38,7 @@ int LoadStringA(HINSTANCE, UINT id, LPSTR buffer, int size) {
 
 HLOCAL LocalAlloc(UINT flags, SIZE_T bytes) {
   std::size_t size = bytes == 0 ? 1 : bytes;
-  return (flags & LMEM_ZEROINIT) ? std::calloc(1, size) : std::malloc(size);
+  return (flags & LMEM_ZEROINIT) ? quorrel::allocateZeroed(1, size) : quorrel::allocateBytes(size);
 }
 
 HLOCAL LocalFree(HLOCAL memory) {

@@ -125,7 +125,13 @@ void insertRowFromList(ElementArray& array, const char* list, int32_t n) {
   if (int64_t{array.size()} + columns > ElementArray::kMaxSize) return;
   const std::vector<std::string> fields = splitFields(array, list, columns);
   const int32_t base = visibleCellIndex(array, n, 0);
-  for (int32_t i = 0; i < columns; ++i) array.insertString(fieldText(fields, i), base + i);
+  const ElementArray::EditMark mark = array.editMark();
+  try {
+    for (int32_t i = 0; i < columns; ++i) array.insertString(fieldText(fields, i), base + i);
+  } catch (...) {
+    array.undoInserts(mark, base);
+    throw;
+  }
 }
 
 void appendRowFromList(ElementArray& array, const char* list) {
@@ -138,7 +144,30 @@ void replaceRowWithList(ElementArray& array, const char* list, int32_t n) {
   const std::vector<std::string> fields = splitFields(array, list, columns);
   const int32_t base = visibleCellIndex(array, n, 0);
   if (int64_t{base} + columns > ElementArray::kMaxSize) return;  // as for inserts
-  for (int32_t i = 0; i < columns; ++i) array.setString(fieldText(fields, i), base + i);
+  // Cells in range are made first (keys kept) and swapped in; only a row number out of
+  // range also lands past the end, where setString grows the array. A failure swaps
+  // the old cells back and takes any growth back.
+  const ElementArray::EditMark mark = array.editMark();
+  const int32_t first = std::max(base, 0);
+  const int32_t inRange = std::max(0, std::min(base + columns, array.size()) - first);
+  std::vector<Element> cells;
+  cells.reserve(static_cast<std::size_t>(inRange));
+  for (int32_t k = first; k < first + inRange; ++k) {
+    const Element& old = array.at(k);
+    const ElementValue value = ElementValue::ofText(fieldText(fields, k - base));
+    cells.push_back(old.hasKey() ? Element::keyed(value, old.key()->view()) : Element::of(value));
+  }
+  array.swapElements(first, cells);
+  if (inRange > 0) array.rebalanceCapacity();
+  try {
+    for (int32_t i = first + inRange - base; i < columns; ++i) {
+      array.setString(fieldText(fields, i), base + i);
+    }
+  } catch (...) {
+    array.undoInserts(mark, mark.size);
+    array.swapElements(first, cells);
+    throw;
+  }
 }
 
 void deleteRow(ElementArray& array, int32_t n) {
@@ -176,11 +205,20 @@ void setLabel(ElementArray& array, const char* text, int32_t column) {
   if (!isTable(array) || numberOfCols(array) > kMaxLabelColumns) return;
   // The list follows the column count only here, so a change of the X boundary shows
   // in the labels at the next setLabel.
-  if (!array.labels) array.labels.emplace();
-  array.labels->resize(static_cast<std::size_t>(std::max(numberOfCols(array), 0)));
-  if (text == nullptr || column < 0) return;
-  if (static_cast<std::size_t>(column) >= array.labels->size()) return;
-  (*array.labels)[static_cast<std::size_t>(column)] = text;
+  // Whatever allocates comes before the first change.
+  const auto columns = static_cast<std::size_t>(std::max(numberOfCols(array), 0));
+  std::optional<std::string> label;
+  if (text != nullptr && column >= 0 && static_cast<std::size_t>(column) < columns) {
+    label.emplace(text);
+  }
+  if (!array.labels) {
+    LabelList fresh(columns);
+    array.labels = std::move(fresh);
+  } else {
+    array.labels->reserve(columns);
+    array.labels->resize(columns);
+  }
+  if (label) (*array.labels)[static_cast<std::size_t>(column)] = std::move(label);
 }
 
 int32_t columnOfLabel(const ElementArray& array, const char* name) {

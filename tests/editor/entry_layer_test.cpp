@@ -1,0 +1,249 @@
+// The entry layer as a careless or failing host meets it: codes out of range, null and
+// destroyed records, stale handles, and allocations that throw inside every family of
+// entry points. Nothing may crash and no exception may leave an entry point.
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <cstring>
+#include <new>
+#include <vector>
+
+#include "host/entry_points.h"
+#include "host/run_record.h"
+#include "platform/windows_services.h"
+
+namespace {
+
+// While set, every operator new of the process throws; the count shows that the code
+// under test did try to allocate.
+bool refuseAllocations = false;
+int refused = 0;
+
+}  // namespace
+
+// The replacement pair is malloc and free, which GCC takes for a mismatch where it
+// inlines them into standard containers.
+#pragma GCC diagnostic ignored "-Wmismatched-new-delete"
+
+void* operator new(std::size_t size) {
+  if (refuseAllocations) {
+    ++refused;
+    throw std::bad_alloc();
+  }
+  if (void* p = std::malloc(size == 0 ? 1 : size)) return p;
+  throw std::bad_alloc();
+}
+void operator delete(void* p) noexcept {
+  std::free(p);
+}
+void operator delete(void* p, std::size_t) noexcept {
+  std::free(p);
+}
+
+namespace {
+
+using quorrel::ElementArray;
+namespace abi = quorrel::abi;
+namespace host = quorrel::host;
+using abi::HostWord;
+
+// A run record with a run-time header whose services hand over "," and a buffer.
+struct Instance {
+  std::vector<unsigned char> record = std::vector<unsigned char>(abi::kRunRecordSize, 0);
+  std::vector<unsigned char> header = std::vector<unsigned char>(abi::kRunHeaderMinSize, 0);
+  static inline char result[256];
+
+  static HostWord QUORREL_CALL fetch(void*, int32_t, HostWord) {
+    return reinterpret_cast<HostWord>(",");
+  }
+  static char* QUORREL_CALL allocate(void*, int32_t, int32_t) { return result; }
+
+  Instance() {
+    host::writeField<void*>(record.data(), abi::kRunHeader, header.data());
+    host::writeField<abi::FetchParameterService>(header.data(), abi::kFetchFirstParameter, fetch);
+    host::writeField<abi::FetchParameterService>(header.data(), abi::kFetchNextParameter, fetch);
+    host::writeField<abi::AllocateResultStringService>(header.data(), abi::kAllocateResultString,
+                                                       allocate);
+  }
+  void* data() { return record.data(); }
+  const ElementArray* array() const { return host::elementArrayOf(record.data()); }
+};
+
+const abi::ActionRoutine* actions() {
+  static std::vector<unsigned char> info(64, 0);
+  GetRunObjectInfos(0, info.data());
+  return host::readField<const abi::ActionRoutine*>(info.data(), abi::kInfoActionRoutines);
+}
+const abi::ExpressionRoutine* expressions() {
+  static std::vector<unsigned char> info(64, 0);
+  GetRunObjectInfos(0, info.data());
+  return host::readField<const abi::ExpressionRoutine*>(info.data(), abi::kInfoExpressionRoutines);
+}
+
+TEST(EntryLayer, CodesOutOfRangeGetNoEntryTitleOrString) {
+  // The condition table's one entry is code 0; the low 16 bits of a code count.
+  for (int32_t code : {-1, 79, 80, 0x7FFF, 0x8000, 0x1004F}) {
+    EXPECT_EQ(GetActionInfos(nullptr, code), nullptr) << code;
+  }
+  for (int32_t code : {-1, 60, 0x7FFF, 0x1003C}) {
+    EXPECT_EQ(GetExpressionInfos(nullptr, code), nullptr) << code;
+  }
+  for (int32_t code : {-1, 1, 2}) EXPECT_EQ(GetConditionInfos(nullptr, code), nullptr) << code;
+  EXPECT_NE(GetActionInfos(nullptr, 78), nullptr);
+  EXPECT_NE(GetExpressionInfos(nullptr, 0x1003B), nullptr);
+
+  // Action 200 would be string 28400 (expression 0's name), expression -200 an action's.
+  struct Call {
+    const char* what;
+    int32_t (*call)(char*, int32_t);
+  };
+  const Call calls[] = {
+      {"action string 200", [](char* b, int32_t n) { return GetActionString(nullptr, 200, b, n); }},
+      {"expression string -200",
+       [](char* b, int32_t n) { return GetExpressionString(nullptr, -200, b, n); }},
+      {"condition string 1",
+       [](char* b, int32_t n) { return GetConditionString(nullptr, 1, b, n); }},
+      {"action title 79", [](char* b, int32_t n) { return GetActionTitle(nullptr, 79, 0, b, n); }},
+      {"action title -1", [](char* b, int32_t n) { return GetActionTitle(nullptr, -1, 1, b, n); }},
+      {"expression title 60",
+       [](char* b, int32_t n) { return GetExpressionTitle(nullptr, 60, b, n); }},
+      {"condition title 1",
+       [](char* b, int32_t n) { return GetConditionTitle(nullptr, 1, 0, b, n); }},
+  };
+  for (const Call& c : calls) {
+    char buffer[64] = "untouched";
+    EXPECT_EQ(c.call(buffer, sizeof buffer), 0) << c.what;
+    EXPECT_STREQ(buffer, "") << c.what;
+    EXPECT_EQ(c.call(nullptr, 64), 0) << c.what;
+  }
+}
+
+TEST(EntryLayer, NullAndDestroyedRecordsAreRefused) {
+  EXPECT_EQ(CreateRunObject(nullptr, nullptr, 0), 0);
+  EXPECT_EQ(DestroyRunObject(nullptr, 0), 0);
+  EXPECT_EQ(actions()[8](nullptr, reinterpret_cast<HostWord>("x"), 0), 0);
+  EXPECT_EQ(expressions()[0](nullptr, 0), 0u);
+
+  Instance instance;
+  CreateRunObject(instance.data(), nullptr, 0);
+  ASSERT_NE(instance.array(), nullptr);
+  actions()[8](instance.data(), reinterpret_cast<HostWord>("x"), 0);
+  EXPECT_EQ(expressions()[0](instance.data(), 0), 1u);
+  // A second destroy, and calls after the first, find no array (ASan sees any reuse).
+  EXPECT_EQ(DestroyRunObject(instance.data(), 0), 0);
+  EXPECT_EQ(instance.array(), nullptr);
+  EXPECT_EQ(DestroyRunObject(instance.data(), 0), 0);
+  EXPECT_EQ(actions()[8](instance.data(), reinterpret_cast<HostWord>("x"), 0), 0);
+  EXPECT_EQ(expressions()[0](instance.data(), 0), 0u);
+
+  // A header without services: parameters arrive as 0 and no text is handed over.
+  Instance bare;
+  std::memset(bare.header.data(), 0, bare.header.size());
+  CreateRunObject(bare.data(), nullptr, 0);
+  actions()[8](bare.data(), reinterpret_cast<HostWord>("x"), 0);
+  EXPECT_EQ(expressions()[16](bare.data(), 0), 0u);
+  host::writeField<void*>(bare.record.data(), abi::kRunHeader, nullptr);
+  EXPECT_EQ(expressions()[16](bare.data(), 0), 0u);
+  DestroyRunObject(bare.data(), 0);
+}
+
+TEST(EntryLayer, StaleMenuHandlesNameNothing) {
+  // Menus freed and made again, many times: no new handle is an old one, so the old
+  // ones stay dead even where the allocator hands the same memory out again.
+  std::vector<HMENU> dead;
+  for (int i = 0; i < 100; ++i) {
+    HMENU menu = CreatePopupMenu();
+    ASSERT_NE(menu, nullptr);
+    for (HMENU old : dead) ASSERT_NE(menu, old);
+    ASSERT_TRUE(DestroyMenu(menu));
+    dead.push_back(menu);
+  }
+  HMENU live = CreatePopupMenu();
+  for (HMENU old : dead) {
+    EXPECT_FALSE(DestroyMenu(old));
+    EXPECT_EQ(GetMenuItemCount(old), -1);
+    EXPECT_FALSE(AppendMenuA(old, MF_STRING, 1, "x"));
+  }
+  EXPECT_EQ(GetMenuItemCount(live), 0);
+  DestroyMenu(live);
+}
+
+// With every allocation throwing, an entry point of each family answers its failure
+// value (and the host may go on using the module). Expressions, whose texts are built
+// inside the standard library here, are failed allocation by allocation in
+// fuzz/alloc_faults.cpp.
+TEST(EntryLayer, ThrowsInsideEveryFamilyStayInside) {
+  actions();  // the test's own tables are read before memory runs out
+  expressions();
+  Instance ready;
+  CreateRunObject(ready.data(), nullptr, 0);
+  for (const char* text : {"a", "b"})
+    actions()[8](ready.data(), reinterpret_cast<HostWord>(text), 0);
+  HMENU menu = CreatePopupMenu();
+  std::vector<unsigned char> setup(abi::kSetupRecordSize, 0);
+  Instance fresh;
+
+  struct Call {
+    const char* family;
+    HostWord (*call)(Instance&, Instance&, HMENU, void*);
+    HostWord failure;
+  };
+  const Call calls[] = {
+      {"run object",
+       [](Instance&, Instance& f, HMENU, void*) -> HostWord {
+         CreateRunObject(f.data(), nullptr, 0);
+         return f.array() != nullptr;
+       },
+       0},
+      {"action",
+       [](Instance& r, Instance&, HMENU, void*) -> HostWord {
+         // A delimiter too long to be stored without an allocation.
+         actions()[57](r.data(), reinterpret_cast<HostWord>("; a delimiter of forty characters ;"),
+                       0);
+         return expressions()[0](r.data(), 0);  // the size
+       },
+       2},
+      {"menu",
+       [](Instance&, Instance&, HMENU, void*) {
+         return reinterpret_cast<HostWord>(GetActionMenu(0, 0, 0));
+       },
+       0},
+      {"title",
+       [](Instance&, Instance&, HMENU, void*) -> HostWord {
+         char buffer[64];
+         return static_cast<HostWord>(GetActionTitle(nullptr, 6, 0, buffer, sizeof buffer));
+       },
+       0},
+      {"editor",
+       [](Instance&, Instance&, HMENU, void* s) -> HostWord {
+         return static_cast<HostWord>(CreateObject(nullptr, 0, s));
+       },
+       static_cast<HostWord>(-1)},
+      {"platform menus",
+       [](Instance&, Instance&, HMENU m, void*) -> HostWord {
+         return static_cast<HostWord>(AppendMenuA(m, MF_STRING, 1, "item")) +
+                reinterpret_cast<HostWord>(CreatePopupMenu()) +
+                reinterpret_cast<HostWord>(LoadMenuA(nullptr, MAKEINTRESOURCEA(20000)));
+       },
+       0},
+  };
+  for (const Call& c : calls) {
+    refused = 0;
+    refuseAllocations = true;
+    const HostWord answer = c.call(ready, fresh, menu, setup.data());
+    refuseAllocations = false;
+    EXPECT_GT(refused, 0) << c.family;
+    EXPECT_EQ(answer, c.failure) << c.family;
+  }
+  // Everything works again once memory is back.
+  EXPECT_EQ(calls[1].call(ready, fresh, menu, setup.data()), 2u);
+  const auto built = reinterpret_cast<HMENU>(calls[2].call(ready, fresh, menu, setup.data()));
+  EXPECT_NE(built, nullptr);
+  DestroyMenu(built);
+  EXPECT_EQ(GetMenuItemCount(menu), 0);
+  DestroyMenu(menu);
+  DestroyRunObject(ready.data(), 0);
+  DestroyRunObject(fresh.data(), 0);
+}
+
+}  // namespace
