@@ -27,38 +27,18 @@
 #include "host/abi.h"
 #include "host/entry_points.h"
 #include "host/run_record.h"
+#include "hostsim/host_simulator.h"
 
 namespace quorrel::fuzz {
 
 namespace fs = std::filesystem;
 using abi::HostWord;
 
-// The routine tables and information entries, as the host reads them.
-struct ModuleTables {
-  const abi::ActionRoutine* actions = nullptr;
-  const abi::ExpressionRoutine* expressions = nullptr;
-  int actionCount = 0;
-  int expressionCount = 0;
-
-  static const ModuleTables& get() {
-    static const ModuleTables tables = load();
-    return tables;
-  }
-
- private:
-  static ModuleTables load() {
-    unsigned char info[64];
-    std::memset(info, 0xCC, sizeof info);
-    GetRunObjectInfos(0, info);
-    ModuleTables t;
-    t.actions = host::readField<const abi::ActionRoutine*>(info, abi::kInfoActionRoutines);
-    t.expressions =
-        host::readField<const abi::ExpressionRoutine*>(info, abi::kInfoExpressionRoutines);
-    t.actionCount = host::readField<uint16_t>(info, abi::kInfoActionCount);
-    t.expressionCount = host::readField<uint16_t>(info, abi::kInfoExpressionCount);
-    return t;
-  }
-};
+// The module linked into this program, reached as a host reaches it.
+inline const hostsim::Module& linkedModule() {
+  static const std::unique_ptr<hostsim::Module> module = hostsim::Module::linked();
+  return *module;
+}
 
 // The private folder every file action works in, and the working directory as it was
 // when the process started: nothing may ever appear there.
@@ -112,17 +92,10 @@ class FuzzFolder {
 };
 
 // One argument: a number or a text the host owns for the call.
-struct HostArg {
-  bool isText = false;
-  int32_t number = 0;
-  std::string text;
-  std::string describe() const {
-    return isText ? "\"" + text.substr(0, 40) + "\"" : std::to_string(number);
-  }
-  HostWord word() const {
-    return isText ? reinterpret_cast<HostWord>(text.c_str()) : static_cast<HostWord>(number);
-  }
-};
+using HostArg = hostsim::Argument;
+inline std::string describe(const HostArg& arg) {
+  return arg.isText ? "\"" + arg.text.substr(0, 40) + "\"" : std::to_string(arg.number);
+}
 
 // QUORREL_FUZZ_TRACE=1 prints every call, to see what a finding did.
 inline bool tracing() {
@@ -166,123 +139,98 @@ class ObservedCall {
   bool host_;
 };
 
-// One run-time instance with its record and fake run-time header.
-class FuzzInstance {
+// One run-time instance of the host simulator. Every call into the module is bracketed
+// for the call observer, and after every call the array's invariants and the services'
+// use are checked.
+class FuzzInstance final : hostsim::Instance::ServiceObserver {
  public:
-  explicit FuzzInstance(const std::vector<unsigned char>& setupRecord) {
-    const int16_t dataSize = GetRunObjectDataSize(0, 0);
-    if (dataSize < static_cast<int16_t>(abi::kRunRecordSize)) __builtin_trap();
-    record_.assign(static_cast<size_t>(dataSize), 0);
-    header_.assign(abi::kRunHeaderMinSize, 0);
-    host::writeField<FuzzInstance*>(record_.data(), 0, this);  // host-owned bytes
-    host::writeField<void*>(record_.data(), abi::kRunHeader, header_.data());
-    host::writeField<abi::FetchParameterService>(header_.data(), abi::kFetchFirstParameter,
-                                                 &fetchFirst);
-    host::writeField<abi::FetchParameterService>(header_.data(), abi::kFetchNextParameter,
-                                                 &fetchNext);
-    host::writeField<abi::AllocateResultStringService>(header_.data(), abi::kAllocateResultString,
-                                                       &allocate);
-    std::vector<unsigned char> setup = setupRecord;
+  explicit FuzzInstance(const hostsim::SetupRecord& setup)
+      : instance_(linkedModule(), setup, false) {
+    if (GetRunObjectDataSize(0, 0) < static_cast<int16_t>(abi::kRunRecordSize)) __builtin_trap();
+    instance_.serviceObserver = this;
     ObservedCall call(nullptr);
-    CreateRunObject(record_.data(), setup.data(), 0);
+    instance_.create();
     call.leave(array(), -1);
     check();
   }
-  ~FuzzInstance() {
+  ~FuzzInstance() override {
     ObservedCall call(array());
-    DestroyRunObject(record_.data(), 0);
+    instance_.destroy();
     call.leave(nullptr, -1);
   }
   FuzzInstance(const FuzzInstance&) = delete;
   FuzzInstance& operator=(const FuzzInstance&) = delete;
 
-  const ElementArray* array() const { return host::elementArrayOf(record_.data()); }
+  const ElementArray* array() { return host::elementArrayOf(instance_.record()); }
 
   void action(int code, const HostArg& p1, const HostArg& p2) {
     if (tracing()) {
-      std::fprintf(stderr, "A %d %s %s (size %d)\n", code, p1.describe().c_str(),
-                   p2.describe().c_str(), array() ? array()->size() : -1);
+      std::fprintf(stderr, "A %d %s %s (size %d)\n", code, describe(p1).c_str(),
+                   describe(p2).c_str(), array() ? array()->size() : -1);
     }
+    const std::vector<HostArg> args{p1, p2};  // the host's allocation, before the call
     ObservedCall call(array());
-    ModuleTables::get().actions[code](record_.data(), p1.word(), p2.word());
+    instance_.callAction(code, args);
     call.leave(array(), code);
     check();
   }
 
-  // Calls an expression with the flags the host had before; answers the text result or
-  // nothing. A text result must lie in the one buffer allocated for it.
+  // Calls an expression with the flags the host had before; a text result must lie in
+  // the one buffer allocated for it.
   void expression(int code, std::vector<HostArg> params, uint16_t flagsBefore) {
     if (tracing()) std::fprintf(stderr, "E %d\n", code);
-    params_ = std::move(params);
-    next_ = 0;
-    buffers_.clear();
-    host::writeField<uint16_t>(record_.data(), abi::kRunHostFlags, flagsBefore);
+    const std::vector<HostArg> given = params;
+    instance_.setFlags(flagsBefore);
     ObservedCall call(array());
-    const HostWord result = ModuleTables::get().expressions[code](record_.data(), 0x5EED);
+    const HostWord result = instance_.callExpressionRaw(code, std::move(params), 0x5EED);
     call.leave(array(), 100 + code);
-    const auto flags = host::readField<uint16_t>(record_.data(), abi::kRunHostFlags);
+    checkServices(given);
+    const uint16_t flags = instance_.flags();
     // Only the string bit may change, and only from clear to set.
     if ((flags & ~abi::kResultIsString) != (flagsBefore & ~abi::kResultIsString)) {
       __builtin_trap();
     }
     if ((flagsBefore & abi::kResultIsString) && !(flags & abi::kResultIsString)) __builtin_trap();
     const bool newlyText = (flags & abi::kResultIsString) && !(flagsBefore & abi::kResultIsString);
-    if (newlyText || !buffers_.empty()) checkTextResult(result);
-    if (!(flags & abi::kResultIsString) && !buffers_.empty()) {
+    if (newlyText || !instance_.results().empty()) checkTextResult(result);
+    if (!(flags & abi::kResultIsString) && !instance_.results().empty()) {
       __builtin_trap();  // a buffer was allocated for a number result
     }
     check();
   }
 
-  void check() const {
+  void check() {
     const ElementArray* a = array();
     if (a != nullptr) checkInvariants(*a);
   }
 
  private:
+  void enterService() override { callObserver ? callObserver->enterHost() : void(); }
+  void leaveService() override { callObserver ? callObserver->leaveHost() : void(); }
+
+  // Fetches in order, with the host's token, each of the type its parameter was given
+  // as, never more than were given; result buffers of a positive size.
+  void checkServices(const std::vector<HostArg>& given) const {
+    if (instance_.fetches.size() > given.size()) __builtin_trap();
+    for (size_t i = 0; i < instance_.fetches.size(); ++i) {
+      const hostsim::FetchCall& fetch = instance_.fetches[i];
+      if (fetch.token != 0x5EED || fetch.first != (i == 0)) __builtin_trap();
+      const bool text = fetch.typeFlag == abi::kFetchText;
+      if (!text && fetch.typeFlag != abi::kFetchInteger) __builtin_trap();
+      if (text != given[i].isText) __builtin_trap();
+    }
+    for (const auto& [size, reserved] : instance_.allocations) {
+      if (reserved != 0 || size <= 0) __builtin_trap();
+    }
+  }
   void checkTextResult(HostWord result) const {
-    if (buffers_.size() != 1) __builtin_trap();
-    const std::vector<char>& buffer = *buffers_.back();
+    if (instance_.results().size() != 1) __builtin_trap();
+    const std::vector<char>& buffer = instance_.results().back();
     if (result != reinterpret_cast<HostWord>(buffer.data())) __builtin_trap();
     if (std::memchr(buffer.data(), 0, buffer.size()) == nullptr) __builtin_trap();
   }
 
-  static FuzzInstance* owner(void* record) { return host::readField<FuzzInstance*>(record, 0); }
-  static HostWord QUORREL_CALL fetchFirst(void* record, int32_t flag, HostWord token) {
-    ObservedCall host(nullptr, true);
-    FuzzInstance* self = owner(record);
-    self->next_ = 0;
-    return self->fetch(flag, token);
-  }
-  static HostWord QUORREL_CALL fetchNext(void* record, int32_t flag, HostWord token) {
-    ObservedCall host(nullptr, true);
-    return owner(record)->fetch(flag, token);
-  }
-  // Exactly the requested size, so that the sanitizer sees any write past it.
-  static char* QUORREL_CALL allocate(void* record, int32_t count, int32_t reserved) {
-    ObservedCall host(nullptr, true);
-    FuzzInstance* self = owner(record);
-    if (reserved != 0 || count <= 0) __builtin_trap();
-    self->buffers_.push_back(std::make_unique<std::vector<char>>(static_cast<size_t>(count), 0x7f));
-    return self->buffers_.back()->data();
-  }
-  HostWord fetch(int32_t flag, HostWord token) {
-    if (token != 0x5EED) __builtin_trap();
-    if (next_ >= params_.size()) __builtin_trap();  // more fetches than declared parameters
-    const HostArg& arg = params_[next_++];
-    if (flag == abi::kFetchText) {
-      if (!arg.isText) __builtin_trap();
-      return reinterpret_cast<HostWord>(arg.text.c_str());
-    }
-    if (flag != abi::kFetchInteger || arg.isText) __builtin_trap();
-    return static_cast<HostWord>(arg.number);
-  }
-
-  std::vector<unsigned char> record_;
-  std::vector<unsigned char> header_;
-  std::vector<HostArg> params_;
-  size_t next_ = 0;
-  std::vector<std::unique_ptr<std::vector<char>>> buffers_;
+  hostsim::Instance instance_;
 };
 
 // The declared parameter types of a code, from the information entries.

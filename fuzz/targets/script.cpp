@@ -18,6 +18,7 @@ namespace {
 using namespace quorrel::fuzz;
 namespace tool = quorrel::tool;
 namespace abi = quorrel::abi;
+namespace hostsim = quorrel::hostsim;
 
 constexpr int kMaxCalls = 200;
 constexpr int32_t kMaxElements = 65536;
@@ -29,22 +30,6 @@ void checkRoundTrip(const std::string& text) {
   if (tool::parseQuoted(tool::quoteText(text)) != text) __builtin_trap();
 }
 
-std::vector<unsigned char> setupRecord(const tool::SetupFields& fields) {
-  std::vector<unsigned char> setup(abi::kSetupRecordSize, 0);
-  using quorrel::host::writeField;
-  writeField<int16_t>(setup.data(), abi::kSetupObjectWidth, 32);
-  writeField<int16_t>(setup.data(), abi::kSetupObjectHeight, 32);
-  writeField<int32_t>(setup.data(), abi::kSetupDimensionCount, fields.dims);
-  writeField<int32_t>(setup.data(), abi::kSetupXBoundary, fields.x);
-  writeField<int32_t>(setup.data(), abi::kSetupYBoundary, fields.y);
-  writeField<int32_t>(setup.data(), abi::kSetupCaseSensitive, fields.caseSensitive);
-  writeField<int32_t>(setup.data(), abi::kSetupWildcardSearch, fields.wildcard);
-  writeField<int32_t>(setup.data(), abi::kSetupAutoSelectRows, fields.autoSelect);
-  std::memcpy(setup.data() + abi::kSetupListDelimiter, fields.delimiter.data(),
-              std::min(fields.delimiter.size(), tool::kMaxDelimiterLength));
-  return setup;
-}
-
 // The arguments as the host hands them over, when they fit the declared types.
 bool hostArgs(const tool::Command& command, const abi::InfoEntry& info, uint16_t textType,
               int pathParameter, std::vector<HostArg>& out) {
@@ -54,7 +39,7 @@ bool hostArgs(const tool::Command& command, const abi::InfoEntry& info, uint16_t
   for (size_t i = 0; i < declared; ++i) {
     const tool::Argument& arg = command.args[i];
     if (arg.isText != (info.paramTypes[i] == textType)) return false;
-    HostArg host{arg.isText, arg.number, arg.text};
+    HostArg host = arg;
     if (pathParameter == static_cast<int>(i) + 1) {
       host.text = FuzzFolder::get().path() + "/f" + std::to_string(arg.text.size() % 4);
     }
@@ -80,11 +65,11 @@ void run(const tool::Command& command, std::unique_ptr<FuzzInstance>& instance) 
     const tool::SetupFields& s = command.setup;
     if (s.x > 1024 || s.y > 1024) return;
     instance.reset();
-    instance = std::make_unique<FuzzInstance>(setupRecord(s));
+    instance = std::make_unique<FuzzInstance>(hostsim::SetupRecord(s));
     return;
   }
   if (command.code < 0 || !saneNumbers(command)) return;  // named expressions need the editor
-  if (!instance) instance = std::make_unique<FuzzInstance>(setupRecord({}));
+  if (!instance) instance = std::make_unique<FuzzInstance>(hostsim::SetupRecord());
   std::vector<HostArg> args;
   if (command.kind == tool::CommandKind::Action) {
     if (!hostArgs(command, actionInfo(command.code), abi::kActionParamText,

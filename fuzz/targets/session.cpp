@@ -30,6 +30,7 @@ using quorrel::ElementArray;
 using quorrel::FuzzInput;
 using namespace quorrel::fuzz;
 namespace abi = quorrel::abi;
+namespace hostsim = quorrel::hostsim;
 
 // Allocation-failure runs build this target with a longer session.
 #ifndef QUORREL_SESSION_STEPS
@@ -134,25 +135,21 @@ std::string fuzzPath(FuzzInput& in) {
   return *name == '\0' ? folder : folder + "/" + name;  // the folder itself as a path
 }
 
-std::vector<unsigned char> fuzzSetup(FuzzInput& in) {
-  std::vector<unsigned char> setup(abi::kSetupRecordSize, 0);
-  using quorrel::host::writeField;
-  writeField<int16_t>(setup.data(), abi::kSetupObjectWidth, static_cast<int16_t>(in.int32()));
-  writeField<int16_t>(setup.data(), abi::kSetupObjectHeight, static_cast<int16_t>(in.int32()));
-  writeField<int32_t>(setup.data(), abi::kSetupDimensionCount,
-                      static_cast<int32_t>(in.byte() % 14) - 1);
-  writeField<int32_t>(setup.data(), abi::kSetupXBoundary, fuzzBoundary(in));
-  writeField<int32_t>(setup.data(), abi::kSetupYBoundary, fuzzBoundary(in));
-  writeField<int32_t>(setup.data(), abi::kSetupCaseSensitive, in.byte() % 3);
-  writeField<int32_t>(setup.data(), abi::kSetupWildcardSearch, in.byte() % 3);
-  writeField<int32_t>(setup.data(), abi::kSetupAutoSelectRows, in.byte() % 3);
-  char* delimiter = reinterpret_cast<char*>(setup.data() + abi::kSetupListDelimiter);
+hostsim::SetupRecord fuzzSetup(FuzzInput& in) {
+  hostsim::SetupRecord setup;
+  abi::writeField(setup.data(), abi::kSetupObjectWidth, static_cast<int16_t>(in.int32()));
+  abi::writeField(setup.data(), abi::kSetupObjectHeight, static_cast<int16_t>(in.int32()));
+  setup.set(abi::kSetupDimensionCount, static_cast<int32_t>(in.byte() % 14) - 1);
+  setup.set(abi::kSetupXBoundary, fuzzBoundary(in));
+  setup.set(abi::kSetupYBoundary, fuzzBoundary(in));
+  setup.set(abi::kSetupCaseSensitive, in.byte() % 3);
+  setup.set(abi::kSetupWildcardSearch, in.byte() % 3);
+  setup.set(abi::kSetupAutoSelectRows, in.byte() % 3);
   if (in.byte() % 8 == 0) {
     // A field filled to its end without a terminator.
-    std::memset(delimiter, ';', abi::kSetupListDelimiterSize);
+    std::memset(setup.data() + abi::kSetupListDelimiter, ';', abi::kSetupListDelimiterSize);
   } else {
-    const std::string text = fuzzText(in);
-    std::memcpy(delimiter, text.data(), std::min(text.size(), abi::kSetupListDelimiterSize - 1));
+    setup.delimiter(fuzzText(in));
   }
   return setup;
 }
@@ -177,7 +174,7 @@ void runAction(FuzzInstance& instance, FuzzInput& in, int code) {
 }
 
 void runExpression(FuzzInstance& instance, FuzzInput& in) {
-  const int code = in.byte() % ModuleTables::get().expressionCount;
+  const int code = in.byte() % abi::kExpressionCount;
   const abi::InfoEntry& info = expressionInfo(code);
   std::vector<HostArg> params;
   for (uint16_t type : info.paramTypes) {
@@ -209,7 +206,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
       instance.reset();
       instance = std::make_unique<FuzzInstance>(fuzzSetup(in));
     } else if (what < 140) {
-      const int code = in.byte() % ModuleTables::get().actionCount;
+      const int code = in.byte() % abi::kActionCount;
       runAction(*instance, in, code);
       if (writesFile(code) && folder.totalBytes() > kMaxFolderBytes) break;
       const ElementArray* array = instance->array();

@@ -127,6 +127,12 @@ std::unique_ptr<Module> Module::open(const std::string& path) {
   return std::unique_ptr<Module>(new Module(path, handle));
 }
 
+std::unique_ptr<Module> Module::linked() {
+  void* self = dlopen(nullptr, RTLD_NOW);
+  if (!self) throw ModuleError(std::string("cannot read this program's symbols: ") + dlerror());
+  return std::unique_ptr<Module>(new Module("(linked in)", self));
+}
+
 void* Module::symbol(const char* name) const {
   return dlsym(handle_, name);
 }
@@ -284,18 +290,42 @@ void Instance::create() {
   module_.entry<abi::CreateRunObjectFn>("CreateRunObject")(record(), setup_.data(), 0);
 }
 
-Instance::~Instance() {
+void Instance::destroy() {
   if (!created_) return;
-  if (const auto destroy = optional<abi::DestroyRunObjectFn>(module_, "DestroyRunObject")) {
-    destroy(record(), 0);
+  created_ = false;
+  if (const auto destroyFn = optional<abi::DestroyRunObjectFn>(module_, "DestroyRunObject")) {
+    destroyFn(record(), 0);
   }
 }
+
+Instance::~Instance() {
+  destroy();
+}
+
+namespace {
+// Brackets one host service for the instance's observer.
+class ServiceCall {
+ public:
+  explicit ServiceCall(Instance::ServiceObserver* observer) : observer_(observer) {
+    if (observer_) observer_->enterService();
+  }
+  ~ServiceCall() {
+    if (observer_) observer_->leaveService();
+  }
+  ServiceCall(const ServiceCall&) = delete;
+  ServiceCall& operator=(const ServiceCall&) = delete;
+
+ private:
+  Instance::ServiceObserver* observer_;
+};
+}  // namespace
 
 Instance& Instance::of(void* runRecord) {
   return *readField<Instance*>(runRecord, 0);
 }
 
 abi::HostWord Instance::fetch(bool first, int32_t typeFlag, abi::HostWord token) {
+  const ServiceCall service(serviceObserver);
   fetches.push_back({first, typeFlag, token});
   if (first) nextParameter_ = 0;
   if (nextParameter_ >= pending_.size()) return 0;
@@ -318,6 +348,7 @@ abi::HostWord QUORREL_CALL Instance::fetchNext(void* runRecord, int32_t typeFlag
 
 char* QUORREL_CALL Instance::allocate(void* runRecord, int32_t byteCount, int32_t reserved) {
   Instance& self = of(runRecord);
+  const ServiceCall service(self.serviceObserver);
   self.allocations.emplace_back(byteCount, reserved);
   // Filled with a marker, not zeros, so that a text that is not terminated shows.
   self.results_.emplace_back(static_cast<size_t>(std::max(byteCount, 1)), '\x7f');

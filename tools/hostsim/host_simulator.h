@@ -53,11 +53,18 @@ class Module {
  public:
   // Opens the library; throws ModuleError when it or a run-side entry point is missing.
   static std::unique_ptr<Module> open(const std::string& path);
+#ifndef _WIN32
+  // The module linked into this program, whose entry points it exports (the fuzzers
+  // link it in so that coverage and the sanitizers see all of it).
+  static std::unique_ptr<Module> linked();
+#endif
   ~Module();
   Module(const Module&) = delete;
   Module& operator=(const Module&) = delete;
 
-  const std::string& path() const { return path_; }
+  const std::string& path() const {
+    return path_;
+  }
   Signature actionSignature(int32_t code) const;
   Signature expressionSignature(int32_t code) const;
 
@@ -122,6 +129,8 @@ class Instance {
   Instance& operator=(const Instance&) = delete;
 
   void create();
+  // DestroyRunObject, once; the destructor calls it when it has not been.
+  void destroy();
   void* record() { return runRecord_.data(); }
   uint16_t flags() const { return abi::readField<uint16_t>(runRecord_.data(), abi::kRunHostFlags); }
   void setFlags(uint16_t value) { abi::writeField(runRecord_.data(), abi::kRunHostFlags, value); }
@@ -134,9 +143,19 @@ class Instance {
   ExpressionResult callExpression(int32_t code, const std::vector<Argument>& args);
 
   // The services' calls during the last expression: fetches, and the byte count and
-  // reserved word of each result buffer asked for.
+  // reserved word of each result buffer asked for, and the buffers handed out.
   std::vector<FetchCall> fetches;
   std::vector<std::pair<int32_t, int32_t>> allocations;
+  const std::deque<std::vector<char>>& results() const { return results_; }
+
+  // Told when a host service starts and ends, so that a test can tell the module's
+  // own work (and allocations) from the host's.
+  struct ServiceObserver {
+    virtual ~ServiceObserver() = default;
+    virtual void enterService() = 0;
+    virtual void leaveService() = 0;
+  };
+  ServiceObserver* serviceObserver = nullptr;
 
  private:
   static Instance& of(void* runRecord);
