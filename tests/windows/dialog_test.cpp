@@ -14,8 +14,10 @@
 #include <vector>
 
 #include "host/abi.h"
+#include "support/setup_dialog.h"
 
 namespace abi = quorrel::abi;
+using namespace quorrel::setup_dialog_test;
 
 namespace {
 
@@ -35,35 +37,6 @@ void checkEqual(const T& actual, const T& expected, const std::string& what) {
   check(actual == expected, what);
 }
 
-using Record = std::array<unsigned char, abi::kSetupRecordSize>;
-using Ints = std::vector<int32_t>;
-
-int32_t readInt(const Record& record, std::size_t offset) {
-  return abi::readField<int32_t>(record.data(), offset);
-}
-std::string delimiterOf(const Record& record) {
-  return reinterpret_cast<const char*>(record.data() + abi::kSetupListDelimiter);
-}
-constexpr std::size_t kFields[] = {abi::kSetupDimensionCount, abi::kSetupXBoundary,
-                                   abi::kSetupYBoundary,      abi::kSetupCaseSensitive,
-                                   abi::kSetupWildcardSearch, abi::kSetupAutoSelectRows};
-Ints fieldsOf(const Record& record) {
-  Ints values;
-  for (std::size_t offset : kFields) values.push_back(readInt(record, offset));
-  return values;
-}
-// A record as the host keeps it: dimension count, X, Y, case, wildcard, auto-select.
-Record storedRecord(const Ints& fields, const char* delimiter = ";") {
-  Record record;
-  record.fill(0xEE);
-  std::memset(record.data(), 0xAB, abi::kSetupHostHeaderSize);
-  for (std::size_t i = 0; i < fields.size(); ++i) {
-    abi::writeField(record.data(), kFields[i], fields[i]);
-  }
-  std::strcpy(reinterpret_cast<char*>(record.data() + abi::kSetupListDelimiter), delimiter);
-  return record;
-}
-
 // The editor context: no owner window, and the host's help service.
 std::vector<std::string> helpCalls;
 void QUORREL_CALL recordHelp(const char* path, abi::HostWord first, abi::HostWord second) {
@@ -76,11 +49,6 @@ struct Editor {
     std::memcpy(context.data() + abi::kEditorHelpService, &help, sizeof help);
   }
 };
-
-constexpr int kOk = 1, kCancel = 2, kHelp = 20100;
-constexpr int k1D = 1000, k2D = 1001, k3D = 1002, kX = 1003, kY = 1004;
-constexpr int kCaseInsensitive = 1005, kCaseSensitive = 1006, kLiteral = 1007, kWildcard = 1008;
-constexpr int kDelimiter = 1009, kOn = 1010, kOff = 1011;
 
 // --- The author: real messages to the real controls ------------------------------
 void click(HWND dialog, int id) {
@@ -104,22 +72,6 @@ std::string fieldText(HWND dialog, int id) {
   GetDlgItemTextA(dialog, id, text, sizeof text);
   return text;
 }
-// The checked radio buttons of all four groups and the enabled boundary fields.
-std::string state(HWND dialog) {
-  const char* names[] = {"1D",        "2D",      "3D",       nullptr, nullptr, "insensitive",
-                         "sensitive", "literal", "wildcard", nullptr, "on",    "off"};
-  std::string out;
-  for (int id = k1D; id <= kOff; ++id) {
-    if (names[id - k1D] && IsDlgButtonChecked(dialog, id) == BST_CHECKED) {
-      out += std::string(out.empty() ? "" : " ") + names[id - k1D];
-    }
-  }
-  out += " |";
-  if (IsWindowEnabled(GetDlgItem(dialog, kX))) out += " X";
-  if (IsWindowEnabled(GetDlgItem(dialog, kY))) out += " Y";
-  return out;
-}
-
 // Catches the dialog as it is activated and acts once the modal loop runs.
 std::function<void(HWND)> currentAct;
 HWND currentDialog = nullptr;
