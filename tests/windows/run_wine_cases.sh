@@ -23,6 +23,9 @@ for f in quorrel.exe quorrel.dll; do
 done
 
 total_fail=0
+run_case() {  # command case workdir
+  bash "$here/../tools/run_case.sh" "$1" "$2" "$3" "$examples"
+}
 run_all() {  # wine build label
   local wine=$1 build=$2 label=$3 passed=0 failed=0 case name
   local command=$work/quorrel-$label
@@ -30,9 +33,15 @@ run_all() {  # wine build label
   chmod +x "$command"
   for case in "$cases"/*.qs "$cases"/*.sh; do
     name=$(basename "$case")
-    if bash "$here/../tools/run_case.sh" "$command" "$case" "$work/$label/${name%.*}" \
-      "$examples" >"$work/$label.log" 2>&1; then
+    if run_case "$command" "$case" "$work/$label/${name%.*}" >"$work/$label.log" 2>&1; then
       passed=$((passed + 1))
+    elif run_case "$command" "$case" "$work/$label/${name%.*}" >"$work/$label.retry.log" 2>&1; then
+      # Wine itself now and then loses a run (seen once: a silent exit status 1 halfway
+      # through a case on a CI machine). A case that passes on its second run counts, and
+      # its first failure stays in the log for whoever looks.
+      passed=$((passed + 1))
+      echo "== $label: $name passed only on a second run; the first one said:"
+      cat "$work/$label.log"
     else
       failed=$((failed + 1))
       echo "== $label: $name failed"
