@@ -170,6 +170,7 @@ const char* Element::numberOrEmptyText(NumberText& scratch) const {
 }
 
 int32_t Element::recordValue() const {
+  if (isBorrowed()) return readDecimal(borrowedText());
   const Record* r = record();
   if (r->type == ElementType::Value) return r->number();
   if (r->type == ElementType::String) return readDecimal(r->payload());
@@ -177,7 +178,7 @@ int32_t Element::recordValue() const {
 }
 
 int32_t Element::textLength() const {
-  if (type() == ElementType::String) return static_cast<int32_t>(std::strlen(record()->payload()));
+  if (type() == ElementType::String) return static_cast<int32_t>(std::strlen(bytes()));
   if (type() == ElementType::Value) {
     NumberText scratch;
     return writeDecimal(number(), scratch.text);
@@ -234,6 +235,8 @@ void Element::setKey(const ElementValue& value) {
   ElementValue current;
   if (isInlineValue()) {
     current = ElementValue::ofValue(inlineNumber());
+  } else if (isBorrowed()) {
+    current = view();
   } else if (isRecord()) {
     const Record* r = record();
     current = {r->type, r->type == ElementType::Value ? r->number() : 0, r->payload(), r->size};

@@ -62,9 +62,16 @@ struct NumberText {
 
 // An element is one machine word, so that the array's slots are small and edits move
 // words. The word is 0 for a keyless None, an odd number carrying the 32-bit value for
-// a keyless Value, and otherwise points to a heap record: a small header followed by
-// the value (the bytes with a hidden terminator, or the number), preceded by the key
-// element when the record was made for a key. Moving an element moves the word.
+// a keyless Value, a borrowed text (below) when its two low bits are 10, and otherwise
+// points to a heap record: a small header followed by the value (the bytes with a
+// hidden terminator, or the number), preceded by the key element when the record was
+// made for a key. Moving an element moves the word.
+//
+// A borrowed text is a keyless String whose zero-terminated text lives in a block that
+// the element does not own (a loaded file's bytes, cut in place): the array that holds
+// the element keeps the block alive (ElementArray::keepBlock). Loading a table thus
+// costs one word per cell on top of the file's own bytes. Editing the element gives it
+// a record of its own; the block stays until the array is cleared.
 class Element {
  public:
   Element() = default;
@@ -85,11 +92,13 @@ class Element {
 
   ElementType type() const {
     if (word_ == 0) return ElementType::None;
-    return isInlineValue() ? ElementType::Value : record()->type;
+    if (isInlineValue()) return ElementType::Value;
+    return isBorrowed() ? ElementType::String : record()->type;
   }
   int32_t size() const {
     if (word_ == 0) return 0;
-    return isInlineValue() ? 4 : record()->size;
+    if (isInlineValue()) return 4;
+    return isBorrowed() ? borrowedSize() : record()->size;
   }
   // The number of a Value; 0 for every other type.
   int32_t number() const {
@@ -98,6 +107,7 @@ class Element {
   }
   // The owned bytes of a String or File; null for None and Value.
   const char* bytes() const {
+    if (isBorrowed()) return borrowedText();
     if (!isRecord()) return nullptr;
     const Record* r = record();
     return r->type != ElementType::None && r->type != ElementType::Value ? r->payload() : nullptr;
@@ -108,13 +118,14 @@ class Element {
   ElementValue view() const {
     if (word_ == 0) return {};
     if (isInlineValue()) return ElementValue::ofValue(inlineNumber());
+    if (isBorrowed()) return {ElementType::String, 0, borrowedText(), borrowedSize()};
     const Record* r = record();
     if (r->type == ElementType::None) return {};
     if (r->type == ElementType::Value) return {ElementType::Value, r->number(), nullptr, r->size};
     return {r->type, 0, r->payload(), r->size};
   }
   bool hasKey() const { return isRecord() && (record()->flags & kHasKey) != 0; }
-  // True for None and keyless Values: nothing to free, nothing to copy.
+  // True for None, keyless Values and borrowed texts: nothing to free.
   bool ownsNothing() const { return !isRecord(); }
 
   // Replaces the value; the key stays. The number 0, a null operand, a size below 1
@@ -128,6 +139,13 @@ class Element {
   // by setKey(key) makes, built with one record instead of two.
   static Element keyed(const ElementValue& value, const ElementValue& key,
                        RecordSlab* slab = nullptr);
+  // A String element reading the zero-terminated `text` in place, without a copy. The
+  // text must stay unchanged and alive as long as the element (see above).
+  static Element borrowed(const char* text) {
+    Element e;
+    e.word_ = (static_cast<uint64_t>(reinterpret_cast<uintptr_t>(text)) << 2) | kBorrowedTag;
+    return e;
+  }
 
   // assign(ElementValue::ofValue(number)) without the detour.
   void assignValue(int32_t number) {
@@ -141,6 +159,7 @@ class Element {
   // The value as text: a String's own text, a Value's decimal form (written into
   // scratch), or "" for None and File. Never null.
   const char* asString(NumberText& scratch) const {
+    if (isBorrowed()) return borrowedText();
     if (isRecord() && record()->type == ElementType::String) return record()->payload();
     return numberOrEmptyText(scratch);
   }
@@ -187,11 +206,19 @@ class Element {
     }
   };
 
+  static constexpr uint64_t kBorrowedTag = 2;
+
   static uint64_t inlineWord(int32_t number) {
     return (uint64_t{static_cast<uint32_t>(number)} << 32) | 1u;
   }
   bool isInlineValue() const { return (word_ & 1u) != 0; }
-  bool isRecord() const { return word_ != 0 && (word_ & 1u) == 0; }
+  bool isBorrowed() const { return (word_ & 3u) == kBorrowedTag; }
+  // Records are 8-aligned, so their words end in three zero bits.
+  bool isRecord() const { return word_ != 0 && (word_ & 3u) == 0; }
+  const char* borrowedText() const {
+    return reinterpret_cast<const char*>(static_cast<uintptr_t>(word_ >> 2));
+  }
+  int32_t borrowedSize() const { return static_cast<int32_t>(std::strlen(borrowedText()) + 1); }
   int32_t inlineNumber() const { return static_cast<int32_t>(static_cast<uint32_t>(word_ >> 32)); }
   Record* record() const { return reinterpret_cast<Record*>(static_cast<uintptr_t>(word_)); }
   static uint64_t recordWord(Record* r) { return reinterpret_cast<uintptr_t>(r); }

@@ -116,6 +116,7 @@ void ElementArray::deleteAt(int32_t index) {
 
 void ElementArray::clear() {
   elements_.clear();
+  blocks_.clear();
   capacity_ = kInitialCapacity;
   syncRowStates();
 }

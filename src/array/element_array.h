@@ -4,6 +4,7 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <span>
 #include <string>
@@ -105,6 +106,10 @@ class ElementArray {
   void deleteAt(int32_t index);
   void clear();
 
+  // Keeps a block of texts alive for elements made with Element::borrowed: until the
+  // array is cleared (or destroyed), since any element may still read from it.
+  void keepBlock(std::shared_ptr<const void> block) { blocks_.push_back(std::move(block)); }
+
   // --- All or nothing ------------------------------------------------------------------
   // The array as clear() leaves it, with the same settings, dimensions and labels: a
   // replacing load fills it and is swapped in only once it is complete.
@@ -198,6 +203,7 @@ class ElementArray {
   int32_t plainAppendLimit_ = 0;
 
   ElementStore elements_;
+  std::vector<std::shared_ptr<const void>> blocks_;
   int32_t capacity_ = kInitialCapacity;
   int32_t dimensions_ = 1;
   int32_t boundaries_[kBoundaryCount] = {-1, 0, 0, 0, 0, 0, 0, 0, 0, 0};

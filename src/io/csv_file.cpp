@@ -1,6 +1,8 @@
 #include "io/csv_file.h"
 
+#include <algorithm>
 #include <cstring>
+#include <memory>
 #include <new>
 #include <span>
 #include <string_view>
@@ -30,12 +32,6 @@ void writeCell(BufferedWriter& out, int32_t column, const char* text) {
   out.text(cell);
 }
 
-int32_t cellsOfLine(const char* line, std::size_t length) {
-  int32_t cells = 1;
-  for (std::size_t i = 0; i < length; ++i) cells += line[i] == ',' ? 1 : 0;
-  return cells;
-}
-
 // Cuts the line's cells in place (its end must be writable) and hands each to visit
 // with its length; a cell of exactly two double quotes is an empty text.
 template <class Visit>
@@ -58,9 +54,84 @@ void forEachCell(char* line, std::size_t length, Visit&& visit) {
   }
 }
 
-// appendString of a cut cell (a text file holds no zero bytes before its end).
-Element cellElement(const char* cell, std::size_t length, RecordSlab* slab) {
-  return Element::of({ElementType::String, 0, cell, static_cast<int32_t>(length + 1)}, slab);
+// The text of the cells that pad short lines.
+constexpr char kNoText[] = "";
+
+// Splits a CSV text into lines and cells in one pass over its bytes: lines end at CR or
+// LF and a run of them is one break, so no line is empty; cells end at a comma. Calls
+// cell(begin, end) for every cell (it may overwrite *end, the separator) and lineEnd()
+// after each line's last cell.
+template <class Cell, class LineEnd>
+void walkCsv(char* text, std::size_t size, Cell&& cell, LineEnd&& lineEnd) {
+  std::size_t start = 0;  // of the open cell, or where the next line may start
+  bool inLine = false;
+  io_detail::forEachByteOf(text, size, ',', '\r', '\n', [&](std::size_t at) {
+    const char separator = text[at];
+    if (!inLine) {
+      if (separator != ',' && at == start) {
+        start = at + 1;  // one more break of a run
+        return;
+      }
+      inLine = true;
+    }
+    cell(text + start, text + at);
+    start = at + 1;
+    if (separator != ',') {
+      lineEnd();
+      inLine = false;
+    }
+  });
+  if (inLine || start < size) {
+    cell(text + start, text + size);
+    lineEnd();
+  }
+}
+
+struct CsvShape {
+  int64_t rows = 0;
+  int32_t columns = 0;  // the widest line's cell count
+};
+
+CsvShape shapeOf(char* text, std::size_t size) {
+  CsvShape shape;
+  int64_t cells = 0;
+  walkCsv(
+      text, size, [&](const char*, const char*) { ++cells; },
+      [&] {
+        ++shape.rows;
+        shape.columns = static_cast<int32_t>(std::max<int64_t>(shape.columns, cells));
+        cells = 0;
+      });
+  return shape;
+}
+
+// Appends the table's cells as texts borrowed from the file's bytes, each cut in place
+// and short lines padded with empty texts, up to `total` elements.
+void appendCells(ElementArray& target, std::shared_ptr<ByteBuffer> text, CsvShape shape,
+                 int64_t total) {
+  const int32_t base = target.size();
+  target.keepBlock(text);
+  target.appendNone(total);
+  Element* const out = target.slots().data() + base;
+  int64_t filled = 0;
+  int32_t cellsInLine = 0;
+  const auto add = [&](const char* cell) {
+    if (filled < total) out[filled++] = Element::borrowed(cell);
+  };
+  walkCsv(
+      text->data(), text->size(),
+      [&](char* cell, char* end) {
+        *end = '\0';
+        if (std::string_view(cell, static_cast<std::size_t>(end - cell)) == kEmptyCell) {
+          cell[0] = '\0';
+        }
+        add(cell);
+        ++cellsInLine;
+      },
+      [&] {
+        for (; cellsInLine < shape.columns; ++cellsInLine) add(kNoText);
+        cellsInLine = 0;
+      });
 }
 
 }  // namespace
@@ -139,30 +210,17 @@ std::optional<CsvTable> readCsvFile(const char* path) {
 
 void loadCsvFile(ElementArray& array, const char* path, int32_t append) {
   try {
-    std::optional<ByteBuffer> text = readTextFile(path);
-    char* data = text ? text->data() : nullptr;
-    const std::size_t size = text ? text->size() : 0;
-    int32_t columns = 0;
-    io_detail::forEachLine(data, size, [&](char* line, size_t length) {
-      columns = std::max(columns, cellsOfLine(line, length));
-    });
+    std::optional<ByteBuffer> read = readTextFile(path);
+    std::shared_ptr<ByteBuffer> text =
+        read ? std::make_shared<ByteBuffer>(std::move(*read)) : std::make_shared<ByteBuffer>();
+    const CsvShape shape = shapeOf(text->data(), text->size());
     io_detail::loadAllOrNothing(array, append == 0, [&](ElementArray& target) {
       target.setDimensions(2);
-      target.setBoundary(1, columns);
-      // Past the array's size limit appends change nothing, so the walk stops there.
-      io_detail::AppendRun run(target);
-      io_detail::forEachLine(data, size, [&](char* line, size_t length) {
-        if (run.size() >= ElementArray::kMaxSize) return;
-        int32_t cells = 0;
-        forEachCell(line, length, [&](const char* cell, std::size_t cellLength) {
-          run.add(cellElement(cell, cellLength, run.slab()));
-          ++cells;
-        });
-        for (; cells < columns && run.size() < ElementArray::kMaxSize; ++cells) {
-          run.add(cellElement("", 0, run.slab()));
-        }
-      });
-      run.flush();
+      target.setBoundary(1, shape.columns);
+      // Appends past the array's size limit change nothing.
+      const int64_t total =
+          std::min(shape.rows * shape.columns, int64_t{ElementArray::kMaxSize} - target.size());
+      if (total > 0) appendCells(target, text, shape, total);
     });
   } catch (const std::bad_alloc&) {
   }

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <algorithm>
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
@@ -56,6 +57,45 @@ class Cursor {
   std::string_view file_;
   std::size_t pos_ = 0;
 };
+
+// Bytes are tested eight at a time in a 64-bit word, with the byte at the lowest
+// address in the lowest bits.
+static_assert(std::endian::native == std::endian::little, "words are read little-endian");
+
+// The high bit of every byte of x that is zero, and no other bit (the carry of one
+// byte's test never reaches the next).
+inline uint64_t zeroBytes(uint64_t x) {
+  constexpr uint64_t kLow7 = 0x7F7F7F7F7F7F7F7Full;
+  return ~(((x & kLow7) + kLow7) | x | kLow7);
+}
+
+inline uint64_t bytesEqualTo(uint64_t word, char c) {
+  return zeroBytes(word ^ (0x0101010101010101ull * static_cast<unsigned char>(c)));
+}
+
+// Calls visit(i), in order, for every i in [0, size) where text[i] is a, b or c (none
+// of them zero). visit may overwrite text[i] and any byte before it.
+template <class Visit>
+void forEachByteOf(const char* text, std::size_t size, char a, char b, char c, Visit&& visit) {
+  const auto scan = [&](std::size_t base, uint64_t word) {
+    uint64_t hits = bytesEqualTo(word, a) | bytesEqualTo(word, b) | bytesEqualTo(word, c);
+    while (hits != 0) {
+      visit(base + static_cast<std::size_t>(std::countr_zero(hits) >> 3));
+      hits &= hits - 1;
+    }
+  };
+  std::size_t base = 0;
+  for (; base + 8 <= size; base += 8) {
+    uint64_t word;
+    std::memcpy(&word, text + base, sizeof word);
+    scan(base, word);
+  }
+  if (base < size) {
+    uint64_t word = 0;  // zero bytes past the end match nothing
+    std::memcpy(&word, text + base, size - base);
+    scan(base, word);
+  }
+}
 
 inline bool isLineBreak(char c) {
   return c == '\r' || c == '\n';

@@ -1,0 +1,78 @@
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+
+#include "array/element.h"
+#include "array/element_array.h"
+
+namespace quorrel {
+namespace {
+
+// A borrowed text reads exactly as the String that a copy would store, and every edit
+// leaves the lender's bytes alone.
+TEST(BorrowedText, ReadsAsAStringAndEditsNeverWriteThrough) {
+  char block[] = "-42x\0 7\0";
+  Element e = Element::borrowed(block);
+  NumberText scratch;
+  EXPECT_EQ(e.type(), ElementType::String);
+  EXPECT_EQ(e.size(), 5);
+  EXPECT_EQ(e.bytes(), block);
+  EXPECT_EQ(e.asString(scratch), block);
+  EXPECT_EQ(e.asValue(), -42);
+  EXPECT_EQ(e.textLength(), 4);
+  EXPECT_EQ(e.number(), 0);
+  EXPECT_FALSE(e.hasKey());
+  EXPECT_TRUE(e.ownsNothing());
+  const ElementValue v = e.view();
+  EXPECT_EQ(v.type, ElementType::String);
+  EXPECT_EQ(v.size, 5);
+  EXPECT_EQ(v.bytes, block);
+
+  // A key moves the value into a record of its own; deleting the key keeps that copy.
+  e.setKey(ElementValue::ofText("k"));
+  EXPECT_NE(e.bytes(), block);
+  EXPECT_STREQ(e.bytes(), "-42x");
+  EXPECT_EQ(e.size(), 5);
+  EXPECT_STREQ(e.key()->asString(scratch), "k");
+  e.deleteKey();
+  EXPECT_STREQ(e.bytes(), "-42x");
+
+  // A value assigned over a borrowed one.
+  Element other = Element::borrowed(block + 5);
+  other.assign(ElementValue::ofText("new"));
+  EXPECT_STREQ(other.bytes(), "new");
+  EXPECT_STREQ(block + 5, " 7");
+  other = Element::borrowed(block + 5);
+  EXPECT_EQ(other.asValue(), 7);
+  other.assign(ElementValue::ofValue(9));
+  EXPECT_EQ(other.type(), ElementType::Value);
+  EXPECT_EQ(std::string(block, sizeof block), std::string("-42x\0 7\0", 9));
+}
+
+// The array keeps the lender alive until it is cleared, through moves of the array.
+TEST(BorrowedText, TheArrayKeepsItsBlocksUntilCleared) {
+  auto block = std::make_shared<std::string>(std::string("one\0two", 8));
+  const std::weak_ptr<std::string> watch = block;
+  ElementArray moved;
+  {
+    ElementArray array;
+    array.keepBlock(block);
+    array.appendNone(2);
+    array.at(0) = Element::borrowed(block->c_str());
+    array.at(1) = Element::borrowed(block->c_str() + 4);
+    block.reset();
+    moved = std::move(array);
+  }
+  ASSERT_FALSE(watch.expired());
+  EXPECT_STREQ(moved.getString(1), "two");
+  moved.setString("edited", 0);
+  moved.deleteAt(1);
+  EXPECT_STREQ(moved.getString(0), "edited");
+  EXPECT_FALSE(watch.expired());
+  moved.clear();
+  EXPECT_TRUE(watch.expired());
+}
+
+}  // namespace
+}  // namespace quorrel
