@@ -54,6 +54,8 @@ constexpr std::size_t roundUp8(std::size_t n) {
 
 }  // namespace
 
+const Element Element::kNoneKey{};
+
 char* RecordSlab::take(std::size_t bytes, uint16_t& units) {
   if (bytes > kLargestRecord) return nullptr;
   if (block_ == nullptr || used_ + bytes > kBlockBytes) {
@@ -145,6 +147,10 @@ void Element::assign(const ElementValue& value) {
     word_ = next;
     return;
   }
+  if (!isRecord()) {  // the key is the None that the word carries
+    word_ = noneKeyedWordFor(v, nullptr);
+    return;
+  }
   // A keyed element gets a new record that takes the key over.
   Record* fresh = makeRecord(v, true);
   *fresh->key() = std::move(*record()->key());
@@ -171,6 +177,7 @@ const char* Element::numberOrEmptyText(NumberText& scratch) const {
 
 int32_t Element::recordValue() const {
   if (isBorrowed()) return readDecimal(borrowedText());
+  if (!isRecord()) return 0;
   const Record* r = record();
   if (r->type == ElementType::Value) return r->number();
   if (r->type == ElementType::String) return readDecimal(r->payload());
@@ -202,6 +209,25 @@ uint64_t Element::wordFor(const ElementValue& value, RecordSlab* slab) {
   return recordWord(makeRecord(value, false, slab));
 }
 
+bool Element::isNoneKey(const ElementValue& key) {
+  return normalised(keyOperand(key)).type == ElementType::None;
+}
+
+uint64_t Element::noneKeyedWordFor(const ElementValue& value, RecordSlab* slab) {
+  if (value.type == ElementType::None || (value.type == ElementType::Value && value.size == 4)) {
+    return withNoneKey(wordFor(value, nullptr));
+  }
+  Record* r = makeRecord(value, true, slab);
+  r->flags |= kHasKey;
+  return recordWord(r);
+}
+
+Element Element::noneKeyed(const ElementValue& value, RecordSlab* slab) {
+  Element e;
+  e.word_ = noneKeyedWordFor(normalised(value), slab);
+  return e;
+}
+
 Element Element::of(const ElementValue& value, RecordSlab* slab) {
   Element e;
   e.word_ = wordFor(normalised(value), slab);
@@ -211,6 +237,7 @@ Element Element::of(const ElementValue& value, RecordSlab* slab) {
 Element Element::keyed(const ElementValue& value, const ElementValue& key, RecordSlab* slab) {
   Element keyElement = of(keyOperand(key), slab);
   Element e;
+  if (keyElement.word_ == 0) return noneKeyed(value, slab);
   Record* r = makeRecord(normalised(value), true, slab);
   *r->key() = std::move(keyElement);
   r->flags |= kHasKey;
@@ -220,12 +247,13 @@ Element Element::keyed(const ElementValue& value, const ElementValue& key, Recor
 
 void Element::setKey(const ElementValue& value) {
   const ElementValue operand = keyOperand(value);
-  if (hasKey()) {
+  if (isRecord() && (record()->flags & kHasKey) != 0) {
     record()->key()->assign(operand);
     return;
   }
   Element key;
   key.assign(operand);
+  if (hasNoneKey() && key.word_ == 0) return;  // None stays None
   if (isRecord() && (record()->flags & kKeySlot) != 0) {
     *record()->key() = std::move(key);
     record()->flags |= kHasKey;
@@ -250,6 +278,10 @@ void Element::setKey(const ElementValue& value) {
 
 void Element::deleteKey() noexcept {
   if (!hasKey()) return;
+  if (!isRecord()) {
+    word_ = keylessWord();
+    return;
+  }
   Record* r = record();
   r->key()->reset();
   r->flags &= static_cast<uint16_t>(~kHasKey);

@@ -61,11 +61,16 @@ struct NumberText {
 };
 
 // An element is one machine word, so that the array's slots are small and edits move
-// words. The word is 0 for a keyless None, an odd number carrying the 32-bit value for
-// a keyless Value, a borrowed text (below) when its two low bits are 10, and otherwise
-// points to a heap record: a small header followed by the value (the bytes with a
-// hidden terminator, or the number), preceded by the key element when the record was
-// made for a key. Moving an element moves the word.
+// words. The word is
+//   0                    a keyless None;
+//   value << 32 | 1      a Value held in place (bit 1: it has a None key);
+//   text << 2 | 2        a borrowed text, see below (bit 63: it has a None key);
+//   4                    a None with a None key;
+//   a multiple of 8      a heap record: a small header followed by the value (the bytes
+//                        with a hidden terminator, or the number), preceded by the key
+//                        element when the record was made for a key.
+// A None key is what every element loaded from an array file has; carrying it as a
+// flag keeps such elements in one word. Moving an element moves the word.
 //
 // A borrowed text is a keyless String whose zero-terminated text lives in a block that
 // the element does not own (a loaded file's bytes, cut in place): the array that holds
@@ -91,14 +96,14 @@ class Element {
   Element& operator=(const Element&) = delete;
 
   ElementType type() const {
-    if (word_ == 0) return ElementType::None;
     if (isInlineValue()) return ElementType::Value;
-    return isBorrowed() ? ElementType::String : record()->type;
+    if (isBorrowed()) return ElementType::String;
+    return isRecord() ? record()->type : ElementType::None;
   }
   int32_t size() const {
-    if (word_ == 0) return 0;
     if (isInlineValue()) return 4;
-    return isBorrowed() ? borrowedSize() : record()->size;
+    if (isBorrowed()) return borrowedSize();
+    return isRecord() ? record()->size : 0;
   }
   // The number of a Value; 0 for every other type.
   int32_t number() const {
@@ -112,19 +117,22 @@ class Element {
     const Record* r = record();
     return r->type != ElementType::None && r->type != ElementType::Value ? r->payload() : nullptr;
   }
-  const Element* key() const { return hasKey() ? record()->key() : nullptr; }
+  const Element* key() const {
+    if (isRecord()) return (record()->flags & kHasKey) != 0 ? record()->key() : nullptr;
+    return hasNoneKey() ? &kNoneKey : nullptr;
+  }
   // Type, size, number (Value) and bytes (String, File) decoded at once, for readers
   // that need them all.
   ElementValue view() const {
-    if (word_ == 0) return {};
     if (isInlineValue()) return ElementValue::ofValue(inlineNumber());
     if (isBorrowed()) return {ElementType::String, 0, borrowedText(), borrowedSize()};
+    if (!isRecord()) return {};
     const Record* r = record();
     if (r->type == ElementType::None) return {};
     if (r->type == ElementType::Value) return {ElementType::Value, r->number(), nullptr, r->size};
     return {r->type, 0, r->payload(), r->size};
   }
-  bool hasKey() const { return isRecord() && (record()->flags & kHasKey) != 0; }
+  bool hasKey() const { return isRecord() ? (record()->flags & kHasKey) != 0 : hasNoneKey(); }
   // True for None, keyless Values and borrowed texts: nothing to free.
   bool ownsNothing() const { return !isRecord(); }
 
@@ -146,10 +154,20 @@ class Element {
     e.word_ = (static_cast<uint64_t>(reinterpret_cast<uintptr_t>(text)) << 2) | kBorrowedTag;
     return e;
   }
+  // keyed(value, None): a Value or None stays one word.
+  static Element noneKeyed(const ElementValue& value, RecordSlab* slab = nullptr);
+  // True when a key set to `key` would be None (the element still has a key then).
+  static bool isNoneKey(const ElementValue& key);
+  // The same with a None key: as keyed(view, None) would make it.
+  static Element borrowedWithNoneKey(const char* text) {
+    Element e = borrowed(text);
+    e.word_ |= kBorrowedNoneKey;
+    return e;
+  }
 
   // assign(ElementValue::ofValue(number)) without the detour.
   void assignValue(int32_t number) {
-    if (isRecord()) {
+    if (isRecord() || hasNoneKey()) {
       assign(ElementValue::ofValue(number));
     } else {
       word_ = number == 0 ? 0 : inlineWord(number);
@@ -207,6 +225,10 @@ class Element {
   };
 
   static constexpr uint64_t kBorrowedTag = 2;
+  static constexpr uint64_t kInlineNoneKey = 2;
+  static constexpr uint64_t kBorrowedNoneKey = uint64_t{1} << 63;
+  static constexpr uint64_t kNoneWithNoneKey = 4;
+  static const Element kNoneKey;
 
   static uint64_t inlineWord(int32_t number) {
     return (uint64_t{static_cast<uint32_t>(number)} << 32) | 1u;
@@ -214,9 +236,27 @@ class Element {
   bool isInlineValue() const { return (word_ & 1u) != 0; }
   bool isBorrowed() const { return (word_ & 3u) == kBorrowedTag; }
   // Records are 8-aligned, so their words end in three zero bits.
-  bool isRecord() const { return word_ != 0 && (word_ & 3u) == 0; }
+  bool isRecord() const { return word_ != 0 && (word_ & 7u) == 0; }
+  // A word-sized element (not a record) that has a None key.
+  bool hasNoneKey() const {
+    if (isInlineValue()) return (word_ & kInlineNoneKey) != 0;
+    if (isBorrowed()) return (word_ & kBorrowedNoneKey) != 0;
+    return word_ == kNoneWithNoneKey;
+  }
+  // The word without its None key.
+  uint64_t keylessWord() const {
+    if (isInlineValue()) return word_ & ~kInlineNoneKey;
+    if (isBorrowed()) return word_ & ~kBorrowedNoneKey;
+    return word_ == kNoneWithNoneKey ? 0 : word_;
+  }
+  // The word of a keyless word-sized element given a None key.
+  static uint64_t withNoneKey(uint64_t word) {
+    if ((word & 1u) != 0) return word | kInlineNoneKey;
+    if ((word & 3u) == kBorrowedTag) return word | kBorrowedNoneKey;
+    return kNoneWithNoneKey;  // word is 0
+  }
   const char* borrowedText() const {
-    return reinterpret_cast<const char*>(static_cast<uintptr_t>(word_ >> 2));
+    return reinterpret_cast<const char*>(static_cast<uintptr_t>((word_ & ~kBorrowedNoneKey) >> 2));
   }
   int32_t borrowedSize() const { return static_cast<int32_t>(std::strlen(borrowedText()) + 1); }
   int32_t inlineNumber() const { return static_cast<int32_t>(static_cast<uint32_t>(word_ >> 32)); }
@@ -233,6 +273,8 @@ class Element {
   static Record* makeRecord(const ElementValue& value, bool keySlot, RecordSlab* slab = nullptr);
   // The word of a keyless element holding `value` (already normalised).
   static uint64_t wordFor(const ElementValue& value, RecordSlab* slab);
+  // The word of an element holding `value` (already normalised) under a None key.
+  static uint64_t noneKeyedWordFor(const ElementValue& value, RecordSlab* slab);
   void destroyRecord() noexcept;
 
   uint64_t word_ = 0;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <memory>
 #include <new>
 #include <string>
 #include <string_view>
@@ -187,13 +188,15 @@ ElementValue operandOf(uint16_t type, int32_t size, int32_t number, const char* 
 
 // Applies the file to the array as it is read, so a load needs no second copy of the
 // file's records; labels wait until every element is in place. Every loaded element
-// has a key, even if only a None one.
+// has a key, even if only a None one. A text with its terminator in the file and no
+// key of its own is borrowed from the file's bytes (which the array then keeps).
 struct LoadSink {
   LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing), run(target) {}
 
   ElementArray& array;
   bool replace;
   io_detail::AppendRun run;
+  bool borrowed = false;
   bool headerSeen = false;
   int32_t labelIndex = 0;
   std::vector<std::pair<int32_t, std::string>> pendingLabels;
@@ -216,9 +219,23 @@ struct LoadSink {
         column, std::string(io_detail::textOf({label.text, static_cast<size_t>(label.length)})));
   }
   void element(const ElementRecord& r) {
-    run.add(Element::keyed(operandOf(r.type, r.size, r.number, r.data, valueSpill),
-                           operandOf(r.keyType, r.keySize, r.keyNumber, r.keyData, keySpill),
-                           run.slab()));
+    // A half with neither bytes nor number is None whatever its type (most keys).
+    const bool plainNone = r.keyData == nullptr && r.keyNumber == 0;
+    const ElementValue key =
+        plainNone ? ElementValue{}
+                  : operandOf(r.keyType, r.keySize, r.keyNumber, r.keyData, keySpill);
+    if (!plainNone && !Element::isNoneKey(key)) {
+      run.add(
+          Element::keyed(operandOf(r.type, r.size, r.number, r.data, valueSpill), key, run.slab()));
+    } else if (r.type == kTypeString && r.size > 0 &&
+               std::string_view(r.data, static_cast<uint32_t>(r.size)).find('\0') !=
+                   std::string_view::npos) {
+      borrowed = true;
+      run.add(Element::borrowedWithNoneKey(r.data));
+    } else {
+      run.add(
+          Element::noneKeyed(operandOf(r.type, r.size, r.number, r.data, valueSpill), run.slab()));
+    }
   }
   const char* zeroFilled(std::string_view held, int32_t size) {
     filled.clear();  // the previous block is in an element by now
@@ -287,10 +304,12 @@ std::optional<ArrayImage> readNativeFile(const char* path) {
 void loadNativeFile(ElementArray& array, const char* path, int32_t append) {
   const bool replace = append == 0;
   try {
-    const std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
+    std::optional<ByteBuffer> read = readFileBytes(path, 0);
+    const auto bytes = read ? std::make_shared<const ByteBuffer>(std::move(*read)) : nullptr;
     io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
       LoadSink sink{target, replace};
       if (bytes) parseNative(bytes->view(), sink);
+      if (sink.borrowed) target.keepBlock(bytes);
       sink.run.flush();
       if (replace && !sink.headerSeen) target.setDimensions(0);
       for (const auto& [column, text] : sink.pendingLabels) {

@@ -11,6 +11,10 @@
 
 namespace quorrel::io_detail {
 
+// Files are little-endian, like every machine the module runs on: fields and words are
+// read with plain copies.
+static_assert(std::endian::native == std::endian::little, "words are read little-endian");
+
 // Reads fields from a file image. Bytes past the end read as zero, so a short file
 // leaves the fields it does not hold at 0; the position never passes the end.
 class Cursor {
@@ -26,7 +30,11 @@ class Cursor {
     const auto* p = reinterpret_cast<const unsigned char*>(file_.data()) + pos_;
     uint32_t v = 0;
     if (held == 4) {
-      v = uint32_t{p[0]} | uint32_t{p[1]} << 8 | uint32_t{p[2]} << 16 | uint32_t{p[3]} << 24;
+      std::memcpy(&v, p, 4);
+    } else if (held == 2) {
+      uint16_t half;
+      std::memcpy(&half, p, 2);
+      v = half;
     } else {
       for (std::size_t i = 0; i < held; ++i) v |= uint32_t{p[i]} << (8 * i);
     }
@@ -57,10 +65,6 @@ class Cursor {
   std::string_view file_;
   std::size_t pos_ = 0;
 };
-
-// Bytes are tested eight at a time in a 64-bit word, with the byte at the lowest
-// address in the lowest bits.
-static_assert(std::endian::native == std::endian::little, "words are read little-endian");
 
 // The high bit of every byte of x that is zero, and no other bit (the carry of one
 // byte's test never reaches the next).

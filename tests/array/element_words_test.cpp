@@ -50,6 +50,57 @@ TEST(BorrowedText, ReadsAsAStringAndEditsNeverWriteThrough) {
   EXPECT_EQ(std::string(block, sizeof block), std::string("-42x\0 7\0", 9));
 }
 
+// An element whose key is None stays one word while it is a Value, a None or a borrowed
+// text, and reads and edits as the record with a None key that it stands for.
+TEST(NoneKeyWords, BehaveAsElementsWithANoneKey) {
+  NumberText scratch;
+  const char* text = "txt";
+  for (int form = 0; form < 4; ++form) {
+    SCOPED_TRACE(form);
+    Element e = form == 0   ? Element::noneKeyed(ElementValue::ofValue(-5))
+                : form == 1 ? Element::noneKeyed({})
+                : form == 2 ? Element::borrowedWithNoneKey(text)
+                            : Element::keyed(ElementValue::ofValue(-5), ElementValue::ofValue(0));
+    EXPECT_TRUE(e.ownsNothing());
+    ASSERT_TRUE(e.hasKey());
+    EXPECT_EQ(e.key()->type(), ElementType::None);
+    EXPECT_EQ(e.asValue(), form == 1 || form == 2 ? 0 : -5);
+    EXPECT_STREQ(e.asString(scratch), form == 1 ? "" : form == 2 ? "txt" : "-5");
+    EXPECT_EQ(e.type(), form == 1   ? ElementType::None
+                        : form == 2 ? ElementType::String
+                                    : ElementType::Value);
+
+    e.setKey(ElementValue::ofValue(0));  // still a None key, still a word
+    EXPECT_TRUE(e.hasKey());
+    EXPECT_TRUE(e.ownsNothing());
+    e.assignValue(8);
+    EXPECT_TRUE(e.hasKey());
+    EXPECT_EQ(e.asValue(), 8);
+    e.assign(ElementValue::ofText("x"));  // a text of its own needs a record: key kept
+    EXPECT_FALSE(e.ownsNothing());
+    ASSERT_TRUE(e.hasKey());
+    EXPECT_EQ(e.key()->type(), ElementType::None);
+    EXPECT_STREQ(e.bytes(), "x");
+  }
+
+  Element v = Element::noneKeyed(ElementValue::ofValue(7));
+  v.setKey(ElementValue::ofText("k"));
+  EXPECT_STREQ(v.key()->asString(scratch), "k");
+  EXPECT_EQ(v.asValue(), 7);
+  v.deleteKey();
+  EXPECT_FALSE(v.hasKey());
+  EXPECT_EQ(v.asValue(), 7);
+  Element words[] = {Element::noneKeyed(ElementValue::ofValue(3)), Element::noneKeyed({}),
+                     Element::borrowedWithNoneKey(text)};
+  for (Element& w : words) {
+    w.deleteKey();
+    EXPECT_FALSE(w.hasKey());
+    EXPECT_EQ(w.key(), nullptr);
+  }
+  EXPECT_EQ(words[0].asValue(), 3);
+  EXPECT_EQ(words[2].bytes(), text);
+}
+
 // The array keeps the lender alive until it is cleared, through moves of the array.
 TEST(BorrowedText, TheArrayKeepsItsBlocksUntilCleared) {
   auto block = std::make_shared<std::string>(std::string("one\0two", 8));
