@@ -235,11 +235,14 @@ Element Element::of(const ElementValue& value, RecordSlab* slab) {
 }
 
 Element Element::keyed(const ElementValue& value, const ElementValue& key, RecordSlab* slab) {
-  Element keyElement = of(keyOperand(key), slab);
+  return keyedWith(value, of(keyOperand(key), slab), slab);
+}
+
+Element Element::keyedWith(const ElementValue& value, Element&& key, RecordSlab* slab) {
+  if (key.word_ == 0) return noneKeyed(value, slab);
   Element e;
-  if (keyElement.word_ == 0) return noneKeyed(value, slab);
   Record* r = makeRecord(normalised(value), true, slab);
-  *r->key() = std::move(keyElement);
+  *r->key() = std::move(key);
   r->flags |= kHasKey;
   e.word_ = recordWord(r);
   return e;

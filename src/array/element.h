@@ -154,6 +154,8 @@ class Element {
     e.word_ = (static_cast<uint64_t>(reinterpret_cast<uintptr_t>(text)) << 2) | kBorrowedTag;
     return e;
   }
+  // The same with the key element already made (keyless; a borrowed text, say).
+  static Element keyedWith(const ElementValue& value, Element&& key, RecordSlab* slab = nullptr);
   // keyed(value, None): a Value or None stays one word.
   static Element noneKeyed(const ElementValue& value, RecordSlab* slab = nullptr);
   // True when a key set to `key` would be None (the element still has a key then).

@@ -1,6 +1,7 @@
 #include "io/ini_file.h"
 
 #include <cstring>
+#include <memory>
 #include <new>
 #include <string_view>
 
@@ -40,42 +41,56 @@ void writeEntry(BufferedWriter& out, const char* key, const char* value) {
   out.text(kLineEnd);
 }
 
-// Walks the lines of an INI text, cutting names, keys and values in place, and hands
-// sections and entries to the sink (a key without "=" has a value with no data).
-// Lines of 0 or 1 characters, "//" comments (after leading blanks) and entry lines
-// before the first section are skipped.
+// Handles one line of an INI text (not empty, no line break) whose first "=" is at
+// `equals` (null when it has none), cutting names, keys and values in place.
+template <class Sink>
+void parseIniLine(char* line, char* end, char* equals, bool& inSection, Sink& sink) {
+  if (end - line <= 1) return;
+  char* p = line;
+  while (p < end && (*p == ' ' || *p == '\t')) ++p;
+  if (p < end && *p == '[') {
+    if (p + 1 >= end || std::memchr(p + 1, ']', static_cast<std::size_t>(end - p - 1)) == nullptr) {
+      return;
+    }
+    // The name runs to the end of the line less its last character (the "]" of a
+    // written section line).
+    end[-1] = '\0';
+    sink.section(p + 1);
+    inSection = true;
+    return;
+  }
+  if (end - p >= 2 && p[0] == '/' && p[1] == '/') return;
+  if (!inSection) return;
+  *end = '\0';
+  if (equals == nullptr) {
+    sink.entry({p, static_cast<std::size_t>(end - p)}, {});
+    return;
+  }
+  *equals = '\0';
+  sink.entry({p, static_cast<std::size_t>(equals - p)},
+             {equals + 1, static_cast<std::size_t>(end - equals - 1)});
+}
+
+// Walks the lines of an INI text in one pass over its bytes and hands sections and
+// entries to the sink (a key without "=" has a value with no data). Lines end at CR
+// or LF, a run of them being one break. Lines of 0 or 1 characters, "//" comments
+// (after leading blanks) and entry lines before the first section are skipped.
+// text[size] must be writable.
 template <class Sink>
 void parseIni(char* text, std::size_t size, Sink& sink) {
   bool inSection = false;
-  io_detail::forEachLine(text, size, [&](char* line, std::size_t length) {
-    if (length <= 1) return;
-    char* const end = line + length;
-    char* p = line;
-    while (p < end && (*p == ' ' || *p == '\t')) ++p;
-    if (p < end && *p == '[') {
-      if (p + 1 >= end ||
-          std::memchr(p + 1, ']', static_cast<std::size_t>(end - p - 1)) == nullptr) {
-        return;
-      }
-      // The name runs to the end of the line less its last character (the "]" of a
-      // written section line).
-      end[-1] = '\0';
-      sink.section(p + 1);
-      inSection = true;
+  std::size_t start = 0;
+  char* equals = nullptr;
+  io_detail::forEachByteOf(text, size, '\r', '\n', '=', [&](std::size_t at) {
+    if (text[at] == '=') {
+      if (equals == nullptr) equals = text + at;
       return;
     }
-    if (end - p >= 2 && p[0] == '/' && p[1] == '/') return;
-    if (!inSection) return;
-    *end = '\0';
-    char* equals = static_cast<char*>(std::memchr(p, '=', static_cast<std::size_t>(end - p)));
-    if (equals == nullptr) {
-      sink.entry({p, static_cast<std::size_t>(end - p)}, {});
-      return;
-    }
-    *equals = '\0';
-    sink.entry({p, static_cast<std::size_t>(equals - p)},
-               {equals + 1, static_cast<std::size_t>(end - equals - 1)});
+    if (at > start) parseIniLine(text + start, text + at, equals, inSection, sink);
+    start = at + 1;
+    equals = nullptr;
   });
+  if (start < size) parseIniLine(text + start, text + size, equals, inSection, sink);
 }
 
 // The String operand of a cut text (zero-terminated in place, no zero byte inside: a
@@ -93,11 +108,12 @@ struct DocumentSink {
   }
 };
 
+// Keys are borrowed from the file's bytes; values are copied into their records.
 struct LoadSink {
   io_detail::AppendRun& run;
   void section(const char*) {}
   void entry(std::string_view key, std::string_view value) {
-    run.add(Element::keyed(cutText(value), cutText(key), run.slab()));
+    run.add(Element::keyedWith(cutText(value), Element::borrowed(key.data()), run.slab()));
   }
 };
 
@@ -153,12 +169,14 @@ std::optional<IniDocument> readIniFile(const char* path) {
 
 void loadIniFile(ElementArray& array, const char* path, int32_t append) {
   try {
-    std::optional<ByteBuffer> text = readTextFile(path);
+    std::optional<ByteBuffer> read = readTextFile(path);
+    const auto text = read ? std::make_shared<ByteBuffer>(std::move(*read)) : nullptr;
     io_detail::loadAllOrNothing(array, append == 0, [&](ElementArray& target) {
       if (!text) return;
       io_detail::AppendRun run(target);
       LoadSink sink{run};
       parseIni(text->data(), text->size(), sink);
+      if (run.size() > 0) target.keepBlock(text);
       run.flush();
     });
   } catch (const std::bad_alloc&) {
