@@ -1,5 +1,6 @@
 #include "array/text.h"
 
+#include <charconv>
 #include <cstring>
 
 namespace quorrel {
@@ -35,19 +36,9 @@ int32_t readDecimal(const char* text) {
 }
 
 int writeDecimal(int32_t value, char* out) {
-  char digits[12];
-  int count = 0;
-  // Work on the unsigned magnitude so INT32_MIN needs no special case.
-  uint32_t magnitude = value < 0 ? 0u - static_cast<uint32_t>(value) : static_cast<uint32_t>(value);
-  do {
-    digits[count++] = static_cast<char>('0' + magnitude % 10);
-    magnitude /= 10;
-  } while (magnitude != 0);
-  int length = 0;
-  if (value < 0) out[length++] = '-';
-  while (count > 0) out[length++] = digits[--count];
-  out[length] = '\0';
-  return length;
+  char* const end = std::to_chars(out, out + 11, value).ptr;
+  *end = '\0';
+  return static_cast<int>(end - out);
 }
 
 std::optional<std::string_view> TokenSplitter::next() {

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <memory>
 #include <new>
 #include <string_view>
 
@@ -61,8 +62,15 @@ void writeHostFile(const char* path, uint16_t mode, int32_t x, int32_t y, int32_
       const int32_t row = mulWrap(addWrap(mulWrap(y, k3), k2), x);
       for (int32_t k1 = 0; k1 < x; ++k1) {
         const CellText cell = textOf(addWrap(row, k1));
+        const std::size_t length = cell.length > 0 ? static_cast<std::size_t>(cell.length) : 0;
+        if (char* p = out.room(4 + length)) {
+          p = BufferedWriter::putLE32(p, static_cast<uint32_t>(cell.length));
+          if (length > 0) std::memcpy(p, cell.bytes, length);
+          out.commit(4 + length);
+          continue;
+        }
         out.i32(cell.length);
-        if (cell.length > 0) out.bytes(cell.bytes, static_cast<std::size_t>(cell.length));
+        if (length > 0) out.bytes(cell.bytes, length);
       }
     }
   }
@@ -80,10 +88,12 @@ int64_t cellCount(int32_t x, int32_t y, int32_t z) {
 }
 
 // Walks a host array file held in memory; false when it is not one. Cells that would
-// start at or past the end of the file are not produced.
+// start at or past the end of the file are not produced. Text cells are cut in place:
+// the byte after a cell's text (the next cell's length, once read, or the byte past
+// the file, which must be writable) becomes its terminator.
 template <class Sink>
-bool parseHost(std::string_view file, Sink& sink) {
-  Cursor in(file);
+bool parseHost(char* data, std::size_t size, Sink& sink) {
+  Cursor in({data, size});
   if (!in.matches(kHeader)) return false;
   const int32_t version = in.i32();
   const int32_t x = in.i32();
@@ -96,14 +106,22 @@ bool parseHost(std::string_view file, Sink& sink) {
   if (kind == 1 || kind == 5) {
     for (int64_t i = 0; i < count && !in.atEnd(); ++i) sink.number(in.i32());
   } else if ((kind == 2 || kind == 6) && version == kVersion) {
-    for (int64_t i = 0; i < count && !in.atEnd(); ++i) {
-      const int32_t n = in.i32();
+    bool more = !in.atEnd();
+    int32_t n = more ? in.i32() : 0;
+    for (int64_t i = 0; i < count && more; ++i) {
       if (n <= 0) {
         sink.text(nullptr, n);
-      } else {
-        const std::string_view held = in.take(n);
-        sink.text(held.data(), static_cast<int32_t>(held.size()));
+        more = !in.atEnd();
+        n = more ? in.i32() : 0;
+        continue;
       }
+      const std::string_view held = in.take(n);
+      // Nothing held means the file ended: the text is the empty one past it.
+      char* const text = held.empty() ? data + size : data + (held.data() - data);
+      more = !in.atEnd() && i + 1 < count;
+      n = more ? in.i32() : 0;
+      text[held.size()] = '\0';
+      sink.text(text, static_cast<int32_t>(held.size()));
     }
   } else if ((kind == 2 || kind == 6) && count <= kMaxByteless) {
     sink.emptyTexts(count);
@@ -138,9 +156,14 @@ struct ImageSink {
   }
 };
 
+// Texts are borrowed from the file's bytes (which the array then keeps).
 struct LoadSink {
+  LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing), run(target) {}
+
   ElementArray& array;
   bool replace;
+  io_detail::AppendRun run;
+  bool borrowed = false;
   bool headerSeen = false;
 
   void header(int32_t x, int32_t y, int32_t) {
@@ -150,11 +173,20 @@ struct LoadSink {
     array.setBoundary(1, x);
     array.setBoundary(2, y);
   }
-  void number(int32_t n) { array.insertValue(n, array.size()); }
-  void text(const char* data, int32_t size) {
-    io_detail::insertTextAt(array, data, size, array.size());
+  void number(int32_t n) { run.add(Element::of(ElementValue::ofValue(n))); }
+  // A terminated text, or none (a None element).
+  void text(const char* data, int32_t) {
+    if (data == nullptr) {
+      run.add(Element());
+      return;
+    }
+    borrowed = true;
+    run.add(Element::borrowed(data));
   }
-  void emptyTexts(int64_t count) { array.appendNone(count); }
+  void emptyTexts(int64_t count) {
+    run.flush();
+    array.appendNone(count);
+  }
 };
 
 }  // namespace
@@ -168,7 +200,10 @@ void saveHostArrayFile(ElementArray& array, const char* path, uint16_t mode) {
     NumberText scratch;
     writeHostFile(path, mode, x, y, z, [&](int32_t k) -> CellText {
       if (!array.inRange(k)) return {};
-      const char* text = array.at(k).asString(scratch);
+      const Element& e = array.at(k);
+      if (e.type() == ElementType::Value)
+        return {writeDecimal(e.number(), scratch.text), scratch.text};
+      const char* text = e.asString(scratch);
       return {static_cast<int32_t>(std::strlen(text)), text};
     });
   } catch (const std::bad_alloc&) {
@@ -194,12 +229,12 @@ void writeHostArrayFile(const char* path, const ArrayImage& image, uint16_t file
 
 std::optional<ArrayImage> readHostArrayFile(const char* path) {
   try {
-    std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
+    std::optional<ByteBuffer> bytes = readFileBytes(path, 1);
     if (!bytes) return std::nullopt;
     ArrayImage image;
     image.storage = std::move(*bytes);
     ImageSink sink{image};
-    if (!parseHost(image.storage.view(), sink)) return std::nullopt;
+    if (!parseHost(image.storage.data(), image.storage.size(), sink)) return std::nullopt;
     return image;
   } catch (const std::bad_alloc&) {
     return std::nullopt;
@@ -209,10 +244,13 @@ std::optional<ArrayImage> readHostArrayFile(const char* path) {
 void loadHostArrayFile(ElementArray& array, const char* path, int32_t append) {
   const bool replace = append == 0;
   try {
-    const std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
+    std::optional<ByteBuffer> read = readFileBytes(path, 1);
+    const auto bytes = read ? std::make_shared<ByteBuffer>(std::move(*read)) : nullptr;
     io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
       LoadSink sink{target, replace};
-      if (bytes) parseHost(bytes->view(), sink);
+      if (bytes) parseHost(bytes->data(), bytes->size(), sink);
+      if (sink.borrowed) target.keepBlock(bytes);
+      sink.run.flush();
       if (replace && !sink.headerSeen) target.setDimensions(0);
     });
   } catch (const std::bad_alloc&) {
