@@ -5,6 +5,7 @@
 
 #include "array/element_array.h"
 #include "harness.h"
+#include "hostsim/host_simulator.h"
 
 namespace quorrel::bench {
 
@@ -80,6 +81,24 @@ void appendStringsBase(benchmark::State& state, int64_t n) {
   }
 }
 
+// `E get( i` as a game makes it: the host fetches the parameter and calls the
+// expression routine through the module's table (the built module, opened as the host
+// opens it).
+void getRoundTrips(benchmark::State& state, int64_t n) {
+  constexpr int32_t kAppendValue = 9;
+  constexpr int32_t kGet = 3;
+  const auto module = hostsim::Module::open(QUORREL_BENCH_MODULE);
+  hostsim::Instance instance(*module);
+  for (int32_t v : randomValues(n)) instance.callAction(kAppendValue, {v});
+  const std::vector<int32_t> indexes = randomIndexes(n, n);
+  for (auto _ : state) {
+    int64_t sum = 0;
+    for (int32_t i : indexes) sum += static_cast<int64_t>(instance.callExpressionRaw(kGet, {i}));
+    benchmark::DoNotOptimize(sum);
+  }
+}
+
+// The bare read that the round trip wraps.
 void getValues(benchmark::State& state, int64_t n) {
   ElementArray array;
   for (int32_t v : randomValues(n)) array.appendValue(v);
@@ -87,16 +106,6 @@ void getValues(benchmark::State& state, int64_t n) {
   for (auto _ : state) {
     int32_t sum = 0;
     for (int32_t i : indexes) sum += array.getValue(i);
-    benchmark::DoNotOptimize(sum);
-  }
-}
-
-void getValuesBase(benchmark::State& state, int64_t n) {
-  const std::vector<int32_t> vector = randomValues(n);
-  const std::vector<int32_t> indexes = randomIndexes(n, n);
-  for (auto _ : state) {
-    int32_t sum = 0;
-    for (int32_t i : indexes) sum += vector[static_cast<std::size_t>(i)];
     benchmark::DoNotOptimize(sum);
   }
 }
@@ -155,8 +164,9 @@ void registerArrayScenarios() {
        [n](auto& s) { appendValuesBase(s, n); }});
   add({"append strings 8-16 bytes", n, n, 2.0, [n](auto& s) { appendStrings(s, n); },
        [n](auto& s) { appendStringsBase(s, n); }});
-  add({"random getValue", n, n, 2.0, [n](auto& s) { getValues(s, n); },
-       [n](auto& s) { getValuesBase(s, n); }});
+  // No target: the host's call costs far more than the read it wraps.
+  add({"E get( round trip vs getValue", n, n, 0.0, [n](auto& s) { getRoundTrips(s, n); },
+       [n](auto& s) { getValues(s, n); }});
   add({"random getString", n, n, 2.0, [n](auto& s) { getStrings(s, n); },
        [n](auto& s) { getStringsBase(s, n); }});
   const int64_t front = scaled(100'000);
