@@ -319,6 +319,11 @@ void ElementArray::appendNone(int64_t count) {
   syncRowStates();
 }
 
+void ElementArray::reserveAppends(int64_t count) {
+  const int64_t n = std::min<int64_t>(count, int64_t{kMaxSize} - size());
+  if (n > 0) elements_.reserve(static_cast<std::size_t>(size() + n));
+}
+
 void ElementArray::appendElements(std::span<Element> run) {
   const int64_t n = std::min<int64_t>(static_cast<int64_t>(run.size()), int64_t{kMaxSize} - size());
   if (n <= 0) return;

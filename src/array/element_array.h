@@ -97,6 +97,9 @@ class ElementArray {
   // The same as appending each element in turn (the sources are left empty), in one
   // step: the loaders hand over their elements in runs.
   void appendElements(std::span<Element> run);
+  // Room for `count` more elements in one allocation, for a loader that knows how many
+  // it will append; what the array holds and reports does not change.
+  void reserveAppends(int64_t count);
 
   void setKeyString(const char* text, int32_t index);
   void setKeyValue(int32_t value, int32_t index);

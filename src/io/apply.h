@@ -57,6 +57,8 @@ class AppendRun {
     array_.appendElements(pending_);
     pending_.clear();
   }
+  // Room for `count` elements to come, taken at once.
+  void expect(int64_t count) { array_.reserveAppends(size() + count - array_.size()); }
   // Where the elements' records come from.
   RecordSlab* slab() { return &slab_; }
   // The array's size once the pending elements are in.

@@ -103,6 +103,8 @@ bool parseHost(char* data, std::size_t size, Sink& sink) {
   sink.header(x, y, z);
   const int64_t count = cellCount(x, y, z);
   if (count <= 0) return true;
+  // Every stored cell takes at least 4 bytes.
+  sink.expectCells(std::min<int64_t>(count, static_cast<int64_t>(in.remaining() / 4 + 1)));
   if (kind == 1 || kind == 5) {
     for (int64_t i = 0; i < count && !in.atEnd(); ++i) sink.number(in.i32());
   } else if ((kind == 2 || kind == 6) && version == kVersion) {
@@ -151,6 +153,7 @@ struct ImageSink {
     r.data = data;
     image.elements.push_back(r);
   }
+  void expectCells(int64_t count) { image.elements.reserve(static_cast<std::size_t>(count)); }
   void emptyTexts(int64_t count) {
     for (int64_t i = 0; i < count; ++i) text(nullptr, 0);
   }
@@ -173,6 +176,7 @@ struct LoadSink {
     array.setBoundary(1, x);
     array.setBoundary(2, y);
   }
+  void expectCells(int64_t count) { run.expect(count); }
   void number(int32_t n) { run.add(Element::of(ElementValue::ofValue(n))); }
   // A terminated text, or none (a None element).
   void text(const char* data, int32_t) {

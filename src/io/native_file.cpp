@@ -205,7 +205,7 @@ struct LoadSink {
   std::string keySpill;
 
   void version(uint16_t) {}
-  void expectElements(std::size_t) {}
+  void expectElements(std::size_t count) { run.expect(static_cast<int64_t>(count)); }
   void header(int32_t dimensions, const int32_t* boundaries) {
     headerSeen = true;
     if (!replace) return;
