@@ -229,10 +229,5 @@ TEST_F(NativeFile, HostileCountsAndSizesAreBoundedByTheFile) {
   EXPECT_FALSE(a.labels.has_value());
 }
 
-TEST_F(NativeFile, SaveToAnUnusablePathWritesNothing) {
-  ElementArray a = exampleArray();
-  expectNothingSavedToUnusablePaths([&](const char* file) { saveNativeFile(a, file, 0); });
-}
-
 }  // namespace
 }  // namespace quorrel
