@@ -81,10 +81,4 @@ inline std::string bytesOf(std::initializer_list<int> values) {
   return s;
 }
 
-// Type, size, number and bytes in one text, for whole-element comparisons.
-inline std::string describe(const Element& e) {
-  return std::to_string(static_cast<int>(e.type())) + "/" + std::to_string(e.size()) + "/" +
-         std::to_string(e.number()) + "/" + contentOf(e);
-}
-
 }  // namespace quorrel
