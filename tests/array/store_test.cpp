@@ -71,6 +71,13 @@ TEST(Capacity, ShrinksWithHysteresis) {
     while (b.size() > size) b.deleteAt(0);
     EXPECT_EQ(b.capacity(), capacity) << "at size " << size;  // below 26 nothing shrinks
   }
+  // A shrink also needs more than 25 elements before the delete: 3534 elements
+  // (capacity 10599) deleted down to 25 leave 105, and the delete from 25 keeps it.
+  ElementArray last;
+  last.setString("a", 3533);
+  EXPECT_EQ(last.capacity(), 10599);
+  while (last.size() > 24) last.deleteAt(last.size() - 1);
+  EXPECT_EQ(last.capacity(), 105);
   for (int i = 1; i <= 48; ++i) b.appendValue(i);
   EXPECT_EQ(b.capacity(), 97);
   b.appendValue(49);

@@ -116,35 +116,9 @@ TEST(SetupDialog, DimensionButtonsEnableTheFields) {
   });
 }
 
-// What the dialog shows for a stored record and what OK stores after the author's steps
-// (a step with text types it into the field, one without clicks the button). The
-// dimension picks the boundaries stored: 2D stores X and keeps Y, 3D both, 1D neither.
-// Boundaries read as signed numbers; modes show as zero or not and store as 0 or 1.
+// The OK cases shared with the Windows dialog test (support/setup_dialog.h).
 TEST(SetupDialog, OkStoresWhatTheDialogShows) {
-  using Steps = std::vector<std::pair<int, const char*>>;
-  const struct {
-    Ints stored;
-    const char* shown;  // state, then the X and Y fields
-    Steps steps;
-    Ints after;
-  } cases[] = {
-      {{7, 4, 5, 0, 0, 0}, "1D insensitive literal off | 4 5", {}, {1, 4, 5, 0, 0, 0}},
-      {{3, 4, 5, 0, 0, 0}, nullptr, {{kX, "50"}, {kY, "99"}, {k2D, nullptr}}, {2, 50, 5, 0, 0, 0}},
-      {{2, 4, 5, 0, 0, 0}, nullptr, {{k3D, nullptr}, {kX, "6"}, {kY, "7"}}, {3, 6, 7, 0, 0, 0}},
-      {{3, 6, 7, 0, 0, 0}, nullptr, {{kX, "60"}, {kY, "70"}, {k1D, nullptr}}, {1, 6, 7, 0, 0, 0}},
-      // Only a stored record brings a minus sign; the field takes digits only.
-      {{3, -5, 12, 0, 0, 0},
-       "3D insensitive literal off | X Y -5 12",
-       {{kY, "-1a2 3"}},
-       {3, -5, 123, 0, 0, 0}},
-      {{3, -5, 12, 0, 0, 0}, nullptr, {{kX, ""}}, {3, 0, 12, 0, 0, 0}},
-      {{2, 10, 10, 5, -3, 2}, "2D sensitive wildcard off | X 10 10", {}, {2, 10, 10, 1, 1, 0}},
-      {{2, 10, 10, 1, 1, 0},
-       nullptr,
-       {{kCaseInsensitive, nullptr}, {kLiteral, nullptr}, {kOn, nullptr}},
-       {2, 10, 10, 0, 0, 1}},
-  };
-  for (const auto& c : cases) {
+  for (const OkCase& c : okCases()) {
     Record record = storedRecord(c.stored);
     edit(record, 1, [&](HWND dialog) {
       if (c.shown != nullptr) {

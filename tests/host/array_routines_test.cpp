@@ -1,4 +1,4 @@
-// The setup record, and texts handed over by the element and key routines.
+// The setup record as the routines read it: dimensions, boundaries, delimiter and modes.
 #include "test_host.h"
 
 namespace testhost {
@@ -51,60 +51,6 @@ TEST(SetupRecordTest, DelimiterModesAndBetweenColumn) {
   between.create();
   EXPECT_EQ(between.betweenColumn(), 0);
   EXPECT_NE(between.elementArray(), nullptr);
-}
-
-TEST(ArrayRoutinesTest, EditsAndTextHandover) {
-  Instance t;
-  EXPECT_EQ(t.number(1), 25);  // capacity( of a new instance
-  EXPECT_EQ(t.number(0), 0);
-  EXPECT_TRUE(t.noText(2, {0}));  // get$( at size
-
-  EXPECT_EQ(t.action(9, 12), 0);  // Append value
-  EXPECT_EQ(t.text(2, {0}), "12");
-  EXPECT_EQ(t.number(3, {0}), 12);
-  t.action(9, 0);  // stored as None: the empty text, the number 0
-  EXPECT_EQ(t.text(2, {1}), "");
-  EXPECT_EQ(t.number(3, {1}), 0);
-  t.action(8, "hello");  // Append string
-  EXPECT_EQ(t.number(0), 3);
-  EXPECT_EQ(t.text(2, {2}), "hello");
-  EXPECT_TRUE(t.noText(2, {3}));
-  EXPECT_TRUE(t.noText(2, {-1}));
-
-  t.action(6, "first", 0);  // Insert string at
-  t.action(7, 5, 1);        // Insert value at
-  t.action(8, "sixth");     // on five elements it becomes element 5
-  EXPECT_EQ(t.number(0), 6);
-  EXPECT_EQ(t.text(2, {0}), "first");
-  EXPECT_EQ(t.number(3, {1}), 5);
-  EXPECT_EQ(t.text(2, {2}), "12");
-  EXPECT_EQ(t.text(2, {5}), "sixth");
-
-  t.action(13, "set", 2);  // Set string at
-  t.action(14, -7, 3);     // Set value at
-  EXPECT_EQ(t.text(2, {2}), "set");
-  EXPECT_EQ(t.number(3, {3}), -7);
-  EXPECT_EQ(t.text(2, {3}), "-7");
-
-  t.action(20, "key", 0);  // Set key string at
-  t.action(21, 42, 1);     // Set key value at
-  EXPECT_EQ(t.text(4, {0}), "key");
-  EXPECT_EQ(t.number(5, {1}), 42);
-  EXPECT_EQ(t.text(4, {1}), "42");
-  EXPECT_EQ(t.text(2, {0}), "first");  // the key read left the element alone
-
-  EXPECT_EQ(t.text(8, {"key"}), "first");  // keyStr$(: borrowed, so unchanged after
-  EXPECT_EQ(t.text(8, {"key"}), "first");
-  EXPECT_TRUE(t.noText(8, {"zz"}));
-  EXPECT_TRUE(t.noText(9, {123}));  // keyStr(
-
-  t.action(16, 0);  // Delete at
-  EXPECT_EQ(t.number(0), 5);
-  EXPECT_EQ(t.number(3, {0}), 5);
-  t.action(17);  // Delete all
-  EXPECT_EQ(t.number(0), 0);
-  EXPECT_TRUE(t.noText(2, {0}));
-  EXPECT_EQ(t.text(16, {","}), "");  // an empty list is still a text
 }
 
 }  // namespace

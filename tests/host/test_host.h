@@ -68,10 +68,6 @@ inline std::string expressionParams(int code) {
   return parameterLetters(module().expressionSignature(code));
 }
 
-inline SetupRecord oneD() {
-  return SetupRecord().set(kSetupDimensionCount, 1);
-}
-
 inline constexpr HostWord kToken = 0x5EED;
 
 class Instance : public quorrel::hostsim::Instance {
@@ -116,12 +112,6 @@ class Instance : public quorrel::hostsim::Instance {
     std::string value(reinterpret_cast<const char*>(result));
     EXPECT_EQ(sizes[0], static_cast<int32_t>(value.size() + 1));
     return value;
-  }
-  // No text: the number 0, flag untouched, nothing allocated.
-  bool noText(int code, std::vector<Arg> params = {}) {
-    setFlags(0);
-    const HostWord result = expression(code, std::move(params));
-    return result == 0 && flags() == 0 && allocations.empty();
   }
 };
 

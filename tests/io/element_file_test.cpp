@@ -1,7 +1,5 @@
 #include "io/element_file.h"
 
-#include <sys/stat.h>
-
 #include "io_test_support.h"
 
 namespace quorrel {
@@ -43,12 +41,6 @@ TEST_F(ElementFile, WritesExactlyTheElementsBytes) {
   EXPECT_FALSE(exists(path("none.bin")));
 }
 
-TEST_F(ElementFile, UnwritablePlacesGetNothing) {
-  ElementArray a;
-  a.appendString("x");
-  expectNothingSavedToUnusablePaths([&](const char* file) { saveElementToFile(a, 0, file, 0); });
-}
-
 TEST_F(ElementFile, ReadsWholeFilesOfAnySize) {
   std::string big(3 * 1024 * 1024 + 17, '\0');
   for (size_t i = 0; i < big.size(); ++i) big[i] = static_cast<char>((i * 2654435761u) >> 13);
@@ -74,18 +66,6 @@ TEST_F(ElementFile, ReadsWholeFilesOfAnySize) {
   EXPECT_EQ(maps->data()[maps->size() - 1], '\n');
 #endif
 }
-
-#ifndef _WIN32
-TEST_F(ElementFile, NewFilesAreOwnerReadWriteOnly) {
-  ElementArray a;
-  a.appendString("x");
-  const mode_t old = umask(0);
-  saveElementToFile(a, 0, path("p.bin").c_str(), 0);
-  umask(old);
-  const auto perms = std::filesystem::status(path("p.bin")).permissions();
-  EXPECT_EQ(perms, std::filesystem::perms::owner_read | std::filesystem::perms::owner_write);
-}
-#endif
 
 }  // namespace
 }  // namespace quorrel

@@ -3,7 +3,6 @@
 #pragma once
 
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 #include <cstdlib>
 #include <filesystem>
@@ -56,19 +55,6 @@ class IoTest : public ::testing::Test {
     save(a, path("out").c_str(), mode);
     return readBytes(path("out"));
   }
-  // Saving into a folder, a missing folder or a read-only folder creates nothing.
-  template <typename Save>
-  void expectNothingSavedToUnusablePaths(Save save) {
-    save(dir_.string().c_str());
-    save(path("no/such/file").c_str());
-    EXPECT_FALSE(exists(path("no")));
-    if (geteuid() == 0) GTEST_SKIP() << "running as root: a read-only folder is still writable";
-    std::filesystem::permissions(
-        dir_, std::filesystem::perms::owner_read | std::filesystem::perms::owner_exec);
-    save(path("ro").c_str());
-    EXPECT_FALSE(exists(path("ro")));
-  }
-
   std::filesystem::path dir_;
 };
 
@@ -93,12 +79,6 @@ inline std::string bytesOf(std::initializer_list<int> values) {
   std::string s;
   for (int v : values) s.push_back(static_cast<char>(v));
   return s;
-}
-
-// Type, size, number and bytes in one text, for whole-element comparisons.
-inline std::string describe(const Element& e) {
-  return std::to_string(static_cast<int>(e.type())) + "/" + std::to_string(e.size()) + "/" +
-         std::to_string(e.number()) + "/" + contentOf(e);
 }
 
 }  // namespace quorrel

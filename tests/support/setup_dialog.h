@@ -53,6 +53,41 @@ inline constexpr int kCaseInsensitive = 1005, kCaseSensitive = 1006, kLiteral = 
                      kWildcard = 1008;
 inline constexpr int kDelimiter = 1009, kOn = 1010, kOff = 1011;
 
+// What the dialog shows for a stored record and what OK stores after the author's steps
+// (a step with text types it into the field, one without clicks the button). The
+// dimension picks the boundaries stored: 2D stores X and keeps Y, 3D both, 1D neither.
+// Boundaries read as signed numbers; modes show as zero or not and store as 0 or 1.
+struct Step {
+  int id;
+  const char* text;
+};
+struct OkCase {
+  Ints stored;
+  const char* shown;  // state(), then the X and Y fields; null: not checked
+  std::vector<Step> steps;
+  Ints after;
+};
+inline const std::vector<OkCase>& okCases() {
+  static const std::vector<OkCase> cases = {
+      {{7, 4, 5, 0, 0, 0}, "1D insensitive literal off | 4 5", {}, {1, 4, 5, 0, 0, 0}},
+      {{3, 4, 5, 0, 0, 0}, nullptr, {{kX, "50"}, {kY, "99"}, {k2D, nullptr}}, {2, 50, 5, 0, 0, 0}},
+      {{2, 4, 5, 0, 0, 0}, nullptr, {{k3D, nullptr}, {kX, "6"}, {kY, "7"}}, {3, 6, 7, 0, 0, 0}},
+      {{3, 6, 7, 0, 0, 0}, nullptr, {{kX, "60"}, {kY, "70"}, {k1D, nullptr}}, {1, 6, 7, 0, 0, 0}},
+      // Only a stored record brings a minus sign; the field takes digits only.
+      {{3, -5, 12, 0, 0, 0},
+       "3D insensitive literal off | X Y -5 12",
+       {{kY, "-1a2 3"}},
+       {3, -5, 123, 0, 0, 0}},
+      {{3, -5, 12, 0, 0, 0}, nullptr, {{kX, ""}}, {3, 0, 12, 0, 0, 0}},
+      {{2, 10, 10, 5, -3, 2}, "2D sensitive wildcard off | X 10 10", {}, {2, 10, 10, 1, 1, 0}},
+      {{2, 10, 10, 1, 1, 0},
+       nullptr,
+       {{kCaseInsensitive, nullptr}, {kLiteral, nullptr}, {kOn, nullptr}},
+       {2, 10, 10, 0, 0, 1}},
+  };
+  return cases;
+}
+
 // The checked radio buttons of all four groups and the enabled boundary fields, e.g.
 // "2D insensitive literal off | X".
 inline std::string state(HWND dialog) {

@@ -29,9 +29,10 @@ x)",
 }
 
 TEST(Rfc4180, WritesQuotesOnlyWhereNeededAndReadsBack) {
-  const CsvRows rows = {{"plain", "a,b", "q\"", ""}, {"cr\rlf\n", " lead"}, {""}};
+  // A lone CR or LF each needs quotes: either one alone would end the record.
+  const CsvRows rows = {{"plain", "a,b", "q\"", ""}, {"cr\r", "lf\n", " lead"}, {""}};
   const std::string text = writeRfc4180(rows);
-  EXPECT_EQ(text, "plain,\"a,b\",\"q\"\"\",\r\n\"cr\rlf\n\", lead\r\n\r\n");
+  EXPECT_EQ(text, "plain,\"a,b\",\"q\"\"\",\r\n\"cr\r\",\"lf\n\", lead\r\n\r\n");
   EXPECT_EQ(readRfc4180(text), rows);
 }
 

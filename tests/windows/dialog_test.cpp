@@ -170,15 +170,8 @@ void createObject(const Entry& dll) {
   checkEqual(delimiterOf(cancelled), std::string(","), "create cancelled: delimiter");
 }
 
-void dimensions(const Entry& dll) {
-  Record record = storedRecord({7, 4, 5, 0, 0, 0});  // an unknown count opens as 1D
-  edit(dll, "unknown count", record, 1, [](HWND dialog) {
-    checkEqual(state(dialog), std::string("1D insensitive literal off |"), "unknown count: shown");
-    click(dialog, kOk);
-  });
-  checkFields(record, {1, 4, 5, 0, 0, 0}, "unknown count");
-
-  record = storedRecord({2, 10, 10, 0, 0, 0});
+void dimensionButtons(const Entry& dll) {
+  Record record = storedRecord({2, 10, 10, 0, 0, 0});
   edit(dll, "dimension buttons", record, 0, [](HWND dialog) {
     click(dialog, k3D);
     checkEqual(state(dialog), std::string("3D insensitive literal off | X Y"), "3D enables X, Y");
@@ -188,65 +181,24 @@ void dimensions(const Entry& dll) {
     checkEqual(state(dialog), std::string("2D insensitive literal off | X"), "2D enables X");
     press(dialog, VK_ESCAPE);
   });
-
-  record = storedRecord({3, 4, 5, 0, 0, 0});
-  edit(dll, "2D", record, 1, [](HWND dialog) {
-    type(dialog, kX, "50");
-    type(dialog, kY, "99");
-    click(dialog, k2D);
-    checkEqual(fieldText(dialog, kY), std::string("99"), "2D: Y field keeps its text");
-    click(dialog, kOk);
-  });
-  checkFields(record, {2, 50, 5, 0, 0, 0}, "2D stores X and keeps Y");
-
-  record = storedRecord({2, 4, 5, 0, 0, 0});
-  edit(dll, "3D", record, 1, [](HWND dialog) {
-    click(dialog, k3D);
-    type(dialog, kX, "6");
-    type(dialog, kY, "7");
-    press(dialog, VK_RETURN);
-  });
-  checkFields(record, {3, 6, 7, 0, 0, 0}, "3D stores X and Y");
-  edit(dll, "1D", record, 1, [](HWND dialog) {
-    type(dialog, kX, "60");
-    type(dialog, kY, "70");
-    click(dialog, k1D);
-    click(dialog, kOk);
-  });
-  checkFields(record, {1, 6, 7, 0, 0, 0}, "1D keeps X and Y");
 }
 
-void signedBoundaries(const Entry& dll) {
-  Record record = storedRecord({3, -5, 12, 0, 0, 0});
-  edit(dll, "signed", record, 1, [](HWND dialog) {
-    checkEqual(fieldText(dialog, kX), std::string("-5"), "signed: X shows -5");
-    type(dialog, kY, "-1a2 3");  // the number field takes digits only
-    checkEqual(fieldText(dialog, kY), std::string("123"), "signed: Y typed takes digits");
-    click(dialog, kOk);
-  });
-  checkFields(record, {3, -5, 123, 0, 0, 0}, "signed");
-  edit(dll, "emptied", record, 1, [](HWND dialog) {
-    setText(dialog, kX, "");
-    click(dialog, kOk);
-  });
-  checkFields(record, {3, 0, 123, 0, 0, 0}, "an emptied field stores 0");
-}
-
-void modes(const Entry& dll) {
-  Record record = storedRecord({2, 10, 10, 5, -3, 2});  // only exactly 1 is On
-  edit(dll, "modes", record, 1, [](HWND dialog) {
-    checkEqual(state(dialog), std::string("2D sensitive wildcard off | X"), "modes: shown");
-    click(dialog, kOk);
-  });
-  checkFields(record, {2, 10, 10, 1, 1, 0}, "modes stored as 0 or 1");
-  edit(dll, "modes clicked", record, 1, [](HWND dialog) {
-    click(dialog, kCaseInsensitive);
-    click(dialog, kLiteral);
-    click(dialog, kOn);
-    checkEqual(state(dialog), std::string("2D insensitive literal on | X"), "modes: clicked");
-    click(dialog, kOk);
-  });
-  checkFields(record, {2, 10, 10, 0, 0, 1}, "modes clicked");
+void okStoresWhatTheDialogShows(const Entry& dll) {
+  for (const OkCase& c : okCases()) {
+    const std::string what = "OK on " + show(c.stored);
+    Record record = storedRecord(c.stored);
+    edit(dll, what, record, 1, [&](HWND dialog) {
+      if (c.shown != nullptr) {
+        checkEqual(state(dialog) + " " + fieldText(dialog, kX) + " " + fieldText(dialog, kY),
+                   std::string(c.shown), what + ": shown");
+      }
+      for (const Step& step : c.steps) {
+        step.text != nullptr ? type(dialog, step.id, step.text) : click(dialog, step.id);
+      }
+      click(dialog, kOk);
+    });
+    checkFields(record, c.after, what);
+  }
 }
 
 void delimiter(const Entry& dll) {
@@ -342,9 +294,8 @@ int main(int argc, char** argv) {
                   entryPoint<abi::EditObjectFn>(module, "EditObject")};
   if (dll.create && dll.edit) {
     createObject(dll);
-    dimensions(dll);
-    signedBoundaries(dll);
-    modes(dll);
+    dimensionButtons(dll);
+    okStoresWhatTheDialogShows(dll);
     delimiter(dll);
     cancelAndHelp(dll);
   }
