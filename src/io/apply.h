@@ -36,12 +36,6 @@ inline ElementValue textOperand(const char* data, int32_t held, std::string& spi
   return {ElementType::String, 0, data, static_cast<int32_t>(text.size() + 1)};
 }
 
-// insertString of the view's text; a null view inserts no text (a None element).
-inline void insertTextAt(ElementArray& array, const char* data, int32_t held, int32_t index) {
-  std::string spill;
-  array.insertElement(textOperand(data, held, spill), index);
-}
-
 // Collects loaded elements and appends them in runs, so that the capacity and the
 // row states are brought up to date once per run instead of once per element.
 // flush() before anything else reads the array.

@@ -32,28 +32,6 @@ void writeCell(BufferedWriter& out, int32_t column, const char* text) {
   out.text(cell);
 }
 
-// Cuts the line's cells in place (its end must be writable) and hands each to visit
-// with its length; a cell of exactly two double quotes is an empty text.
-template <class Visit>
-void forEachCell(char* line, std::size_t length, Visit&& visit) {
-  char* const stop = line + length;
-  *stop = '\0';
-  char* cell = line;
-  for (;;) {
-    auto* comma = static_cast<char*>(std::memchr(cell, ',', static_cast<std::size_t>(stop - cell)));
-    char* const cellEnd = comma != nullptr ? comma : stop;
-    *cellEnd = '\0';
-    auto cellLength = static_cast<std::size_t>(cellEnd - cell);
-    if (std::string_view(cell, cellLength) == kEmptyCell) {
-      cell[0] = '\0';
-      cellLength = 0;
-    }
-    visit(cell, cellLength);
-    if (comma == nullptr) return;
-    cell = comma + 1;
-  }
-}
-
 // The text of the cells that pad short lines.
 constexpr char kNoText[] = "";
 
@@ -173,38 +151,6 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
     }
     file.finish(out.complete());
   } catch (const std::bad_alloc&) {
-  }
-}
-
-void writeCsvFile(const char* path, const CsvTable& table, uint16_t fileMode) {
-  try {
-    SaveFile file(path, fileMode);
-    if (!file.isOpen()) return;
-    BufferedWriter out(file.handle());
-    for (const CsvRow& row : table.rows) {
-      for (int32_t j = 0; j < row.cellCount(); ++j) {
-        writeCell(out, j, row.cells[static_cast<std::size_t>(j)]);
-      }
-      out.text(kLineEnd);
-    }
-    file.finish(out.complete());
-  } catch (const std::bad_alloc&) {
-  }
-}
-
-std::optional<CsvTable> readCsvFile(const char* path) {
-  try {
-    std::optional<ByteBuffer> text = readTextFile(path);
-    if (!text) return std::nullopt;
-    CsvTable table;
-    table.text = std::move(*text);
-    io_detail::forEachLine(table.text.data(), table.text.size(), [&](char* line, size_t length) {
-      CsvRow& row = table.rows.emplace_back();
-      forEachCell(line, length, [&](const char* cell, std::size_t) { row.cells.push_back(cell); });
-    });
-    return table;
-  } catch (const std::bad_alloc&) {
-    return std::nullopt;
   }
 }
 

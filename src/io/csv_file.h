@@ -5,25 +5,11 @@
 
 #include <cstdint>
 #include <optional>
-#include <vector>
 
 #include "array/element_array.h"
 #include "io/file_handle.h"
 
 namespace quorrel {
-
-// A row's cells: zero-terminated texts, or null for a cell with no text.
-struct CsvRow {
-  std::vector<const char*> cells;
-  int32_t cellCount() const { return static_cast<int32_t>(cells.size()); }
-};
-
-// The rows of a CSV text. A table read from a file points into its own `text`.
-struct CsvTable {
-  std::vector<CsvRow> rows;
-  ByteBuffer text;
-  int32_t rowCount() const { return static_cast<int32_t>(rows.size()); }
-};
 
 // One line per row of the X boundary's width when the array has two or more
 // dimensions and an X boundary of at least 1; otherwise the whole array on one line.
@@ -32,10 +18,6 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode);
 // the widest line's cell count as X boundary, and every line adds that many String
 // elements (short lines padded with empty texts).
 void loadCsvFile(ElementArray& array, const char* path, int32_t append);
-
-void writeCsvFile(const char* path, const CsvTable& table, uint16_t fileMode);
-// Nothing only when the file cannot be opened.
-std::optional<CsvTable> readCsvFile(const char* path);
 
 // The file as zero-terminated text: a zero byte inside the file ends the text (size()
 // is the text's length). Nothing when the file cannot be opened; std::bad_alloc when

@@ -9,6 +9,7 @@
 #include "array/int32.h"
 #include "array/text.h"
 #include "io/apply.h"
+#include "io/file_handle.h"
 #include "io/parsing.h"
 
 namespace quorrel {
@@ -131,34 +132,6 @@ bool parseHost(char* data, std::size_t size, Sink& sink) {
   return true;
 }
 
-struct ImageSink {
-  ArrayImage& image;
-
-  void header(int32_t x, int32_t y, int32_t z) {
-    image.boundaries[0] = x;
-    image.boundaries[1] = y;
-    image.boundaries[2] = z;
-  }
-  void number(int32_t n) {
-    ElementRecord r;
-    r.type = static_cast<uint16_t>(ElementType::Value);
-    r.size = 4;
-    r.number = n;
-    image.elements.push_back(r);
-  }
-  void text(const char* data, int32_t size) {
-    ElementRecord r;
-    r.type = static_cast<uint16_t>(ElementType::String);
-    r.size = size;
-    r.data = data;
-    image.elements.push_back(r);
-  }
-  void expectCells(int64_t count) { image.elements.reserve(static_cast<std::size_t>(count)); }
-  void emptyTexts(int64_t count) {
-    for (int64_t i = 0; i < count; ++i) text(nullptr, 0);
-  }
-};
-
 // Texts are borrowed from the file's bytes (which the array then keeps).
 struct LoadSink {
   LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing), run(target) {}
@@ -211,37 +184,6 @@ void saveHostArrayFile(ElementArray& array, const char* path, uint16_t mode) {
       return {static_cast<int32_t>(std::strlen(text)), text};
     });
   } catch (const std::bad_alloc&) {
-  }
-}
-
-void writeHostArrayFile(const char* path, const ArrayImage& image, uint16_t fileMode) {
-  try {
-    NumberText scratch;
-    const int32_t count = image.elementCount();
-    writeHostFile(path, fileMode, image.boundaries[0], image.boundaries[1], image.boundaries[2],
-                  [&](int32_t k) -> CellText {
-                    if (k < 0 || k >= count) return {};
-                    const ElementRecord& r = image.elements[static_cast<std::size_t>(k)];
-                    if (r.type == static_cast<uint16_t>(ElementType::Value)) {
-                      return {writeDecimal(r.number, scratch.text), scratch.text};
-                    }
-                    return {r.data == nullptr ? std::min(r.size, 0) : r.size, r.data};
-                  });
-  } catch (const std::bad_alloc&) {
-  }
-}
-
-std::optional<ArrayImage> readHostArrayFile(const char* path) {
-  try {
-    std::optional<ByteBuffer> bytes = readFileBytes(path, 1);
-    if (!bytes) return std::nullopt;
-    ArrayImage image;
-    image.storage = std::move(*bytes);
-    ImageSink sink{image};
-    if (!parseHost(image.storage.data(), image.storage.size(), sink)) return std::nullopt;
-    return image;
-  } catch (const std::bad_alloc&) {
-    return std::nullopt;
   }
 }
 

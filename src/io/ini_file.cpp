@@ -7,6 +7,7 @@
 
 #include "io/apply.h"
 #include "io/csv_file.h"
+#include "io/file_handle.h"
 #include "io/parsing.h"
 
 namespace quorrel {
@@ -100,14 +101,6 @@ ElementValue cutText(std::string_view text) {
   return {ElementType::String, 0, text.data(), static_cast<int32_t>(text.size() + 1)};
 }
 
-struct DocumentSink {
-  IniDocument& document;
-  void section(const char* name) { document.sections.push_back({name, {}}); }
-  void entry(std::string_view key, std::string_view value) {
-    document.sections.back().entries.push_back({key.data(), value.data()});
-  }
-};
-
 // Keys are borrowed from the file's bytes; values are copied into their records.
 struct LoadSink {
   io_detail::AppendRun& run;
@@ -135,35 +128,6 @@ void saveIniFile(ElementArray& array, const char* path, uint16_t mode) {
     out.text(kLineEnd);
     file.finish(out.complete());
   } catch (const std::bad_alloc&) {
-  }
-}
-
-void writeIniFile(const char* path, const IniDocument& document, uint16_t fileMode) {
-  try {
-    SaveFile file(path, fileMode);
-    if (!file.isOpen()) return;
-    BufferedWriter out(file.handle());
-    for (const IniSection& section : document.sections) {
-      writeSectionLine(out, section.name);
-      for (const IniEntry& entry : section.entries) writeEntry(out, entry.key, entry.value);
-      out.text(kLineEnd);
-    }
-    file.finish(out.complete());
-  } catch (const std::bad_alloc&) {
-  }
-}
-
-std::optional<IniDocument> readIniFile(const char* path) {
-  try {
-    std::optional<ByteBuffer> text = readTextFile(path);
-    if (!text) return std::nullopt;
-    IniDocument document;
-    document.text = std::move(*text);
-    DocumentSink sink{document};
-    parseIni(document.text.data(), document.text.size(), sink);
-    return document;
-  } catch (const std::bad_alloc&) {
-    return std::nullopt;
   }
 }
 

@@ -8,18 +8,41 @@
 #include <string_view>
 
 #include "io/apply.h"
+#include "io/file_handle.h"
 #include "io/parsing.h"
 
 namespace quorrel {
 
 namespace {
 
+// One column label. `text` holds `length` bytes (not terminated); null when the
+// record has no text (a length of 0 or less).
+struct LabelRecord {
+  int32_t length = 0;
+  const char* text = nullptr;
+};
+
+// One element (or one host array cell). `number` is the data of a Value (type 1);
+// for every other type `data` holds `size` bytes (not terminated), or is null when
+// the size is 0 or less. The key half follows the same rule; keyType 0 and keySize 0
+// mean no key.
+struct ElementRecord {
+  const char* data = nullptr;
+  const char* keyData = nullptr;
+  int32_t size = 0;
+  int32_t number = 0;
+  int32_t keySize = 0;
+  int32_t keyNumber = 0;
+  uint16_t type = 0;
+  uint16_t keyType = 0;
+};
+
 using io_detail::Cursor;
 
 constexpr std::string_view kMagic{"ZUBARRAY", 8};
 constexpr uint16_t kTypeValue = static_cast<uint16_t>(ElementType::Value);
 constexpr uint16_t kTypeString = static_cast<uint16_t>(ElementType::String);
-constexpr int32_t kMaxDimensions = ArrayImage::kBoundarySlots;
+constexpr int32_t kMaxDimensions = ElementArray::kBoundaryCount;
 
 // --- Writing -------------------------------------------------------------------------
 
@@ -77,11 +100,6 @@ void writeRecord(BufferedWriter& out, const Half& value, const Half& key) {
       out.bytes(h->data, dataLength(*h));
     }
   }
-}
-
-void writeRecord(BufferedWriter& out, const ElementRecord& r) {
-  writeRecord(out, {r.type, r.size, r.number, r.data},
-              {r.keyType, r.keySize, r.keyNumber, r.keyData});
 }
 
 Half halfOf(const Element* e) {
@@ -157,26 +175,6 @@ bool parseNative(std::string_view file, Sink& sink) {
   }
   return true;
 }
-
-// Fills an image; its views point into the image's own storage.
-struct ImageSink {
-  ArrayImage& image;
-
-  void version(uint16_t v) { image.version = v; }
-  void header(int32_t dimensions, const int32_t* boundaries) {
-    image.dimensions = dimensions;
-    std::copy(boundaries, boundaries + kMaxDimensions, image.boundaries);
-  }
-  void label(const LabelRecord& label) { image.labels.push_back(label); }
-  void expectElements(std::size_t count) { image.elements.reserve(count); }
-  void element(const ElementRecord& r) { image.elements.push_back(r); }
-  const char* zeroFilled(std::string_view held, int32_t size) {
-    auto block = std::make_unique<char[]>(static_cast<std::size_t>(size));
-    std::copy(held.begin(), held.end(), block.get());
-    image.filled.push_back(std::move(block));
-    return image.filled.back().get();
-  }
-};
 
 // The operand of one half of a record: the value or key that a load stores.
 ElementValue operandOf(uint16_t type, int32_t size, int32_t number, const char* data,
@@ -269,35 +267,6 @@ void saveNativeFile(ElementArray& array, const char* path, uint16_t mode) {
     for (const Element& e : array.slots()) writeRecord(out, halfOf(&e), halfOf(e.key()));
     file.finish(out.complete());
   } catch (const std::bad_alloc&) {
-  }
-}
-
-void writeNativeFile(const char* path, const ArrayImage& image, uint16_t fileMode) {
-  try {
-    SaveFile file(path, fileMode);
-    if (!file.isOpen()) return;
-    BufferedWriter out(file.handle());
-    writeHeader(out, image.dimensions, image.boundaries);
-    out.i32(image.labelCount());
-    for (const LabelRecord& label : image.labels) writeLabel(out, label.length, label.text);
-    out.i32(image.elementCount());
-    for (const ElementRecord& r : image.elements) writeRecord(out, r);
-    file.finish(out.complete());
-  } catch (const std::bad_alloc&) {
-  }
-}
-
-std::optional<ArrayImage> readNativeFile(const char* path) {
-  try {
-    std::optional<ByteBuffer> bytes = readFileBytes(path, 0);
-    if (!bytes) return std::nullopt;
-    ArrayImage image;
-    image.storage = std::move(*bytes);
-    ImageSink sink{image};
-    if (!parseNative(image.storage.view(), sink)) return std::nullopt;
-    return image;
-  } catch (const std::bad_alloc&) {
-    return std::nullopt;
   }
 }
 

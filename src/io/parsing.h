@@ -1,5 +1,5 @@
 // Internal helpers of the file readers: a bounds-checked little-endian cursor over a
-// file held in memory, and the line splitting of the text formats.
+// file held in memory, and the byte scan that splits the text formats.
 #pragma once
 
 #include <algorithm>
@@ -98,42 +98,6 @@ void forEachByteOf(const char* text, std::size_t size, char a, char b, char c, V
     uint64_t word = 0;  // zero bytes past the end match nothing
     std::memcpy(&word, text + base, size - base);
     scan(base, word);
-  }
-}
-
-inline bool isLineBreak(char c) {
-  return c == '\r' || c == '\n';
-}
-
-// Calls visit(begin, length) for every line of text[0, size): lines end at CR or LF,
-// and a run of them is one break, so no line is empty. text[size] must be writable
-// (the terminator); a visitor may overwrite begin[length] to cut the line in place.
-// The next CR and the next LF are each searched for once and kept until passed, so a
-// file that uses only one of them is still read in one pass.
-template <class Visit>
-void forEachLine(char* text, std::size_t size, Visit&& visit) {
-  struct NextBreak {
-    char c;
-    bool known = false;
-    std::size_t at = 0;
-    std::size_t from(const char* t, std::size_t i, std::size_t n) {
-      if (!known || at < i) {
-        const void* hit = std::memchr(t + i, c, n - i);
-        at = hit == nullptr ? n : static_cast<std::size_t>(static_cast<const char*>(hit) - t);
-        known = true;
-      }
-      return at;
-    }
-  };
-  NextBreak cr{'\r'};
-  NextBreak lf{'\n'};
-  std::size_t i = 0;
-  while (i < size) {
-    while (i < size && isLineBreak(text[i])) ++i;
-    if (i >= size) break;
-    const std::size_t end = std::min(cr.from(text, i, size), lf.from(text, i, size));
-    visit(text + i, end - i);
-    i = end + 1;
   }
 }
 
