@@ -21,16 +21,14 @@
 
 namespace quorrel {
 
-namespace {
-
-// The operand as it will be stored: None whenever it has no type, no data (the number
-// 0 for a Value) or a size below 1.
-ElementValue normalised(const ElementValue& value) {
+ElementValue Element::normalised(const ElementValue& value) {
   if (value.type == ElementType::None || value.size < 1) return {};
   if (value.type == ElementType::Value) return value.number == 0 ? ElementValue{} : value;
   if (value.bytes == nullptr) return {};
   return value;
 }
+
+namespace {
 
 struct SlabHeader {
   uint32_t live;  // records in the block, plus one while the slab still fills it
@@ -220,12 +218,6 @@ uint64_t Element::noneKeyedWordFor(const ElementValue& value, RecordSlab* slab) 
   Record* r = makeRecord(value, true, slab);
   r->flags |= kHasKey;
   return recordWord(r);
-}
-
-Element Element::noneKeyed(const ElementValue& value, RecordSlab* slab) {
-  Element e;
-  e.word_ = noneKeyedWordFor(normalised(value), slab);
-  return e;
 }
 
 Element Element::of(const ElementValue& value, RecordSlab* slab) {

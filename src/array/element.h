@@ -157,7 +157,15 @@ class Element {
   // The same with the key element already made (keyless; a borrowed text, say).
   static Element keyedWith(const ElementValue& value, Element&& key, RecordSlab* slab = nullptr);
   // keyed(value, None): a Value or None stays one word.
-  static Element noneKeyed(const ElementValue& value, RecordSlab* slab = nullptr);
+  static Element noneKeyed(const ElementValue& value, RecordSlab* slab = nullptr) {
+    Element e;
+    if (value.type == ElementType::Value && value.size == 4) {  // most of a loaded file
+      e.word_ = value.number == 0 ? kNoneWithNoneKey : inlineWord(value.number) | kInlineNoneKey;
+    } else {
+      e.word_ = noneKeyedWordFor(normalised(value), slab);
+    }
+    return e;
+  }
   // True when a key set to `key` would be None (the element still has a key then).
   static bool isNoneKey(const ElementValue& key);
   // The same with a None key: as keyed(view, None) would make it.
@@ -268,6 +276,9 @@ class Element {
   // The operand a key stores: a Value is 4 bytes and a text is taken whole, whatever
   // size the operand claims.
   static ElementValue keyOperand(const ElementValue& value);
+  // The operand as it will be stored: None whenever it has no type, no data (the number
+  // 0 for a Value) or a size below 1.
+  static ElementValue normalised(const ElementValue& value);
   int32_t recordValue() const;
   const char* numberOrEmptyText(NumberText& scratch) const;
   // A new record holding `value` (already normalised), with a key slot when asked,

@@ -9,6 +9,10 @@
 #include <cstring>
 #include <string_view>
 
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
 namespace quorrel::io_detail {
 
 // Files are little-endian, like every machine the module runs on: fields and words are
@@ -89,6 +93,22 @@ void forEachByteOf(const char* text, std::size_t size, char a, char b, char c, V
     }
   };
   std::size_t base = 0;
+#if defined(__SSE2__)
+  // Sixteen bytes at a time where the processor has the instructions for it.
+  const __m128i va = _mm_set1_epi8(a);
+  const __m128i vb = _mm_set1_epi8(b);
+  const __m128i vc = _mm_set1_epi8(c);
+  for (; base + 16 <= size; base += 16) {
+    const __m128i v = _mm_loadu_si128(reinterpret_cast<const __m128i*>(text + base));
+    const __m128i any = _mm_or_si128(_mm_or_si128(_mm_cmpeq_epi8(v, va), _mm_cmpeq_epi8(v, vb)),
+                                     _mm_cmpeq_epi8(v, vc));
+    auto hits = static_cast<uint32_t>(_mm_movemask_epi8(any));
+    while (hits != 0) {
+      visit(base + static_cast<std::size_t>(std::countr_zero(hits)));
+      hits &= hits - 1;
+    }
+  }
+#endif
   for (; base + 8 <= size; base += 8) {
     uint64_t word;
     std::memcpy(&word, text + base, sizeof word);
