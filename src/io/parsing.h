@@ -77,20 +77,39 @@ inline uint64_t zeroBytes(uint64_t x) {
   return ~(((x & kLow7) + kLow7) | x | kLow7);
 }
 
+// std::popcount without the library call it becomes where the processor has no
+// population count instruction (the baseline x86 targets).
+inline int countBits(uint64_t x) {
+  x -= (x >> 1) & 0x5555555555555555ull;
+  x = (x & 0x3333333333333333ull) + ((x >> 2) & 0x3333333333333333ull);
+  x = (x + (x >> 4)) & 0x0F0F0F0F0F0F0F0Full;
+  return static_cast<int>((x * 0x0101010101010101ull) >> 56);
+}
+
 inline uint64_t bytesEqualTo(uint64_t word, char c) {
   return zeroBytes(word ^ (0x0101010101010101ull * static_cast<unsigned char>(c)));
 }
 
-// Calls visit(i), in order, for every i in [0, size) where text[i] is a, b or c (none
-// of them zero). visit may overwrite text[i] and any byte before it.
+// One block of a byte scan: the bytes [base, end) of the text. Bit k of `first` marks
+// the byte at base + (k >> shift) as the scan's first byte value, bit k of `others` as
+// one of the other two; shift is 0 for 16-byte blocks and 3 for 8-byte words (one bit,
+// the top one, per byte).
+struct ScanBlock {
+  std::size_t base;
+  std::size_t end;
+  uint64_t first;
+  uint64_t others;
+  int shift;
+  std::size_t at(int bit) const { return base + (static_cast<std::size_t>(bit) >> shift); }
+};
+
+// Calls visit(block) for the blocks of text[0, size) in order, marking the bytes equal
+// to a, b or c (none of them zero). visit may overwrite any byte of its block or before.
 template <class Visit>
-void forEachByteOf(const char* text, std::size_t size, char a, char b, char c, Visit&& visit) {
-  const auto scan = [&](std::size_t base, uint64_t word) {
-    uint64_t hits = bytesEqualTo(word, a) | bytesEqualTo(word, b) | bytesEqualTo(word, c);
-    while (hits != 0) {
-      visit(base + static_cast<std::size_t>(std::countr_zero(hits) >> 3));
-      hits &= hits - 1;
-    }
+void forEachBlockOf(const char* text, std::size_t size, char a, char b, char c, Visit&& visit) {
+  const auto word = [&](std::size_t base, uint64_t w) {
+    visit(ScanBlock{base, std::min(base + 8, size), bytesEqualTo(w, a),
+                    bytesEqualTo(w, b) | bytesEqualTo(w, c), 3});
   };
   std::size_t base = 0;
 #if defined(__SSE2__)
@@ -100,25 +119,33 @@ void forEachByteOf(const char* text, std::size_t size, char a, char b, char c, V
   const __m128i vc = _mm_set1_epi8(c);
   for (; base + 16 <= size; base += 16) {
     const __m128i v = _mm_loadu_si128(reinterpret_cast<const __m128i*>(text + base));
-    const __m128i any = _mm_or_si128(_mm_or_si128(_mm_cmpeq_epi8(v, va), _mm_cmpeq_epi8(v, vb)),
-                                     _mm_cmpeq_epi8(v, vc));
-    auto hits = static_cast<uint32_t>(_mm_movemask_epi8(any));
-    while (hits != 0) {
-      visit(base + static_cast<std::size_t>(std::countr_zero(hits)));
-      hits &= hits - 1;
-    }
+    const auto first = static_cast<uint64_t>(_mm_movemask_epi8(_mm_cmpeq_epi8(v, va)));
+    const auto others = static_cast<uint64_t>(
+        _mm_movemask_epi8(_mm_or_si128(_mm_cmpeq_epi8(v, vb), _mm_cmpeq_epi8(v, vc))));
+    visit(ScanBlock{base, base + 16, first, others, 0});
   }
 #endif
   for (; base + 8 <= size; base += 8) {
-    uint64_t word;
-    std::memcpy(&word, text + base, sizeof word);
-    scan(base, word);
+    uint64_t w;
+    std::memcpy(&w, text + base, sizeof w);
+    word(base, w);
   }
   if (base < size) {
-    uint64_t word = 0;  // zero bytes past the end match nothing
-    std::memcpy(&word, text + base, size - base);
-    scan(base, word);
+    uint64_t w = 0;  // zero bytes past the end match nothing
+    std::memcpy(&w, text + base, size - base);
+    word(base, w);
   }
+}
+
+// Calls visit(i), in order, for every i in [0, size) where text[i] is a, b or c (none
+// of them zero). visit may overwrite text[i] and any byte before it.
+template <class Visit>
+void forEachByteOf(const char* text, std::size_t size, char a, char b, char c, Visit&& visit) {
+  forEachBlockOf(text, size, a, b, c, [&](const ScanBlock& block) {
+    for (uint64_t hits = block.first | block.others; hits != 0; hits &= hits - 1) {
+      visit(block.at(std::countr_zero(hits)));
+    }
+  });
 }
 
 }  // namespace quorrel::io_detail
