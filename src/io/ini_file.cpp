@@ -45,7 +45,8 @@ void writeEntry(BufferedWriter& out, const char* key, const char* value) {
 // Handles one line of an INI text (not empty, no line break) whose first "=" is at
 // `equals` (null when it has none), cutting names, keys and values in place.
 template <class Sink>
-void parseIniLine(char* line, char* end, char* equals, bool& inSection, Sink& sink) {
+[[gnu::always_inline]] inline void parseIniLine(char* line, char* end, char* equals,
+                                                bool& inSection, Sink& sink) {
   if (end - line <= 1) return;
   char* p = line;
   while (p < end && (*p == ' ' || *p == '\t')) ++p;
