@@ -147,15 +147,22 @@ class Element {
   // by setKey(key) makes, built with one record instead of two.
   static Element keyed(const ElementValue& value, const ElementValue& key,
                        RecordSlab* slab = nullptr);
+  // The same with the key element already made (keyless; a borrowed text, say).
+  static Element keyedWith(const ElementValue& value, Element&& key, RecordSlab* slab = nullptr);
   // A String element reading the zero-terminated `text` in place, without a copy. The
-  // text must stay unchanged and alive as long as the element (see above).
+  // text must stay unchanged and alive as long as the element (see above). Addresses
+  // fit the word's 61 bits on every system the module runs on.
   static Element borrowed(const char* text) {
     Element e;
     e.word_ = (static_cast<uint64_t>(reinterpret_cast<uintptr_t>(text)) << 2) | kBorrowedTag;
     return e;
   }
-  // The same with the key element already made (keyless; a borrowed text, say).
-  static Element keyedWith(const ElementValue& value, Element&& key, RecordSlab* slab = nullptr);
+  // The same with a None key: as keyed(view, None) would make it.
+  static Element borrowedWithNoneKey(const char* text) {
+    Element e = borrowed(text);
+    e.word_ |= kBorrowedNoneKey;
+    return e;
+  }
   // keyed(value, None): a Value or None stays one word.
   static Element noneKeyed(const ElementValue& value, RecordSlab* slab = nullptr) {
     Element e;
@@ -168,12 +175,6 @@ class Element {
   }
   // True when a key set to `key` would be None (the element still has a key then).
   static bool isNoneKey(const ElementValue& key);
-  // The same with a None key: as keyed(view, None) would make it.
-  static Element borrowedWithNoneKey(const char* text) {
-    Element e = borrowed(text);
-    e.word_ |= kBorrowedNoneKey;
-    return e;
-  }
 
   // assign(ElementValue::ofValue(number)) without the detour.
   void assignValue(int32_t number) {
