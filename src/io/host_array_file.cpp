@@ -29,18 +29,35 @@ int32_t atLeastOne(int32_t size) {
   return size == 0 ? 1 : size;
 }
 
-// A text cell as written: its length field and, when that is above 0, its bytes.
-struct CellText {
-  int32_t length = 0;
-  const char* bytes = nullptr;
-};
+// Writes one cell: its length field, then its text. A number's decimal text is
+// written straight into the output.
+void writeCell(BufferedWriter& out, const ElementArray& array, int32_t k, NumberText& scratch) {
+  constexpr std::size_t kNumberRoom = 4 + sizeof scratch.text;
+  const Element* e = array.inRange(k) ? &array.at(k) : nullptr;
+  if (e != nullptr && e->type() == ElementType::Value) {
+    if (char* p = out.room(kNumberRoom)) {
+      const int length = writeDecimal(e->number(), p + 4);
+      BufferedWriter::putLE32(p, static_cast<uint32_t>(length));
+      out.commit(4 + static_cast<std::size_t>(length));
+      return;
+    }
+  }
+  const char* text = e != nullptr ? e->asString(scratch) : "";
+  const std::size_t length = std::strlen(text);
+  if (char* p = out.room(4 + length)) {
+    p = BufferedWriter::putLE32(p, static_cast<uint32_t>(length));
+    std::memcpy(p, text, length);
+    out.commit(4 + length);
+    return;
+  }
+  out.i32(static_cast<int32_t>(length));
+  out.bytes(text, length);
+}
 
-// Writes the header, the sizes (0 written and counted as 1) and every cell; textOf(k)
-// gives cell k (length 0 for a cell past the elements). Nothing when X x Y x Z is past
-// ElementArray::kMaxSize.
-template <class TextOf>
-void writeHostFile(const char* path, uint16_t mode, int32_t x, int32_t y, int32_t z,
-                   TextOf&& textOf) {
+// Writes the header, the sizes (0 written and counted as 1) and every cell (an empty
+// text past the elements). Nothing when X x Y x Z is past ElementArray::kMaxSize.
+void writeHostFile(const char* path, uint16_t mode, const ElementArray& array, int32_t x, int32_t y,
+                   int32_t z) {
   x = atLeastOne(x);
   y = atLeastOne(y);
   z = atLeastOne(z);
@@ -58,21 +75,11 @@ void writeHostFile(const char* path, uint16_t mode, int32_t x, int32_t y, int32_
   out.i32(y);
   out.i32(z);
   out.i32(kTextCells);
+  NumberText scratch;
   for (int32_t k3 = 0; k3 < z; ++k3) {
     for (int32_t k2 = 0; k2 < y; ++k2) {
       const int32_t row = mulWrap(addWrap(mulWrap(y, k3), k2), x);
-      for (int32_t k1 = 0; k1 < x; ++k1) {
-        const CellText cell = textOf(addWrap(row, k1));
-        const std::size_t length = cell.length > 0 ? static_cast<std::size_t>(cell.length) : 0;
-        if (char* p = out.room(4 + length)) {
-          p = BufferedWriter::putLE32(p, static_cast<uint32_t>(cell.length));
-          if (length > 0) std::memcpy(p, cell.bytes, length);
-          out.commit(4 + length);
-          continue;
-        }
-        out.i32(cell.length);
-        if (length > 0) out.bytes(cell.bytes, length);
-      }
+      for (int32_t k1 = 0; k1 < x; ++k1) writeCell(out, array, addWrap(row, k1), scratch);
     }
   }
   file.finish(out.complete());
@@ -174,15 +181,7 @@ void saveHostArrayFile(ElementArray& array, const char* path, uint16_t mode) {
     const int32_t x = array.boundary(1);
     const int32_t y = array.boundary(2);
     const int32_t z = addWrap(divTrunc(array.size(), mulWrap(atLeastOne(x), atLeastOne(y))), 1);
-    NumberText scratch;
-    writeHostFile(path, mode, x, y, z, [&](int32_t k) -> CellText {
-      if (!array.inRange(k)) return {};
-      const Element& e = array.at(k);
-      if (e.type() == ElementType::Value)
-        return {writeDecimal(e.number(), scratch.text), scratch.text};
-      const char* text = e.asString(scratch);
-      return {static_cast<int32_t>(std::strlen(text)), text};
-    });
+    writeHostFile(path, mode, array, x, y, z);
   } catch (const std::bad_alloc&) {
   }
 }
