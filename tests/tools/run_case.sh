@@ -1,8 +1,9 @@
 #!/usr/bin/env bash
 # Runs one case of the quorrel command in a fresh directory and compares its output
 # with the golden files beside it.
-#   NAME.qs: `quorrel run NAME.qs`; stdout against NAME.out, stderr against NAME.err
-#            (no NAME.err: nothing on stderr, exit status 0; else exit status 2).
+#   NAME.qs: `quorrel run --echo NAME.qs`, which prints each E line beside its result;
+#            stdout against NAME.out, stderr against NAME.err (no NAME.err: nothing
+#            on stderr, exit status 0; else exit status 2).
 #   NAME.sh: run with $QUORREL set; stdout and stderr together against NAME.out,
 #            exit status 0 (the session prints the statuses it wants to check).
 # $QUORREL_EXAMPLES names the examples folder.
@@ -25,7 +26,7 @@ compare() {  # golden actual label
 }
 
 if [[ $name == *.qs ]]; then
-  "$quorrel" run "$name" >stdout.txt 2>stderr.txt
+  "$quorrel" run --echo "$name" >stdout.txt 2>stderr.txt
   status=$?
   expected_status=0
   err_golden=/dev/null
