@@ -13,103 +13,12 @@ using States = std::vector<uint8_t>;
 constexpr uint8_t S = RowSelected;
 constexpr uint8_t U = RowUnselected;
 
-// An array of `dims` dimensions with boundary entries 0 and 1 set (where positive)
-// holding one single-character text per character of `chars`.
-ElementArray shaped(int32_t dims, int32_t entry0, int32_t columns, const char* chars = "") {
+// An empty two-dimensional table of three columns.
+ElementArray threeColumns() {
   ElementArray a;
-  a.setDimensions(dims);
-  a.setBoundary(0, entry0);
-  a.setBoundary(1, columns);
-  for (; *chars != '\0'; ++chars) a.appendString(std::string(1, *chars).c_str());
+  a.setDimensions(2);
+  a.setBoundary(1, 3);
   return a;
-}
-
-// Counts outside 1..3 are stored but give no coordinates; a 2D array whose X boundary
-// was never set divides by 0, and the answer is 0.
-TEST(Dimensions, CoordinatesOfAnIndex) {
-  ElementArray a = shaped(2, 0, 10);
-  const int32_t cases[][3] = {{1, 23, 3},   {2, 23, 2}, {1, -1, -1}, {2, -1, 0}, {2, -23, -2},
-                              {1, -23, -3}, {0, 23, 0}, {-1, 23, 0}, {3, 23, 0}};
-  for (auto [dim, index, expected] : cases) {
-    EXPECT_EQ(a.dimIndexOfIndex(dim, index), expected) << dim << " " << index;
-  }
-  // 3 * 10^8 * 10 + 1 wraps past 2^32.
-  EXPECT_EQ(a.indexOfXY(1, 300000000), -1294967295);
-  a.setDimensions(-3);
-  EXPECT_EQ(a.dimensions(), -3);
-  EXPECT_EQ(a.dimIndexOfIndex(1, 7), 0);
-  a.setDimensions(0);
-  EXPECT_EQ(a.boundary(0), 0);
-
-  ElementArray cube = shaped(3, 0, 4);
-  cube.setBoundary(2, 3);
-  for (int32_t dim = 1; dim <= 3; ++dim) EXPECT_EQ(cube.dimIndexOfIndex(dim, 17), 1);
-
-  ElementArray unset = shaped(2, 0, 0);
-  EXPECT_EQ(unset.dimIndexOfIndex(1, 5), 0);
-  EXPECT_EQ(unset.dimIndexOfIndex(2, 5), 0);
-  EXPECT_EQ(unset.indexOfXY(5, 3), 5);
-}
-
-TEST(Dimensions, IndexOfCoordinateListSplitsAtEveryDelimiterCharacter) {
-  ElementArray a = shaped(2, 0, 10);
-  EXPECT_EQ(a.indexOfDimIndex(nullptr), 0);
-  const struct {
-    const char* delimiter;
-    const char* list;
-    int32_t index;
-  } cases[] = {// clang-format off
-      {",", "3,2", 23}, {",", ",,3,,,2,,", 23}, {",", " 3, -2", -17}, {",", "x,2", 20},
-      {",", "", 0},     {",", ",,,", 0},        {";", "3;2", 23},     {";", "3,2", 3},
-      // A set of characters, not a word; digits can separate too; with no delimiter
-      // the whole text is one token.
-      {"ab", "3a2", 23}, {"ab", "3b2", 23}, {"ab", "3ba2", 23}, {"0", "305", 53},
-      {"", "3,2", 3},    {"", "", 0}};
-  // clang-format on
-  for (const auto& c : cases) {
-    a.setListDelimiter(c.delimiter);
-    EXPECT_EQ(a.indexOfDimIndex(c.list), c.index) << "«" << c.list << "» by «" << c.delimiter;
-  }
-  // Coordinates are not limited to their boundaries.
-  EXPECT_EQ(shaped(2, 0, 3).indexOfDimIndex("5,2"), 11);
-
-  // Tokens past the last dimension use the entries stored above it.
-  ElementArray c = shaped(3, 0, 10);
-  c.setBoundary(2, 4);
-  c.setDimensions(2);
-  EXPECT_EQ(c.boundary(2), 0);
-  EXPECT_EQ(c.indexOfDimIndex("1,2,3"), 141);
-  c.setDimensions(1);
-  EXPECT_EQ(c.indexOfDimIndex("1,2,3"), 141);
-}
-
-// Complete blocks keep their coordinates; data filling at most one old block, a table
-// without an X boundary (blocks of 0) and refused resizes move nothing. Entry 0 starts
-// at -1: growing it to 1 adds 1 - (-1) = 2 empty elements after each element; shrinking
-// it by one block (one element) deletes at index 0 once per element, so all go; by more
-// than one it would delete at negative indexes, so nothing moves.
-TEST(Dimensions, ResizeOfColumnsAndOfEntryZero) {
-  const struct {
-    int32_t dims, entry0, columns;
-    const char* chars;
-    int32_t dim, boundary;
-    const char* after;
-    int32_t boundaryAfter;
-  } cases[] = {// clang-format off
-      {2, 0, 3, "klmnopqr", 1, 5, "k|l|m|~|~|n|o|p|~|~|q|r", 5},
-      {2, 0, 3, "klmnopqr", 1, 1, "k|n|q|r", 1},
-      {2, 0, 3, "abc", 1, 5, "a|b|c", 5},    {2, 0, 0, "abcd", 1, 3, "a|b|c|d", 3},
-      {2, 0, 2, "abcd", 1, 0, "a|b|c|d", 2}, {2, 0, 2, "abcd", -1, 3, "a|b|c|d", 2},
-      {2, 0, 2, "abcd", 2, 3, "a|b|c|d", 2},
-      {1, 0, 0, "abc", 0, 1, "a|~|~|b|~|~|c|~|~", 1}, {1, 2, 0, "abc", 0, 1, "", 1},
-      {1, 5, 0, "abc", 0, 2, "a|b|c", 2}};
-  // clang-format on
-  for (const auto& c : cases) {
-    ElementArray a = shaped(c.dims, c.entry0, c.columns, c.chars);
-    a.resizeBoundary(c.dim, c.boundary);
-    EXPECT_EQ(contents(a), c.after) << c.chars << " " << c.dim << " to " << c.boundary;
-    EXPECT_EQ(a.boundary(c.dim == 0 ? 0 : 1), c.boundaryAfter);
-  }
 }
 
 // The resize written out step by step with single inserts and deletes.
@@ -171,7 +80,8 @@ TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
 // States belong to positions, not rows: edits that change the row count drop or add
 // positions at the end, new ones from the automatic selection; key setters change none.
 TEST(RowStates, StatesBelongToPositionsNotRows) {
-  ElementArray a = shaped(2, 0, 3);
+  ElementArray a = threeColumns();
+  EXPECT_EQ(a.indexOfDimIndex(nullptr), 0);  // no list at all reads as index 0
   a.setAutoSelect(1);
   for (int i = 1; i <= 6; ++i) a.appendValue(i);
   a.rowStates = {U, S};
@@ -203,7 +113,7 @@ TEST(RowStates, StatesBelongToPositionsNotRows) {
 // Whatever happens, there is exactly one state per table row.
 TEST(RowStates, AlwaysOnePerTableRow) {
   std::mt19937 random(7);
-  ElementArray a = shaped(2, 0, 3);
+  ElementArray a = threeColumns();
   for (int step = 0; step < 3000; ++step) {
     const int32_t pick = static_cast<int32_t>(random() % 100);
     const int32_t index = static_cast<int32_t>(random() % 40) - 2;
