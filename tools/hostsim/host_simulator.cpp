@@ -373,8 +373,12 @@ abi::HostWord Instance::callExpressionRaw(int32_t code, std::vector<Argument> ar
 }
 
 ExpressionResult Instance::callExpression(int32_t code, const std::vector<Argument>& args) {
-  setFlags(flags() & ~abi::kResultIsString);
-  const abi::HostWord answer = callExpressionRaw(code, args);
+  // A token the module has no reason to invent, so that one it does not pass on shows.
+  constexpr abi::HostWord kToken = 0x5EED;
+  const uint16_t before = flags() & ~abi::kResultIsString;
+  setFlags(before);
+  const abi::HostWord answer = callExpressionRaw(code, args, kToken);
+  checkExpression(code, answer, before, kToken);
   ExpressionResult result;
   if (flags() & abi::kResultIsString) {
     result.isText = true;
@@ -383,6 +387,47 @@ ExpressionResult Instance::callExpression(int32_t code, const std::vector<Argume
     result.number = static_cast<int32_t>(answer);
   }
   return result;
+}
+
+void Instance::checkExpression(int32_t code, abi::HostWord answer, uint16_t flagsBefore,
+                               abi::HostWord token) const {
+  const auto broken = [code](const std::string& what) {
+    return ContractError("expression " + std::to_string(code) + " " + what);
+  };
+  const Signature declared = module_.expressionSignature(code);
+  if (fetches.size() != static_cast<size_t>(declared.paramCount)) {
+    throw broken("fetched " + std::to_string(fetches.size()) + " parameters and declares " +
+                 std::to_string(declared.paramCount));
+  }
+  for (size_t i = 0; i < fetches.size(); ++i) {
+    const bool text = declared.paramTypes[i] == abi::kExpressionParamText;
+    if (fetches[i].first != (i == 0) || fetches[i].token != token ||
+        fetches[i].typeFlag != (text ? abi::kFetchText : abi::kFetchInteger)) {
+      throw broken("fetched parameter " + std::to_string(i + 1) +
+                   " out of order, as the wrong type or without the host's token");
+    }
+  }
+  const uint16_t after = flags();
+  const bool wasText = (flagsBefore & abi::kResultIsString) != 0;
+  const bool isText = (after & abi::kResultIsString) != 0;
+  if ((after | abi::kResultIsString) != (flagsBefore | abi::kResultIsString) ||
+      (wasText && !isText)) {
+    throw broken("changed a host flag other than setting the string bit");
+  }
+  if (results_.empty() && (wasText || !isText)) return;  // a number
+  if (!isText) throw broken("asked for a text buffer and answered a number");
+  if (results_.size() != 1) {
+    throw broken("answered a text with " + std::to_string(results_.size()) + " buffers");
+  }
+  const std::vector<char>& buffer = results_.front();
+  const auto [size, reserved] = allocations.front();
+  const auto length =
+      static_cast<size_t>(std::find(buffer.begin(), buffer.end(), '\0') - buffer.begin());
+  if (answer != reinterpret_cast<abi::HostWord>(buffer.data()) || reserved != 0 ||
+      length + 1 != static_cast<size_t>(size)) {
+    throw broken("did not answer its text in one buffer of the text's size (" +
+                 std::to_string(size) + " bytes for " + std::to_string(length) + ")");
+  }
 }
 
 // ---------------------------------------------------------------------------------

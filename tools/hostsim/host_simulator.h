@@ -22,6 +22,11 @@ namespace quorrel::hostsim {
 struct ModuleError : std::runtime_error {
   using std::runtime_error::runtime_error;
 };
+// An expression broke a rule of the host interface, so that a real host would misread
+// its parameters or its answer.
+struct ContractError : ModuleError {
+  using ModuleError::ModuleError;
+};
 
 // What the script needs to know of one action or expression.
 struct Signature {
@@ -140,7 +145,14 @@ class Instance {
   abi::HostWord callExpressionRaw(int32_t code, std::vector<Argument> args,
                                   abi::HostWord token = 0);
   // The answer read as the host reads it: a text when the routine set the string flag.
+  // Checked as checkExpression says.
   ExpressionResult callExpression(int32_t code, const std::vector<Argument>& args);
+  // Throws ContractError unless the last expression kept the host's rules: it fetched
+  // exactly its declared parameters, in order, of their types, with the host's token;
+  // it changed no host flag but the string bit, and that only from clear to set; and a
+  // text answer is the one buffer it asked for, of exactly its text's size.
+  void checkExpression(int32_t code, abi::HostWord answer, uint16_t flagsBefore,
+                       abi::HostWord token) const;
 
   // The services' calls during the last expression: fetches, and the byte count and
   // reserved word of each result buffer asked for, and the buffers handed out.

@@ -32,3 +32,33 @@ new delimiter=""
 E 51
 new delimiter="ab"
 E 38 "3a2"
+# Counts other than 2 and 3 make a one-dimensional array, whatever the boundaries say.
+new dims=0 y=6
+E 26
+E 28
+E 29
+new dims=4
+E 26
+new dims=-1
+E 26
+new dims=1
+E 26
+# The last dimension has no boundary.
+new x=6 y=9
+E 28
+E 29
+new dims=3 x=4 y=5
+E 27 2
+new dims=3 x=-2 y=0
+E 28
+E 29
+# Any nonzero mode turns it on.
+new wildcard=-3
+A 8 "Abc"
+E 12 "a*" 0
+new
+A 8 "Abc"
+E 12 "a*" 0
+new case=7
+A 8 "Abc"
+E 12 "Abc" 0
