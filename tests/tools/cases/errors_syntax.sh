@@ -15,6 +15,8 @@ bad 'A 9 -2147483649'
 bad 'A 9 1e3'
 bad 'A 9 --1'
 bad 'A 9 +'
+bad 'A 9 99999999999999999999999'
+bad 'A 9 0x10'
 bad 'A 8 "abc'
 bad 'A 8 "abc\"'
 bad 'A 8 "a\qb"'
@@ -31,3 +33,9 @@ bad 'new y=4z'
 bad 'new delimiter=;'
 bad 'new delimiter="a' 
 bad "new delimiter=\"$(printf '%01024d' 0)\""
+printf 'A 8 "a\0b"\n' >bad.qs; "$QUORREL" run bad.qs; echo "status $?"
+# Integers span exactly int32 with an optional sign and leading zeros; strings take
+# every escape; tabs separate tokens and a line may end in CR LF.
+printf '%s\r\n' 'A 9 -2147483648' 'A 9 +2147483647' $'A 9\t007' 'A 9 -0' \
+  'A 8 "a\\b\"c\n\r\t"' 'A 8 "\x41\xfF\x01"' 'A 8 ""' 'A +06 "x" 0' 'E list$( "|"' >good.qs
+"$QUORREL" run --echo good.qs; echo "status $?"
