@@ -2,7 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <array>
 #include <climits>
 
 namespace quorrel {
@@ -36,34 +35,6 @@ TEST(Lists, FileBytesNoneKeysAndDelimiters) {
   EXPECT_EQ(elementList(empty, ","), "");
   EXPECT_EQ(quotedKeyList(empty, ","), "");
   EXPECT_EQ(pairList(empty, "=", ";"), "");
-}
-
-// Max, min, sum and average of an array.
-std::array<int32_t, 4> totals(const ElementArray& array) {
-  return {maxValue(array), minValue(array), sumValue(array), averageValue(array)};
-}
-using Totals = std::array<int32_t, 4>;
-
-// Sums wrap and the average divides the wrapped sum, truncating; None and File elements
-// count as 0 and texts by their leading number.
-TEST(Totals, MixedTypesWrapAndTruncation) {
-  ElementArray wrap;
-  wrap.appendValue(INT32_MAX);
-  wrap.appendValue(1);
-  EXPECT_EQ(totals(wrap), (Totals{INT32_MAX, 1, INT32_MIN, INT32_MIN / 2}));
-  wrap.appendValue(INT32_MAX);
-  wrap.appendString("2147483647");
-  EXPECT_EQ(sumValue(wrap), 2147483646);  // -2^31 + 2*(2^31-1) wraps to 2^31-2
-
-  ElementArray zeros;
-  zeros.appendValue(-4);
-  zeros.appendValue(0);
-  zeros.appendFile({kFileBytes, 3});
-  zeros.appendString("12abc");
-  EXPECT_EQ(totals(zeros), (Totals{12, -4, 8, 2}));
-  zeros.setString("-9", 3);
-  EXPECT_EQ(totals(zeros), (Totals{0, -9, -13, -3}));  // -13 / 4 truncates to -3
-  EXPECT_EQ(totals(ElementArray{}), (Totals{0, 0, 0, 0}));
 }
 
 }  // namespace

@@ -10,47 +10,6 @@
 namespace quorrel {
 namespace {
 
-ElementValue keyText(const char* text) {
-  return ElementValue::ofText(text);
-}
-
-// The search script case covers folding, case modes, value and text probes against
-// string and value keys, and pattern keys; these pin unkeyed elements, None keys and
-// repeated keys, and the answers when nothing is found.
-TEST(KeyLookup, ZeroKeysEqualKeysAndMisses) {
-  ElementArray array = arrayOf({"a", "b", "c", "d"});
-  array.setKeyValue(0, 2);
-  array.setKeyString("7k", 1);
-  array.setKeyString("7k", 3);
-  EXPECT_EQ(indexOfKey(array, ElementValue::ofValue(0)), 2);  // element 0 has no key
-  EXPECT_EQ(indexOfKey(array, keyText("0")), -1);
-  EXPECT_EQ(indexOfKey(array, keyText("")), 2);
-  EXPECT_EQ(indexOfKey(array, keyText("7K")), 1);
-  EXPECT_EQ(indexOfKey(array, ElementValue::ofValue(7)), 1);
-  EXPECT_EQ(stringWithKey(array, keyText("")), std::string("c"));
-  EXPECT_EQ(stringWithKey(array, keyText("x")), nullptr);
-  EXPECT_EQ(valueWithKey(array, keyText("x")), 0);
-  EXPECT_EQ(indexOfKey(ElementArray{}, keyText("")), -1);
-}
-
-// Elements are found by their text or leading number; file bytes have no numeric value
-// and a missing probe finds nothing.
-TEST(Find, ValuesOfEveryTypeAndMissingProbes) {
-  ElementArray array = arrayOf({"", "  -7 apples", "#9"});
-  array.appendFile({"42", 2});
-  EXPECT_EQ(findValue(array, 0), 0);
-  EXPECT_EQ(findValue(array, -7), 1);
-  EXPECT_EQ(findValue(array, 9, -1), 2);
-  EXPECT_EQ(findValue(array, 42), -1);
-  EXPECT_EQ(findValue(ElementArray{}, 0), -1);
-  array.searchMode = SearchWildcard;
-  EXPECT_EQ(findString(array, nullptr), -1);
-  EXPECT_EQ(findString(array, "*"), 0);
-  array.setValue(-512, 0);
-  EXPECT_EQ(findContainingValue(array, -5), 0);
-  EXPECT_EQ(findContainingString(array, "-5120"), -1);
-}
-
 TEST(FindContaining, LongTextsAtEveryPlacement) {
   // Folded probes at the start, middle and end of long texts, and just short of them.
   for (std::size_t length : {63u, 64u, 511u, 512u, 513u, 1100u}) {

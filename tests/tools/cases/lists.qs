@@ -65,3 +65,37 @@ A 9 2147483647
 A 9 1
 E 24
 E 22
+# Totals: sums wrap and the average divides the wrapped sum, truncating toward zero.
+new dims=1
+A 9 2147483647
+A 9 1
+E 22
+E 23
+E 24
+E 25
+A 9 2147483647
+A 8 "2147483647"
+E 24
+# None and file bytes count as 0, texts by their leading number.
+new dims=1
+A 8 "fg"
+A 18 0 "fg.bin"
+A 17
+A 9 -4
+A 9 0
+A 54 "fg.bin"
+A 8 "12abc"
+E 22
+E 23
+E 24
+E 25
+A 13 "-9" 3
+E 22
+E 23
+E 24
+E 25
+new dims=1
+E 22
+E 23
+E 24
+E 25

@@ -48,3 +48,40 @@ E 14 "p?i" 0
 E 12 "*" 0
 A 55
 E 12 "b*" 0
+# Element 0 has no key, element 2 a None key (set to 0), elements 1 and 3 the same key.
+new dims=1
+A 8 "a"
+A 8 "b"
+A 8 "c"
+A 8 "d"
+A 21 0 2
+A 20 "7k" 1
+A 20 "7k" 3
+E 7 0
+E 6 "0"
+E 6 ""
+E 6 "7K"
+E 7 7
+E 8 ""
+E 8 "x"
+E 10 "x"
+# Elements are found by their text or leading number; file bytes have no number.
+new dims=1
+E 6 ""
+E 13 0 0
+A 8 "42"
+A 18 0 "f42"
+A 17
+A 8 ""
+A 8 "  -7 apples"
+A 9 9
+A 54 "f42"
+E 13 0 0
+E 13 -7 0
+E 13 9 -1
+E 13 42 0
+A 56
+E 12 "*" 0
+A 14 -512 0
+E 15 -5 0
+E 14 "-5120" 0
