@@ -10,47 +10,6 @@
 namespace quorrel {
 namespace {
 
-// Ties end in the order the first-row-pivot partition steps give them (worked by hand).
-TEST(RowSort, TiesEndInThePartitionOrder) {
-  ElementArray a = makeTable(2, {"2,A", "1,B", "2,C", "1,D"});
-  sortRows(a, 0, SortByValue, false);
-  EXPECT_EQ(columnTexts(a, 1), (Texts{"B", "D", "C", "A"}));
-
-  ElementArray t = makeTable(1, {"b", "A", "a"});
-  sortRows(t, 0, SortByText, false);
-  EXPECT_EQ(columnTexts(t, 0), (Texts{"A", "a", "b"}));
-  t.caseMode = 1;
-  sortRows(t, 0, SortByText, false);
-  EXPECT_EQ(columnTexts(t, 0), (Texts{"A", "a", "b"}));
-
-  // Three equal keys already in order: the run is reversed end to end.
-  ElementArray e = makeTable(2, {"5,p", "5,q", "5,r", "6,s"});
-  sortRows(e, 0, SortByValue, false);
-  EXPECT_EQ(columnTexts(e, 1), (Texts{"r", "q", "p", "s"}));
-}
-
-// The row sort script case pins sorts by column and label with keys travelling; these
-// pin which rows take part.
-TEST(RowSort, StatesStayAndOnlyTheVisibleCountIsSorted) {
-  // Two visible rows: table rows 0 and 1 are sorted, whichever rows are selected.
-  ElementArray b = makeTable(1, {"4", "3", "2", "1"});
-  b.rowStates = {U, U, S, S};
-  sortRows(b, 0, SortByValue, false);
-  EXPECT_EQ(columnTexts(b, 0), (Texts{"3", "4", "2", "1"}));
-  EXPECT_EQ(b.rowStates, (States{U, U, S, S}));
-
-  // Columns outside the table, and a one-dimensional array, change nothing.
-  ElementArray c = makeTable(2, {"b,2", "a,1"});
-  sortRows(c, 2, SortByText, false);
-  sortRows(c, -1, SortByText, false);
-  EXPECT_EQ(columnTexts(c, 0), (Texts{"b", "a"}));
-  ElementArray flat;
-  flat.appendValue(2);
-  flat.appendValue(1);
-  sortRows(flat, 0, SortByValue, false);
-  EXPECT_EQ(flat.getValue(0), 2);
-}
-
 TEST(RowSort, CompareCellAgainstAPivotText) {
   ElementArray a = makeTable(2, {"abc,12x"});
   EXPECT_EQ(compareCell(a, 0, 1, "12", SortByValue), 0);

@@ -99,3 +99,43 @@ E 22
 E 23
 E 24
 E 25
+# Element sorts: ties, None, leading numbers and '_' against both cases.
+new dims=1
+A 8 "b"
+A 8 "A"
+A 8 "a"
+A 51
+A 23
+E 16 ","
+# 9, 10, "10" by text: pivot 10 (slot 1); 9 swaps with "10", then the left part
+# ["10", 10] is already in place. Keys 1, 2, 3 show which 10 is which.
+new dims=1
+A 9 9
+A 9 10
+A 8 "10"
+A 21 1 0
+A 21 2 1
+A 21 3 2
+A 22
+E 16 ","
+E 18 ","
+# None (a stored 0) sorts as 0 by value and as "" by text.
+new dims=1
+A 8 "12"
+A 8 "5x"
+A 9 0
+A 9 -1
+A 24
+E 16 ","
+A 22
+E 16 ","
+# '_' sorts before letters when folded, between the cases when not.
+new dims=1
+A 8 "a"
+A 8 "_"
+A 8 "B"
+A 22
+E 16 ","
+A 51
+A 22
+E 16 ","
