@@ -57,28 +57,6 @@ TEST(Element, StoredTypesAndTheirReadings) {
   EXPECT_STREQ(out, "-2147483648");
 }
 
-TEST(Element, TextReadsAsNumberLikeAtol) {
-  const struct {
-    const char* text;
-    int32_t value;
-  } cases[] = {// clang-format off
-      {"0042", 42}, {"  9 apples", 9}, {"-", 0}, {" -7", -7}, {"12abc", 12}, {"abc", 0},
-      {"+5", 5}, {"\t\n\v\f\r8", 8}, {"+-3", 0}, {"- 3", 0}, {"3 4", 3},
-      {"\xa0" "5", 0},  // not white space in the C locale
-      {"2147483647", INT32_MAX}, {"2147483648", INT32_MAX}, {"99999999999999999999999", INT32_MAX},
-      {"-2147483648", INT32_MIN}, {"-2147483649", INT32_MIN},
-      {"-99999999999999999999999", INT32_MIN}, {"000000000000000000000000012", 12}};
-  // clang-format on
-  for (const auto& c : cases) {
-    Element e;
-    e.assign(ElementValue::ofText(c.text));
-    EXPECT_EQ(e.asValue(), c.value) << "text «" << c.text << "»";
-    EXPECT_EQ(readDecimal(std::string_view(c.text)), c.value) << "text «" << c.text << "»";
-  }
-  // A token cut out of a longer text reads only its own characters.
-  EXPECT_EQ(readDecimal(std::string_view("123456", 3)), 123);
-}
-
 // A key takes a whole text whatever size the operand claims, and a Value key is 4 bytes;
 // changes of value keep the key, and moving an element moves its key.
 TEST(Element, KeysFollowTheValueRulesAndSurviveNewValues) {

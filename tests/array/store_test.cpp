@@ -96,37 +96,13 @@ TEST(Capacity, ShrinksWithHysteresis) {
   EXPECT_EQ(keyed.capacity(), 414);
 }
 
-// Reads outside give nothing; sets and inserts past the end fill with None; a 0 or a
-// missing text stores None; negative and unreachable indexes change nothing.
-TEST(Store, EdgesOfTheArray) {
-  ElementArray a;
-  EXPECT_EQ(a.getString(0), nullptr);
-  EXPECT_EQ(a.getKeyString(0), nullptr);
-  ByteBlock block{"untouched", 9};
-  EXPECT_FALSE(a.getBytes(block, 0));
-  EXPECT_STREQ(block.bytes, "untouched");
-  a.setString("a", 5);
-  EXPECT_EQ(contents(a), "~|~|~|~|~|a");
-  EXPECT_STREQ(a.getString(2), "");
-  EXPECT_EQ(a.getValue(-1), 0);
-  a.setValue(0, 7);  // stores None, but still grows
-  a.setString(nullptr, 5);
-  a.setString("b", -1);
-  a.setString("b", INT32_MAX);
-  a.insertString("b", INT32_MAX);
-  EXPECT_EQ(contents(a), "~|~|~|~|~|~|~|~");
-
-  ElementArray b;
-  b.appendString("a");
-  b.insertValue(7, 2);
-  b.insertString("x", 6);
-  b.insertString("n", -1);
-  b.deleteAt(-1);
-  b.deleteAt(b.size());
-  EXPECT_EQ(contents(b), "a|~|#7|~|~|~|x");
-
-  // File bytes: empty or missing ones store None; a text reads with its terminator.
+// File bytes: empty or missing ones store None; a text reads with its terminator; a
+// read outside leaves the block alone.
+TEST(Store, FileBytesAndByteReads) {
   ElementArray f;
+  ByteBlock block{"untouched", 9};
+  EXPECT_FALSE(f.getBytes(block, 0));
+  EXPECT_STREQ(block.bytes, "untouched");
   f.appendFile({"x\0y", 3});
   f.appendFile({nullptr, 4});
   f.appendFile({"abc", 0});
@@ -138,17 +114,6 @@ TEST(Store, EdgesOfTheArray) {
   ASSERT_TRUE(f.getBytes(block, 3));
   EXPECT_EQ(block.length, 4);
   EXPECT_EQ(std::memcmp(block.bytes, "abc", 4), 0);
-
-  // Clear keeps the settings; elements set again start keyless.
-  f.setDimensions(2);
-  f.setBoundary(1, 4);
-  f.setListDelimiter(";:");
-  f.setKeyValue(3, 1);
-  f.clear();
-  EXPECT_EQ(f.boundary(1), 4);
-  EXPECT_STREQ(f.listDelimiter(), ";:");
-  f.setString("x", 1);
-  EXPECT_EQ(f.getKeyString(1), nullptr);
 }
 
 // Each element's text form and key text ("-" for no key).
