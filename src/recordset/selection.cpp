@@ -65,18 +65,6 @@ CellText textOf(const Element& cell, NumberText& scratch) {
 
 }  // namespace
 
-void markRow(ElementArray& array, int32_t r) {
-  if (r < 0 || static_cast<std::size_t>(r) >= array.rowStates.size()) return;
-  if (array.selectionMode == SelectOr) array.rowStates[static_cast<std::size_t>(r)] = RowSelected;
-}
-
-void unmarkRow(ElementArray& array, int32_t r) {
-  if (r < 0 || static_cast<std::size_t>(r) >= array.rowStates.size()) return;
-  if (array.selectionMode == SelectAnd) {
-    array.rowStates[static_cast<std::size_t>(r)] = RowUnselected;
-  }
-}
-
 void clearSelection(ElementArray& array) {
   std::fill(array.rowStates.begin(), array.rowStates.end(), RowUnselected);
 }

@@ -16,11 +16,6 @@ namespace quorrel {
 
 enum SelectionMode : int32_t { SelectAnd = 0, SelectOr = 1 };
 
-// Selects table row r in OR mode; nothing in AND mode or outside the states.
-void markRow(ElementArray& array, int32_t r);
-// Unselects table row r in AND mode; nothing in OR mode or outside the states.
-void unmarkRow(ElementArray& array, int32_t r);
-
 void clearSelection(ElementArray& array);
 void selectAllRows(ElementArray& array);
 void invertSelection(ElementArray& array);
