@@ -228,7 +228,8 @@ static_assert(kWide || (kEditorWindow == 20 && kEditorHelpService == 272));
 static_assert(kWide ||
               (kInfoConditionCount == 12 && kInfoActionCount == 14 && kInfoExpressionCount == 16 &&
                kInfoSetupSize == 18 && kInfoHostWord1 == 20 && kInfoHostByte == 24 &&
-               kInfoHostWord2 == 26 && kInfoIdentifier == 28 && kInfoHostWord3 == 32));
+               kInfoHostWord2 == 26 && kInfoIdentifier == 28 && kInfoHostWord3 == 32 &&
+               kRunInfoWrittenSize == 34));
 static_assert(!kWide || (kInfoConditionCount == 24 && kInfoIdentifier == 40));
 static_assert(kRunBetweenColumn % 4 == 0 && kRunElementArray % kPointerSize == 0);
 static_assert(kFetchFirstParameter % kPointerSize == 0);
