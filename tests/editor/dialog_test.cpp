@@ -1,15 +1,8 @@
 // The setup dialog through CreateObject and EditObject, with the headless dialog
-// playing the author: what the dialog shows, how the dimension buttons enable the
-// fields, what OK writes, and that Cancel and Help write nothing.
+// playing the author: the scenarios shared with the Windows test, and what only the
+// headless services can tell (a disabled field refuses typing, a dialog nobody answers).
 #include <gtest/gtest.h>
 
-#include <array>
-#include <cstring>
-#include <functional>
-#include <string>
-#include <vector>
-
-#include "host/abi.h"
 #include "host/entry_points.h"
 #include "platform/headless_dialog.h"
 #include "support/setup_dialog.h"
@@ -17,185 +10,62 @@
 namespace quorrel::editor_test {
 namespace {
 
-namespace abi = quorrel::abi;
 using namespace quorrel::setup_dialog_test;
 
-// The editor context: the editor's window and the host's help service.
-struct HelpCall {
-  std::string path;
-  abi::HostWord first, second;
-};
-std::vector<HelpCall> helpCalls;
-void QUORREL_CALL recordHelp(const char* path, abi::HostWord first, abi::HostWord second) {
-  helpCalls.push_back({path, first, second});
-}
-struct Editor {
-  std::array<unsigned char, 1024> context{};
-  Editor() {
-    abi::HelpService help = recordHelp;
-    std::memcpy(context.data() + abi::kEditorHelpService, &help, sizeof help);
-    helpCalls.clear();
-  }
-  void* get() { return context.data(); }
-};
-
-// Plays the author in every dialog opened while it lives.
-class Author {
+class HeadlessDriver : public Driver {
  public:
-  explicit Author(std::function<void(HWND)> act) : act_(std::move(act)) {
-    QuorrelSetDialogScript(&Author::play, this);
+  int32_t create(Record& record, const Act& act) override {
+    EditorContext editor(*this);
+    return withAuthor(act, [&] { return CreateObject(editor.get(), 0, record.data()); });
   }
-  ~Author() { QuorrelSetDialogScript(nullptr, nullptr); }
+  int32_t edit(Record& record, const Act& act) override {
+    EditorContext editor(*this);
+    return withAuthor(act, [&] { return EditObject(editor.get(), 0, 0, record.data()); });
+  }
+  void click(HWND dialog, int id) override {
+    EXPECT_TRUE(QuorrelDialogClick(dialog, id)) << "click " << id;
+  }
+  void type(HWND dialog, int id, const std::string& text) override {
+    EXPECT_TRUE(QuorrelDialogType(dialog, id, text.c_str())) << "type into " << id;
+  }
+  void setText(HWND dialog, int id, const std::string& text) override {
+    SetDlgItemTextA(dialog, id, text.c_str());
+  }
+  void press(HWND dialog, int key) override { EXPECT_TRUE(QuorrelDialogKey(dialog, key)); }
+  bool isOpen(HWND dialog) override { return QuorrelDialogIsOpen(dialog); }
+  void check(bool ok, const std::string& what) override { EXPECT_TRUE(ok) << what; }
 
  private:
-  static void play(HWND dialog, void* self) { static_cast<Author*>(self)->act_(dialog); }
-  std::function<void(HWND)> act_;
+  // Plays `act` in every dialog opened during `call`.
+  template <typename Call>
+  static int32_t withAuthor(const Act& act, Call call) {
+    QuorrelSetDialogScript([](HWND dialog, void* a) { (*static_cast<const Act*>(a))(dialog); },
+                           const_cast<Act*>(&act));
+    const int32_t answer = call();
+    QuorrelSetDialogScript(nullptr, nullptr);
+    return answer;
+  }
 };
 
-// EditObject with an author acting in the dialog, and what it answers.
-void edit(Record& record, int32_t answer, std::function<void(HWND)> act) {
-  Editor editor;
-  Author author(std::move(act));
-  EXPECT_EQ(EditObject(editor.get(), 0, 0, record.data()), answer);
+TEST(SetupDialog, SharedScenarios) {
+  HeadlessDriver driver;
+  runAllScenarios(driver);
 }
 
-std::string fieldText(HWND dialog, int id) {
-  char text[2048];
-  GetDlgItemTextA(dialog, id, text, sizeof text);
-  return text;
-}
-
-TEST(SetupDialog, CreateObjectFillsDefaultsAndShowsThem) {
-  Editor editor;
-  Record record;
-  record.fill(0x5A);
-  bool shown = false;
-  {
-    Author author([&](HWND dialog) {
-      shown = true;
-      EXPECT_EQ(state(dialog), "2D insensitive literal off | X");
-      EXPECT_EQ(fieldText(dialog, kX), "10");
-      EXPECT_EQ(fieldText(dialog, kY), "10");
-      EXPECT_EQ(fieldText(dialog, kDelimiter), ",");
-      EXPECT_TRUE(QuorrelDialogKey(dialog, VK_RETURN));  // Enter is OK
-    });
-    EXPECT_EQ(CreateObject(editor.get(), 0, record.data()), 0);
-  }
-  EXPECT_TRUE(shown);
-  int16_t size[2];
-  std::memcpy(size, record.data() + abi::kSetupObjectWidth, sizeof size);
-  EXPECT_EQ(size[0], 32);
-  EXPECT_EQ(size[1], 32);
-  EXPECT_EQ(fieldsOf(record), (Ints{2, 10, 10, 0, 0, 0}));
-  EXPECT_EQ(delimiterOf(record), ",");
-  for (std::size_t i = 0; i < abi::kSetupHostHeaderSize; ++i) EXPECT_EQ(record[i], 0x5A) << i;
-
-  // Cancelled, CreateObject keeps the defaults it filled in.
-  Record cancelled{};
-  Author author([](HWND dialog) {
-    QuorrelDialogClick(dialog, k3D);
-    QuorrelDialogType(dialog, kX, "77");
-    QuorrelDialogClick(dialog, kCancel);
-  });
-  EXPECT_EQ(CreateObject(editor.get(), 0, cancelled.data()), -1);
-  EXPECT_EQ(fieldsOf(cancelled), (Ints{2, 10, 10, 0, 0, 0}));
-  EXPECT_EQ(delimiterOf(cancelled), ",");
-}
-
-TEST(SetupDialog, DimensionButtonsEnableTheFields) {
-  Record record = storedRecord({2, 10, 10, 0, 0, 0});
-  edit(record, 0, [](HWND dialog) {
-    EXPECT_TRUE(QuorrelDialogClick(dialog, k3D));
-    EXPECT_EQ(state(dialog), "3D insensitive literal off | X Y");
-    EXPECT_TRUE(QuorrelDialogClick(dialog, k1D));
-    EXPECT_EQ(state(dialog), "1D insensitive literal off |");
-    EXPECT_FALSE(QuorrelDialogType(dialog, kX, "9"));  // disabled: takes nothing
-    EXPECT_TRUE(QuorrelDialogClick(dialog, k2D));
-    EXPECT_EQ(state(dialog), "2D insensitive literal off | X");
-    QuorrelDialogKey(dialog, VK_ESCAPE);
-  });
-}
-
-// The OK cases shared with the Windows dialog test (support/setup_dialog.h).
-TEST(SetupDialog, OkStoresWhatTheDialogShows) {
-  for (const OkCase& c : okCases()) {
-    Record record = storedRecord(c.stored);
-    edit(record, 1, [&](HWND dialog) {
-      if (c.shown != nullptr) {
-        EXPECT_EQ(state(dialog) + " " + fieldText(dialog, kX) + " " + fieldText(dialog, kY),
-                  c.shown);
-      }
-      for (auto [id, text] : c.steps) {
-        EXPECT_TRUE(text != nullptr ? QuorrelDialogType(dialog, id, text)
-                                    : QuorrelDialogClick(dialog, id));
-      }
-      QuorrelDialogClick(dialog, kOk);
-    });
-    EXPECT_EQ(fieldsOf(record), c.after) << ::testing::PrintToString(c.stored);
-  }
-}
-
-TEST(SetupDialog, DelimiterIsCutTo1023Characters) {
-  Record record = storedRecord({2, 10, 10, 0, 0, 1});
-  std::string typed(1100, 'd');
-  for (std::size_t i = 0; i < typed.size(); ++i) typed[i] = static_cast<char>('a' + i % 26);
-  edit(record, 1, [&](HWND dialog) {
-    EXPECT_EQ(fieldText(dialog, kDelimiter), ";");
-    QuorrelDialogType(dialog, kDelimiter, typed.c_str());
-    EXPECT_EQ(fieldText(dialog, kDelimiter), typed);  // the field holds all
+TEST(SetupDialog, DisabledFieldsTakeNoTyping) {
+  HeadlessDriver driver;
+  Record record = storedRecord({1, 10, 10, 0, 0, 0});
+  driver.edit(record, [](HWND dialog) {
+    EXPECT_FALSE(QuorrelDialogType(dialog, kX, "9"));
+    EXPECT_FALSE(QuorrelDialogType(dialog, kY, "9"));
     QuorrelDialogClick(dialog, kOk);
   });
-  EXPECT_EQ(delimiterOf(record), typed.substr(0, 1023));
-  // The four bytes past the 1024 written keep what they held.
-  for (std::size_t i = abi::kSetupListDelimiter + 1024; i < abi::kSetupAutoSelectRows; ++i) {
-    EXPECT_EQ(record[i], 0xEE) << i;
-  }
-  EXPECT_EQ(readInt(record, abi::kSetupAutoSelectRows), 1);
-  edit(record, 1, [](HWND dialog) {  // an emptied delimiter is stored empty
-    QuorrelDialogType(dialog, kDelimiter, "");
-    QuorrelDialogClick(dialog, kOk);
-  });
-  EXPECT_EQ(delimiterOf(record), "");
-}
-
-TEST(SetupDialog, CancelEscapeAndHelpLeaveTheRecord) {
-  for (bool escape : {false, true}) {
-    Record record = storedRecord({2, 10, 10, 0, 0, 0});
-    const Record before = record;
-    edit(record, 0, [&](HWND dialog) {
-      QuorrelDialogClick(dialog, k3D);
-      QuorrelDialogType(dialog, kX, "1");
-      QuorrelDialogType(dialog, kY, "2");
-      QuorrelDialogType(dialog, kDelimiter, "|");
-      for (int id : {kCaseSensitive, kWildcard, kOn}) QuorrelDialogClick(dialog, id);
-      escape ? QuorrelDialogKey(dialog, VK_ESCAPE) : QuorrelDialogClick(dialog, kCancel);
-      EXPECT_FALSE(QuorrelDialogIsOpen(dialog));
-    });
-    EXPECT_EQ(record, before);
-  }
-
-  // Help, any number of times, calls the host's help service and keeps the dialog open.
-  Record record = storedRecord({2, 10, 10, 0, 0, 0});
-  const Record before = record;
-  edit(record, 0, [](HWND dialog) {
-    for (int i = 0; i < 3; ++i) {
-      EXPECT_TRUE(QuorrelDialogClick(dialog, kHelp));
-      EXPECT_TRUE(QuorrelDialogIsOpen(dialog));
-    }
-    EXPECT_EQ(state(dialog), "2D insensitive literal off | X");
-    QuorrelDialogClick(dialog, kCancel);
-  });
-  EXPECT_EQ(record, before);
-  ASSERT_EQ(helpCalls.size(), 3u);
-  for (const HelpCall& call : helpCalls) {
-    EXPECT_EQ(call.path, "Help\\Quorrel\\quorrel2.html");
-    EXPECT_EQ(call.first, 0);
-    EXPECT_EQ(call.second, 0);
-  }
+  EXPECT_EQ(fieldsOf(record), (Ints{1, 10, 10, 0, 0, 0}));
 }
 
 TEST(SetupDialog, AnUnansweredDialogIsCancelled) {
-  Editor editor;
+  HeadlessDriver driver;
+  EditorContext editor(driver);
   Record record = storedRecord({3, 1, 2, 0, 0, 0});
   const Record before = record;
   // No author: the dialog is left with Escape.

@@ -1,11 +1,14 @@
-// What the setup dialog's two tests share: the headless one on the portable dialog
-// services and the Windows one on the real dialog manager. Include it after the dialog
-// services' declarations (windows.h or platform/headless_dialog.h).
+// The setup dialog's scenarios, run by two tests: the headless one on the portable
+// dialog services and the Windows one on the real dialog manager. Each gives a Driver:
+// the author's hands in the dialog and a sink for the checks. Include it after the
+// dialog services' declarations (windows.h or platform/headless_dialog.h).
 #pragma once
 
+#include <algorithm>
 #include <array>
 #include <cstdint>
 #include <cstring>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -103,6 +106,191 @@ inline std::string state(HWND dialog) {
   if (IsWindowEnabled(GetDlgItem(dialog, kX))) out += " X";
   if (IsWindowEnabled(GetDlgItem(dialog, kY))) out += " Y";
   return out;
+}
+
+inline std::string fieldText(HWND dialog, int id) {
+  char text[2048] = {};
+  GetDlgItemTextA(dialog, id, text, sizeof text);
+  return text;
+}
+inline std::string show(const Ints& values) {
+  std::string out;
+  for (int32_t v : values) out += std::to_string(v) + " ";
+  return out;
+}
+
+class Driver {
+ public:
+  using Act = std::function<void(HWND)>;
+  virtual ~Driver() = default;
+  // CreateObject or EditObject on the record, with `act` playing the author in the
+  // dialog shown; answers what the entry point answers.
+  virtual int32_t create(Record& record, const Act& act) = 0;
+  virtual int32_t edit(Record& record, const Act& act) = 0;
+  virtual void click(HWND dialog, int id) = 0;
+  // Key by key, so that the field's own filters apply.
+  virtual void type(HWND dialog, int id, const std::string& text) = 0;
+  virtual void setText(HWND dialog, int id, const std::string& text) = 0;
+  virtual void press(HWND dialog, int key) = 0;
+  virtual bool isOpen(HWND dialog) = 0;
+  virtual void check(bool ok, const std::string& what) = 0;
+  // The pages the host's help service was asked for.
+  std::vector<std::string> helpCalls;
+
+  void checkEqual(const std::string& actual, const std::string& expected, const std::string& what) {
+    check(actual == expected, what + ": \"" + actual + "\", expected \"" + expected + "\"");
+  }
+  void checkFields(const Record& record, const Ints& expected, const std::string& what) {
+    check(fieldsOf(record) == expected,
+          what + ": fields " + show(fieldsOf(record)) + "expected " + show(expected));
+  }
+};
+
+// The host's help service in the editor context: records each page asked for in the
+// driver of the context made last.
+inline Driver* helpDriver = nullptr;
+inline void QUORREL_CALL recordHelp(const char* page, abi::HostWord first, abi::HostWord second) {
+  helpDriver->helpCalls.push_back(page +
+                                  std::string(first == 0 && second == 0 ? "" : " (arguments)"));
+}
+// An editor context without an owner window.
+struct EditorContext {
+  std::array<unsigned char, 2048> bytes{};
+  explicit EditorContext(Driver& driver) {
+    helpDriver = &driver;
+    const abi::HelpService help = recordHelp;
+    std::memcpy(bytes.data() + abi::kEditorHelpService, &help, sizeof help);
+  }
+  void* get() { return bytes.data(); }
+};
+
+// CreateObject fills the defaults and shows them; cancelled, it keeps them.
+inline void createObject(Driver& d) {
+  Record record;
+  record.fill(0x5A);
+  const int32_t answer = d.create(record, [&](HWND dialog) {
+    d.checkEqual(state(dialog), "2D insensitive literal off | X", "create: shown");
+    d.checkEqual(
+        fieldText(dialog, kX) + " " + fieldText(dialog, kY) + " " + fieldText(dialog, kDelimiter),
+        "10 10 ,", "create: X, Y, delimiter shown");
+    d.press(dialog, VK_RETURN);  // Enter is OK
+  });
+  d.check(answer == 0, "create: CreateObject answers 0 after OK");
+  int16_t size[2];
+  std::memcpy(size, record.data() + abi::kSetupObjectWidth, sizeof size);
+  d.check(size[0] == 32 && size[1] == 32, "create: object size 32x32");
+  d.checkFields(record, {2, 10, 10, 0, 0, 0}, "create");
+  d.checkEqual(delimiterOf(record), ",", "create: delimiter");
+  d.check(std::all_of(record.begin(), record.begin() + abi::kSetupHostHeaderSize,
+                      [](unsigned char b) { return b == 0x5A; }),
+          "create: the host's header bytes are kept");
+
+  Record cancelled{};
+  const int32_t cancelAnswer = d.create(cancelled, [&](HWND dialog) {
+    d.click(dialog, k3D);
+    d.type(dialog, kX, "77");
+    d.click(dialog, kCancel);
+  });
+  d.check(cancelAnswer == -1, "create cancelled: CreateObject answers -1");
+  d.checkFields(cancelled, {2, 10, 10, 0, 0, 0}, "create cancelled keeps the defaults");
+  d.checkEqual(delimiterOf(cancelled), ",", "create cancelled: delimiter");
+}
+
+inline void dimensionButtons(Driver& d) {
+  Record record = storedRecord({2, 10, 10, 0, 0, 0});
+  d.check(d.edit(record,
+                 [&](HWND dialog) {
+                   d.click(dialog, k3D);
+                   d.checkEqual(state(dialog), "3D insensitive literal off | X Y", "3D: X, Y");
+                   d.click(dialog, k1D);
+                   d.checkEqual(state(dialog), "1D insensitive literal off |", "1D: neither");
+                   d.click(dialog, k2D);
+                   d.checkEqual(state(dialog), "2D insensitive literal off | X", "2D: X");
+                   d.press(dialog, VK_ESCAPE);
+                 }) == 0,
+          "dimension buttons: EditObject answers 0 after Escape");
+}
+
+inline void okStoresWhatTheDialogShows(Driver& d) {
+  for (const OkCase& c : okCases()) {
+    const std::string what = "OK on " + show(c.stored);
+    Record record = storedRecord(c.stored);
+    const int32_t answer = d.edit(record, [&](HWND dialog) {
+      if (c.shown != nullptr) {
+        d.checkEqual(state(dialog) + " " + fieldText(dialog, kX) + " " + fieldText(dialog, kY),
+                     c.shown, what + ": shown");
+      }
+      for (const Step& step : c.steps) {
+        step.text != nullptr ? d.type(dialog, step.id, step.text) : d.click(dialog, step.id);
+      }
+      d.click(dialog, kOk);
+    });
+    d.check(answer == 1, what + ": EditObject answers 1");
+    d.checkFields(record, c.after, what);
+  }
+}
+
+// The field holds all that is typed; OK stores the first 1023 characters.
+inline void delimiterIsCut(Driver& d) {
+  Record record = storedRecord({2, 10, 10, 0, 0, 1});
+  std::string typed(1100, 'd');
+  for (std::size_t i = 0; i < typed.size(); ++i) typed[i] = static_cast<char>('a' + i % 26);
+  d.edit(record, [&](HWND dialog) {
+    d.checkEqual(fieldText(dialog, kDelimiter), ";", "delimiter: shown");
+    d.setText(dialog, kDelimiter, typed);
+    d.check(fieldText(dialog, kDelimiter) == typed, "delimiter: the field holds all");
+    d.click(dialog, kOk);
+  });
+  d.check(delimiterOf(record) == typed.substr(0, 1023), "delimiter cut to 1023 characters");
+  d.check(std::all_of(record.begin() + abi::kSetupListDelimiter + 1024,
+                      record.begin() + abi::kSetupAutoSelectRows,
+                      [](unsigned char b) { return b == 0xEE; }),
+          "delimiter: the bytes past the 1024 written are kept");
+  d.check(readInt(record, abi::kSetupAutoSelectRows) == 1, "delimiter: auto-select kept");
+  d.edit(record, [&](HWND dialog) {
+    d.setText(dialog, kDelimiter, "");
+    d.click(dialog, kOk);
+  });
+  d.checkEqual(delimiterOf(record), "", "an emptied delimiter is stored empty");
+}
+
+// Cancel and Escape write nothing; Help calls the host's help service and keeps the
+// dialog open, any number of times.
+inline void cancelEscapeAndHelp(Driver& d) {
+  for (bool escape : {false, true}) {
+    const std::string what = escape ? "escape" : "cancel";
+    Record record = storedRecord({2, 10, 10, 0, 0, 0});
+    const Record before = record;
+    const int32_t answer = d.edit(record, [&](HWND dialog) {
+      d.click(dialog, k3D);
+      d.type(dialog, kX, "1");
+      d.type(dialog, kY, "2");
+      d.setText(dialog, kDelimiter, "|");
+      for (int id : {kCaseSensitive, kWildcard, kOn}) d.click(dialog, id);
+      escape ? d.press(dialog, VK_ESCAPE) : d.click(dialog, kCancel);
+    });
+    d.check(answer == 0 && record == before, what + " answers 0 and leaves the record");
+  }
+  d.helpCalls.clear();
+  Record record = storedRecord({2, 10, 10, 0, 0, 0});
+  const Record before = record;
+  d.edit(record, [&](HWND dialog) {
+    for (int i = 0; i < 3; ++i) d.click(dialog, kHelp);
+    d.check(d.isOpen(dialog), "help keeps the dialog open");
+    d.checkEqual(state(dialog), "2D insensitive literal off | X", "help: state");
+    d.click(dialog, kCancel);
+  });
+  d.check(record == before, "help leaves the record");
+  d.check(d.helpCalls == std::vector<std::string>(3, "Help\\Quorrel\\quorrel2.html"),
+          "help calls the host's help service with the page, three times");
+}
+
+inline void runAllScenarios(Driver& d) {
+  createObject(d);
+  dimensionButtons(d);
+  okStoresWhatTheDialogShows(d);
+  delimiterIsCut(d);
+  cancelEscapeAndHelp(d);
 }
 
 }  // namespace quorrel::setup_dialog_test
