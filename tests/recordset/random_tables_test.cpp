@@ -3,6 +3,8 @@
 // comparisons.
 #include <algorithm>
 #include <climits>
+#include <functional>
+#include <iterator>
 #include <random>
 
 #include "query/compare.h"
@@ -149,19 +151,14 @@ void expectAggregatesOfTheModel(const RandomTable& t, int32_t column, int round)
   ASSERT_EQ(columnAverage(t.array, column), average) << "round " << round;
 }
 
+// A where-test or between-test: its model over one cell, and the operation.
+struct Where {
+  const char* name;
+  std::function<bool(const ModelCell&)> model;
+  std::function<void(ElementArray&, int32_t column)> select;
+};
+
 TEST(RandomTables, SelectionsAndAggregatesAgreeWithTheModel) {
-  enum Kind {
-    Containing,
-    Matching,
-    BetweenTexts,
-    Equal,
-    NotEqual,
-    Greater,
-    GreaterOrEqual,
-    Less,
-    LessOrEqual,
-    BetweenValues
-  };
   std::mt19937 rng(99);
   int passes = 0;
   int failures = 0;
@@ -175,51 +172,43 @@ TEST(RandomTables, SelectionsAndAggregatesAgreeWithTheModel) {
     a.caseMode = static_cast<int16_t>(rng() % 2);
     a.searchMode = static_cast<int16_t>(rng() % 2);
     a.selectionMode = static_cast<int32_t>(rng() % 2);
-    const auto kind = static_cast<Kind>(rng() % 10);
     // Texts: the probe is the low end of a between test, another random text the high end.
     const std::string probe = randomProbe(rng, t);
     const std::string high = randomProbe(rng, t);
     const char* low = rng() % 20 == 0 ? nullptr : probe.c_str();
     const char* top = rng() % 20 == 0 ? nullptr : high.c_str();
     const int32_t x = static_cast<int32_t>(rng() % 21) - 10;
+    const auto byValue = [x](const char* name, auto op,
+                             void (*select)(ElementArray&, int32_t, int32_t)) {
+      return Where{name, [=](const ModelCell& c) { return op(c.value, x); },
+                   [=](ElementArray& array, int32_t j) { select(array, j, x); }};
+    };
+    const Where wheres[] = {
+        {"containing",
+         [&](const ModelCell& c) { return containsByCompare(a, c.text, low ? probe : ""); },
+         [&](ElementArray& array, int32_t j) { selectWhereContaining(array, j, low); }},
+        {"matching", [&](const ModelCell& c) { return searchCompare(a, low, c.text.c_str()) == 0; },
+         [&](ElementArray& array, int32_t j) { selectWhereMatching(array, j, low); }},
+        {"between texts",
+         [&](const ModelCell& c) {
+           return compareText(a, low, c.text.c_str()) <= 0 &&
+                  compareText(a, top, c.text.c_str()) >= 0;
+         },
+         [&](ElementArray& array, int32_t j) { selectBetweenStrings(array, j, low, top); }},
+        byValue("equal", std::equal_to<>(), selectWhereEqual),
+        byValue("not equal", std::not_equal_to<>(), selectWhereNotEqual),
+        byValue("greater", std::greater<>(), selectWhereGreater),
+        byValue("greater or equal", std::greater_equal<>(), selectWhereGreaterOrEqual),
+        byValue("less", std::less<>(), selectWhereLess),
+        byValue("less or equal", std::less_equal<>(), selectWhereLessOrEqual),
+        {"between values", [&](const ModelCell& c) { return c.value >= x && c.value <= x + 5; },
+         [&](ElementArray& array, int32_t j) { selectBetweenValues(array, j, x, x + 5); }}};
+    const Where& where = wheres[rng() % std::size(wheres)];
     const std::vector<uint8_t> before = a.rowStates;
-    const auto expected = expectedStates(t, column, [&](const ModelCell& cell) {
-      const char* text = cell.text.c_str();
-      switch (kind) {
-        case Containing:
-          return containsByCompare(a, cell.text, low != nullptr ? probe : "");
-        case Matching:
-          return searchCompare(a, low, text) == 0;
-        case BetweenTexts:
-          return compareText(a, low, text) <= 0 && compareText(a, top, text) >= 0;
-        case Equal:
-          return cell.value == x;
-        case NotEqual:
-          return cell.value != x;
-        case Greater:
-          return cell.value > x;
-        case GreaterOrEqual:
-          return cell.value >= x;
-        case Less:
-          return cell.value < x;
-        case LessOrEqual:
-          return cell.value <= x;
-        default:
-          return cell.value >= x && cell.value <= x + 5;
-      }
-    });
-    if (kind == Containing) selectWhereContaining(a, column, low);
-    if (kind == Matching) selectWhereMatching(a, column, low);
-    if (kind == BetweenTexts) selectBetweenStrings(a, column, low, top);
-    if (kind == Equal) selectWhereEqual(a, column, x);
-    if (kind == NotEqual) selectWhereNotEqual(a, column, x);
-    if (kind == Greater) selectWhereGreater(a, column, x);
-    if (kind == GreaterOrEqual) selectWhereGreaterOrEqual(a, column, x);
-    if (kind == Less) selectWhereLess(a, column, x);
-    if (kind == LessOrEqual) selectWhereLessOrEqual(a, column, x);
-    if (kind == BetweenValues) selectBetweenValues(a, column, x, x + 5);
+    const auto expected = expectedStates(t, column, where.model);
+    where.select(a, column);
     ASSERT_EQ(a.rowStates, expected)
-        << "round " << round << " kind " << kind << " probe «" << (low ? probe : "(none)")
+        << "round " << round << " " << where.name << " probe «" << (low ? probe : "(none)")
         << "» column " << column << " case " << a.caseMode << " wildcard " << a.searchMode
         << " mode " << a.selectionMode;
     for (std::size_t r = 0; r < before.size(); ++r) {
