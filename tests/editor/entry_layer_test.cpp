@@ -10,6 +10,7 @@
 
 #include "host/entry_points.h"
 #include "host/run_record.h"
+#include "hostsim/host_simulator.h"
 #include "platform/windows_services.h"
 
 namespace {
@@ -42,42 +43,24 @@ void operator delete(void* p, std::size_t) noexcept {
 
 namespace {
 
-using quorrel::ElementArray;
 namespace abi = quorrel::abi;
 namespace host = quorrel::host;
 using abi::HostWord;
+using quorrel::hostsim::Instance;
 
-// A run record with a run-time header whose services hand over "," and a buffer.
-struct Instance {
-  std::vector<unsigned char> record = std::vector<unsigned char>(abi::kRunRecordSize, 0);
-  std::vector<unsigned char> header = std::vector<unsigned char>(abi::kRunHeaderMinSize, 0);
-  static inline char result[256];
-
-  static HostWord QUORREL_CALL fetch(void*, int32_t, HostWord) {
-    return reinterpret_cast<HostWord>(",");
-  }
-  static char* QUORREL_CALL allocate(void*, int32_t, int32_t) { return result; }
-
-  Instance() {
-    host::writeField<void*>(record.data(), abi::kRunHeader, header.data());
-    host::writeField<abi::FetchParameterService>(header.data(), abi::kFetchFirstParameter, fetch);
-    host::writeField<abi::FetchParameterService>(header.data(), abi::kFetchNextParameter, fetch);
-    host::writeField<abi::AllocateResultStringService>(header.data(), abi::kAllocateResultString,
-                                                       allocate);
-  }
-  void* data() { return record.data(); }
-  const ElementArray* array() const { return host::elementArrayOf(record.data()); }
-};
-
+// The module linked into this program, driven as the host drives it.
+const quorrel::hostsim::Module& module() {
+  static const auto linked = quorrel::hostsim::Module::linked();
+  return *linked;
+}
 const abi::ActionRoutine* actions() {
-  static std::vector<unsigned char> info(64, 0);
-  GetRunObjectInfos(0, info.data());
-  return host::readField<const abi::ActionRoutine*>(info.data(), abi::kInfoActionRoutines);
+  return module().routines().actions;
 }
 const abi::ExpressionRoutine* expressions() {
-  static std::vector<unsigned char> info(64, 0);
-  GetRunObjectInfos(0, info.data());
-  return host::readField<const abi::ExpressionRoutine*>(info.data(), abi::kInfoExpressionRoutines);
+  return module().routines().expressions;
+}
+const quorrel::ElementArray* arrayOf(Instance& instance) {
+  return host::elementArrayOf(instance.record());
 }
 
 TEST(EntryLayer, CodesOutOfRangeGetNoEntryTitleOrString) {
@@ -124,27 +107,25 @@ TEST(EntryLayer, NullAndDestroyedRecordsAreRefused) {
   EXPECT_EQ(actions()[8](nullptr, reinterpret_cast<HostWord>("x"), 0), 0);
   EXPECT_EQ(expressions()[0](nullptr, 0), 0u);
 
-  Instance instance;
-  CreateRunObject(instance.data(), nullptr, 0);
-  ASSERT_NE(instance.array(), nullptr);
-  actions()[8](instance.data(), reinterpret_cast<HostWord>("x"), 0);
-  EXPECT_EQ(expressions()[0](instance.data(), 0), 1u);
+  Instance instance(module());
+  ASSERT_NE(arrayOf(instance), nullptr);
+  actions()[8](instance.record(), reinterpret_cast<HostWord>("x"), 0);
+  EXPECT_EQ(expressions()[0](instance.record(), 0), 1u);
   // A second destroy, and calls after the first, find no array (ASan sees any reuse).
-  EXPECT_EQ(DestroyRunObject(instance.data(), 0), 0);
-  EXPECT_EQ(instance.array(), nullptr);
-  EXPECT_EQ(DestroyRunObject(instance.data(), 0), 0);
-  EXPECT_EQ(actions()[8](instance.data(), reinterpret_cast<HostWord>("x"), 0), 0);
-  EXPECT_EQ(expressions()[0](instance.data(), 0), 0u);
+  instance.destroy();
+  EXPECT_EQ(arrayOf(instance), nullptr);
+  EXPECT_EQ(DestroyRunObject(instance.record(), 0), 0);
+  EXPECT_EQ(actions()[8](instance.record(), reinterpret_cast<HostWord>("x"), 0), 0);
+  EXPECT_EQ(expressions()[0](instance.record(), 0), 0u);
 
   // A header without services: parameters arrive as 0 and no text is handed over.
-  Instance bare;
-  std::memset(bare.header.data(), 0, bare.header.size());
-  CreateRunObject(bare.data(), nullptr, 0);
-  actions()[8](bare.data(), reinterpret_cast<HostWord>("x"), 0);
-  EXPECT_EQ(expressions()[16](bare.data(), 0), 0u);
-  host::writeField<void*>(bare.record.data(), abi::kRunHeader, nullptr);
-  EXPECT_EQ(expressions()[16](bare.data(), 0), 0u);
-  DestroyRunObject(bare.data(), 0);
+  Instance bare(module());
+  std::vector<unsigned char> noServices(abi::kRunHeaderMinSize, 0);
+  host::writeField<void*>(bare.record(), abi::kRunHeader, noServices.data());
+  actions()[8](bare.record(), reinterpret_cast<HostWord>("x"), 0);
+  EXPECT_EQ(expressions()[16](bare.record(), 0), 0u);
+  host::writeField<void*>(bare.record(), abi::kRunHeader, nullptr);
+  EXPECT_EQ(expressions()[16](bare.record(), 0), 0u);
 }
 
 TEST(EntryLayer, StaleMenuHandlesNameNothing) {
@@ -173,15 +154,13 @@ TEST(EntryLayer, StaleMenuHandlesNameNothing) {
 // inside the standard library here, are failed allocation by allocation in
 // fuzz/alloc_faults.cpp.
 TEST(EntryLayer, ThrowsInsideEveryFamilyStayInside) {
-  actions();  // the test's own tables are read before memory runs out
-  expressions();
-  Instance ready;
-  CreateRunObject(ready.data(), nullptr, 0);
+  module();  // the host's own tables are read before memory runs out
+  Instance ready(module());
   for (const char* text : {"a", "b"})
-    actions()[8](ready.data(), reinterpret_cast<HostWord>(text), 0);
+    actions()[8](ready.record(), reinterpret_cast<HostWord>(text), 0);
   HMENU menu = CreatePopupMenu();
   std::vector<unsigned char> setup(abi::kSetupRecordSize, 0);
-  Instance fresh;
+  Instance fresh(module(), {}, false);
 
   struct Call {
     const char* family;
@@ -191,16 +170,16 @@ TEST(EntryLayer, ThrowsInsideEveryFamilyStayInside) {
   const Call calls[] = {
       {"run object",
        [](Instance&, Instance& f, HMENU, void*) -> HostWord {
-         CreateRunObject(f.data(), nullptr, 0);
-         return f.array() != nullptr;
+         CreateRunObject(f.record(), nullptr, 0);
+         return arrayOf(f) != nullptr;
        },
        0},
       {"action",
        [](Instance& r, Instance&, HMENU, void*) -> HostWord {
          // A delimiter too long to be stored without an allocation.
-         actions()[57](r.data(), reinterpret_cast<HostWord>("; a delimiter of forty characters ;"),
-                       0);
-         return expressions()[0](r.data(), 0);  // the size
+         actions()[57](r.record(),
+                       reinterpret_cast<HostWord>("; a delimiter of forty characters ;"), 0);
+         return expressions()[0](r.record(), 0);  // the size
        },
        2},
       {"menu",
@@ -242,8 +221,6 @@ TEST(EntryLayer, ThrowsInsideEveryFamilyStayInside) {
   DestroyMenu(built);
   EXPECT_EQ(GetMenuItemCount(menu), 0);
   DestroyMenu(menu);
-  DestroyRunObject(ready.data(), 0);
-  DestroyRunObject(fresh.data(), 0);
 }
 
 }  // namespace
