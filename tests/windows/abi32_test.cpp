@@ -15,7 +15,6 @@ namespace {
 
 static_assert(sizeof(void*) == 4, "this test runs in the 32-bit build");
 
-using quorrel::abi::HostWord;
 using quorrel::abi::readField;
 using quorrel::abi::writeField;
 using quorrel::hostsim::Instance;
@@ -26,51 +25,32 @@ const quorrel::hostsim::Module& module() {
   return *loaded;
 }
 
-// The routine tables and a RunInfo read by hand, next to the host simulator's instance.
-class Abi32 : public ::testing::Test {
- protected:
-  void SetUp() override {
-    GetRunObjectInfos(0, runInfo.data());
-    std::memcpy(&actions, runInfo.data() + 4, 4);
-    std::memcpy(&expressions, runInfo.data() + 8, 4);
-  }
-
-  std::vector<uint8_t> runInfo = std::vector<uint8_t>(64, 0xEE);
-  const quorrel::abi::ActionRoutine* actions = nullptr;
-  const quorrel::abi::ExpressionRoutine* expressions = nullptr;
-};
-
-TEST_F(Abi32, RunInfoBytes) {
-  EXPECT_EQ(GetRunObjectDataSize(0, 0), 192);
-  const void* conditions = readField<const void*>(runInfo.data(), 0);
-  ASSERT_NE(conditions, nullptr);
-  EXPECT_EQ(*static_cast<const void* const*>(conditions), nullptr);
-  for (int code = 0; code < 79; ++code) EXPECT_NE(actions[code], nullptr) << code;
-  EXPECT_EQ(actions[79], nullptr);
-  for (int code = 0; code < 60; ++code) EXPECT_NE(expressions[code], nullptr) << code;
-  EXPECT_EQ(expressions[60], nullptr);
-  // 0 conditions, 79 actions, 60 expressions, setup record of 1076 (0x434) bytes.
+// RunInfo read at its literal offsets: the routine tables at 4 and 8; 0 conditions,
+// 79 actions, 60 expressions, a setup record of 1076 (0x434) bytes, the host's byte 10
+// and "RQUZ"; the bytes between and after stay the host's (0xEE).
+TEST(Abi32, RunInfoAndInformationEntryBytes) {
+  std::vector<uint8_t> runInfo(64, 0xEE);
+  GetRunObjectInfos(0, runInfo.data());
+  EXPECT_EQ(readField<const void*>(runInfo.data(), 4), module().routines().actions);
+  EXPECT_EQ(readField<const void*>(runInfo.data(), 8), module().routines().expressions);
   const std::vector<uint8_t> written(runInfo.begin() + 12, runInfo.begin() + 36);
   const std::vector<uint8_t> expected = {0,  0,    79, 0, 60,  0,   0x34, 0x04, 0, 0, 0,    0,
                                          10, 0xEE, 0,  0, 'R', 'Q', 'U',  'Z',  0, 0, 0xEE, 0xEE};
   EXPECT_EQ(written, expected);
-}
 
-TEST_F(Abi32, InfoEntriesAreTwelveBytesApart) {
+  // Twelve-byte entries: action 6 is code 6, flags 0, a text (45) and a number (22), no
+  // title ids; expression 39 takes two integers (1).
   const auto* actionBase = reinterpret_cast<const uint8_t*>(GetActionInfos(nullptr, 0));
-  const auto* insertString = reinterpret_cast<const uint8_t*>(GetActionInfos(nullptr, 6));
-  ASSERT_EQ(insertString - actionBase, 72);
-  // Code 6, flags 0, a text (45) and a number (22), no title ids.
   const uint8_t action6[12] = {6, 0, 0, 0, 45, 0, 22, 0, 0, 0, 0, 0};
-  EXPECT_EQ(std::memcmp(insertString, action6, 12), 0);
+  EXPECT_EQ(std::memcmp(actionBase + 6 * 12, action6, 12), 0);
+  EXPECT_EQ(GetActionInfos(nullptr, 6), static_cast<const void*>(actionBase + 6 * 12));
   const auto* expressionBase = reinterpret_cast<const uint8_t*>(GetExpressionInfos(nullptr, 0));
-  const auto* indexOfXY = reinterpret_cast<const uint8_t*>(GetExpressionInfos(nullptr, 39));
-  ASSERT_EQ(indexOfXY - expressionBase, 39 * 12);
   const uint8_t expression39[12] = {39, 0, 0, 0, 1, 0, 1, 0, 0, 0, 0, 0};
-  EXPECT_EQ(std::memcmp(indexOfXY, expression39, 12), 0);
+  EXPECT_EQ(std::memcmp(expressionBase + 39 * 12, expression39, 12), 0);
+  EXPECT_EQ(GetExpressionInfos(nullptr, 39), static_cast<const void*>(expressionBase + 39 * 12));
 }
 
-TEST_F(Abi32, InstanceLivesInTheLastEightBytes) {
+TEST(Abi32, InstanceLivesInTheLastEightBytes) {
   SetupRecord setup;
   setup.set(24, 2).set(28, 3).set(32, 9);  // two dimensions, X boundary 3, Y not used in 2D
   setup.delimiter(";").set(1072, 1);       // automatic selection
@@ -90,33 +70,21 @@ TEST_F(Abi32, InstanceLivesInTheLastEightBytes) {
   EXPECT_EQ(std::vector<uint8_t>(runRecord, runRecord + 184), hostPart)
       << "the host's 184 bytes are not the extension's to write";
 
-  EXPECT_EQ(actions[8](runRecord, reinterpret_cast<HostWord>("abc"), 0), 0);
-  EXPECT_EQ(actions[9](runRecord, 12, 0), 0);
-  const auto expression = [&](int code, std::vector<quorrel::hostsim::Argument> args) {
-    HostWord answer = instance.callExpressionRaw(code, std::move(args), 0x1234);
-    for (const auto& fetch : instance.fetches) EXPECT_EQ(fetch.token, 0x1234);
-    return answer;
+  // Parameters through both fetch services (the simulator checks how they are fetched).
+  instance.callAction(8, {"abc"});
+  instance.callAction(9, {12});
+  const auto number = [&](int code, std::vector<quorrel::hostsim::Argument> args) {
+    return instance.callExpression(code, args).number;
   };
-  EXPECT_EQ(expression(0, {}), 2);    // size(
-  EXPECT_EQ(expression(26, {}), 2);   // dim(
-  EXPECT_EQ(expression(28, {}), 3);   // boundaryX(
-  EXPECT_EQ(expression(3, {1}), 12);  // get( 1, an integer through the first service
-  ASSERT_EQ(instance.fetches.size(), 1u);
-  EXPECT_TRUE(instance.fetches[0].first);
-  EXPECT_EQ(instance.fetches[0].typeFlag, 0);
+  EXPECT_EQ(number(0, {}), 2);       // size(
+  EXPECT_EQ(number(26, {}), 2);      // dim(
+  EXPECT_EQ(number(28, {}), 3);      // boundaryX(
+  EXPECT_EQ(number(3, {1}), 12);     // get( 1
+  EXPECT_EQ(number(39, {1, 1}), 4);  // indexOfXY( 1 1 with X boundary 3
 
-  // indexOfXY(1, 1) with X boundary 3: integers through the first, then the next service.
-  EXPECT_EQ(expression(39, {1, 1}), 4);
-  ASSERT_EQ(instance.fetches.size(), 2u);
-  EXPECT_FALSE(instance.fetches[1].first);
-  EXPECT_EQ(instance.fetches[1].typeFlag, 0);
-
-  // A text result: a host buffer of length + 1 bytes and bit 0x8000 of the word at 124.
+  // A text result sets bit 0x8000 of the word at 124 and leaves the host's bits.
   writeField<uint16_t>(runRecord, 124, 0x0001);
-  const HostWord text = expression(2, {0});  // get$( 0
-  ASSERT_EQ(instance.allocations.size(), 1u);
-  EXPECT_EQ(instance.allocations[0].first, 4);
-  EXPECT_EQ(std::string(reinterpret_cast<const char*>(text)), "abc");
+  EXPECT_EQ(instance.callExpression(2, {0}).text, "abc");  // get$( 0
   EXPECT_EQ(readField<uint16_t>(runRecord, 124), 0x8001);
 }
 
