@@ -185,6 +185,7 @@ using ItemCountFn = int (*)(Menu);
 using ItemIdFn = unsigned (*)(Menu, int);
 using ItemTextFn = int (*)(Menu, unsigned, char*, int, unsigned);
 using SubMenuFn = Menu (*)(Menu, int);
+using StateFn = unsigned (*)(Menu, unsigned, unsigned);
 using DestroyFn = int (*)(Menu);
 constexpr unsigned kByPosition = 0x400;
 
@@ -193,6 +194,7 @@ struct Services {
   ItemIdFn id;
   ItemTextFn text;
   SubMenuFn subMenu;
+  StateFn state;
 };
 
 std::vector<MenuItem> walk(const Services& services, Menu menu) {
@@ -203,6 +205,7 @@ std::vector<MenuItem> walk(const Services& services, Menu menu) {
     char text[256] = {};
     services.text(menu, static_cast<unsigned>(position), text, sizeof text, kByPosition);
     item.text = text;
+    item.state = services.state(menu, static_cast<unsigned>(position), kByPosition) & 0xFF;
     if (Menu sub = services.subMenu(menu, position)) {
       item.popup = true;
       item.items = walk(services, sub);
@@ -233,6 +236,9 @@ std::vector<MenuItem> Module::menu(std::string_view which) const {
       },
       [](menus::Menu m, int position) -> menus::Menu {
         return GetSubMenu(static_cast<HMENU>(m), position);
+      },
+      [](menus::Menu m, unsigned item, unsigned flags) {
+        return static_cast<unsigned>(GetMenuState(static_cast<HMENU>(m), item, flags));
       }};
   std::vector<MenuItem> items = menus::walk(services, menu);
   DestroyMenu(static_cast<HMENU>(menu));  // the host owns the menu it was handed
@@ -240,7 +246,8 @@ std::vector<MenuItem> Module::menu(std::string_view which) const {
 #else
   const menus::Services services{
       entry<menus::ItemCountFn>("GetMenuItemCount"), entry<menus::ItemIdFn>("GetMenuItemID"),
-      entry<menus::ItemTextFn>("GetMenuStringA"), entry<menus::SubMenuFn>("GetSubMenu")};
+      entry<menus::ItemTextFn>("GetMenuStringA"), entry<menus::SubMenuFn>("GetSubMenu"),
+      entry<menus::StateFn>("GetMenuState")};
   std::vector<MenuItem> items = menus::walk(services, menu);
   // The host owns the menu it was handed.
   if (const auto destroy = optional<menus::DestroyFn>(*this, "DestroyMenu")) destroy(menu);

@@ -45,6 +45,9 @@ struct MenuItem {
   std::string text;
   unsigned id = 0;
   bool popup = false;
+  // What the editor would show of the item besides its text: the low byte of its
+  // state (grayed 0x01, disabled 0x02, checked 0x08, popup 0x10).
+  unsigned state = 0;
   std::vector<MenuItem> items;
 };
 

@@ -7,18 +7,31 @@ namespace quorrel::tool {
 
 namespace {
 
+// The state flags an item shows beyond what its line says, e.g. " [grayed checked]".
+std::string unusualState(const MenuItem& item) {
+  std::string flags;
+  const unsigned expected = item.popup ? 0x10 : 0;
+  for (auto [bit, name] :
+       {std::pair{0x01u, "grayed"}, {0x02u, "disabled"}, {0x08u, "checked"}, {0x10u, "popup"}}) {
+    if ((item.state & bit) != (expected & bit)) {
+      flags += std::string(flags.empty() ? "" : " ") + ((item.state & bit) ? "" : "not ") + name;
+    }
+  }
+  return flags.empty() ? flags : " [" + flags + "]";
+}
+
 // One line per item, indented two spaces a level: a popup's quoted title, a command's
-// id and quoted title, or "-" for a separator.
+// id and quoted title, or "-" for a separator; then any unusual state.
 void printMenu(const std::vector<MenuItem>& items, int depth) {
   for (const MenuItem& item : items) {
     std::cout << std::string(2 * depth, ' ');
     if (item.popup) {
-      std::cout << quoteText(item.text) << '\n';
+      std::cout << quoteText(item.text) << unusualState(item) << '\n';
       printMenu(item.items, depth + 1);
     } else if (item.id == 0) {
-      std::cout << "-\n";
+      std::cout << "-" << unusualState(item) << '\n';
     } else {
-      std::cout << item.id << ' ' << quoteText(item.text) << '\n';
+      std::cout << item.id << ' ' << quoteText(item.text) << unusualState(item) << '\n';
     }
   }
 }
