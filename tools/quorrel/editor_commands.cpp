@@ -21,7 +21,8 @@ std::string unusualState(const MenuItem& item) {
 }
 
 // One line per item, indented two spaces a level: a popup's quoted title, a command's
-// id and quoted title, or "-" for a separator; then any unusual state.
+// id and quoted title, or "-" for a separator; a popup or command then shows any
+// unusual state.
 void printMenu(const std::vector<MenuItem>& items, int depth) {
   for (const MenuItem& item : items) {
     std::cout << std::string(2 * depth, ' ');
@@ -29,7 +30,7 @@ void printMenu(const std::vector<MenuItem>& items, int depth) {
       std::cout << quoteText(item.text) << unusualState(item) << '\n';
       printMenu(item.items, depth + 1);
     } else if (item.id == 0) {
-      std::cout << "-" << unusualState(item) << '\n';
+      std::cout << "-\n";  // Windows reports separators grayed and disabled; nothing to see
     } else {
       std::cout << item.id << ' ' << quoteText(item.text) << unusualState(item) << '\n';
     }
