@@ -13,10 +13,7 @@ namespace {
 // Each action answers 0; text parameters get `text`, number parameters 1.
 void callEveryAction(Instance& t, const std::string& text) {
   for (int code = 0; code < 79; ++code) {
-    const std::string types = actionParams(code);
-    EXPECT_EQ(
-        t.action(code, types[0] == 'T' ? Arg(text) : Arg(1), types[1] == 'T' ? Arg(text) : Arg(1)),
-        0)
+    EXPECT_EQ(t.callAction(code, argsFor(module().actionSignature(code), 1, text)), 0)
         << "action " << code;
   }
 }
@@ -26,13 +23,14 @@ TEST(DriveTest, EveryActionAndExpressionOnALiveInstance) {
   const std::string path = ::testing::TempDir() + "quorrel_host_drive.dat";
   Instance t(SetupRecord().set(kSetupXBoundary, 3).set(kSetupAutoSelectRows, 1));
   for (int round = 0; round < 2; ++round) {
-    t.action(34, "a,1,x");
-    t.action(34, "b,2,y");
-    t.action(48, "name", 0);
+    t.callAction(34, {"a,1,x"});
+    t.callAction(34, {"b,2,y"});
+    t.callAction(48, {"name", 0});
     callEveryAction(t, path);
     for (int code = 0; code < 60; ++code) {
       t.setFlags(0x0101);
-      EXPECT_NO_THROW(t.callExpression(code, argsFor(expressionParams(code), 0, "name")));
+      EXPECT_NO_THROW(
+          t.callExpression(code, argsFor(module().expressionSignature(code), 0, "name")));
     }
   }
   std::remove(path.c_str());
@@ -41,10 +39,13 @@ TEST(DriveTest, EveryActionAndExpressionOnALiveInstance) {
 TEST(DriveTest, WithoutAnArrayActionsDoNothingAndExpressionsAnswerZero) {
   ASSERT_MODULE_LOADED();
   Instance instance(SetupRecord(), false);
-  ASSERT_EQ(instance.elementArray(), nullptr);
+  ASSERT_EQ(readField<void*>(instance.record(), kRunElementArray), nullptr);
   callEveryAction(instance, "nothing");
   for (int code = 0; code < 60; ++code) {
-    EXPECT_EQ(instance.number(code, argsFor(expressionParams(code), 1, "x")), 0) << code;
+    instance.setFlags(0x0101);
+    const auto result =
+        instance.callExpression(code, argsFor(module().expressionSignature(code), 1, "x"));
+    EXPECT_TRUE(!result.isText && result.number == 0) << code;
   }
 }
 
@@ -57,8 +58,8 @@ TEST(DriveTest, CreateTakesAFullDelimiterFieldAndZeroesTheBetweenColumn) {
   Instance instance(setup, false);
   writeField<int32_t>(instance.record(), kRunBetweenColumn, 77);
   instance.create();
-  EXPECT_EQ(instance.betweenColumn(), 0);
-  EXPECT_EQ(instance.text(51), std::string(kSetupListDelimiterSize, 'x'));
+  EXPECT_EQ(readField<int32_t>(instance.record(), kRunBetweenColumn), 0);
+  EXPECT_EQ(instance.callExpression(51, {}).text, std::string(kSetupListDelimiterSize, 'x'));
 }
 
 }  // namespace

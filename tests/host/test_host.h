@@ -48,57 +48,21 @@ Fn entry(const char* name) {
   return module().entry<Fn>(name);
 }
 
-// A code's declared parameter types as letters, from its information entry (the
-// names_list case pins them): T text, N number (actions) or I integer (expressions),
-// '-' none.
-inline std::string parameterLetters(const quorrel::hostsim::Signature& signature) {
-  std::string letters = "--";
-  for (int i = 0; i < signature.paramCount; ++i) {
-    const uint16_t type = signature.paramTypes[i];
-    letters[i] = type == 45 || type == 3 ? 'T' : type == 22 ? 'N' : type == 1 ? 'I' : '?';
-  }
-  return letters;
-}
-inline std::string actionParams(int code) {
-  return parameterLetters(module().actionSignature(code));
-}
-inline std::string expressionParams(int code) {
-  return parameterLetters(module().expressionSignature(code));
-}
-
+// An instance of the loaded module.
 class Instance : public quorrel::hostsim::Instance {
  public:
   explicit Instance(SetupRecord setup = SetupRecord(), bool createNow = true)
       : quorrel::hostsim::Instance(module(), std::move(setup), createNow) {}
-
-  void* elementArray() { return readField<void*>(record(), kRunElementArray); }
-  int32_t betweenColumn() { return readField<int32_t>(record(), kRunBetweenColumn); }
-
-  int16_t action(int code, const Arg& p1 = Arg(), const Arg& p2 = Arg()) {
-    return callAction(code, {p1, p2});
-  }
-  // Results as the host reads them, each call checked against the host's rules, with
-  // other host flags set to show that they stay.
-  int32_t number(int code, std::vector<Arg> params = {}) {
-    setFlags(0x0101);
-    const auto result = callExpression(code, params);
-    EXPECT_FALSE(result.isText) << "expression " << code;
-    return result.number;
-  }
-  std::string text(int code, std::vector<Arg> params = {}) {
-    setFlags(0x0101);
-    const auto result = callExpression(code, params);
-    EXPECT_TRUE(result.isText) << "expression " << code;
-    return result.text;
-  }
 };
 
-// Arguments for an expression's declared parameter types.
-inline std::vector<Arg> argsFor(const std::string& types, int32_t number, const char* text) {
+// Arguments of a code's declared types: `text` for each text, `number` for the others.
+inline std::vector<Arg> argsFor(const quorrel::hostsim::Signature& signature, int32_t number,
+                                const std::string& text) {
   std::vector<Arg> args;
-  for (int i = 0; i < 2; ++i) {
-    if (types[i] == 'I') args.emplace_back(number);
-    if (types[i] == 'T') args.emplace_back(text);
+  for (int i = 0; i < signature.paramCount; ++i) {
+    const uint16_t type = signature.paramTypes[i];
+    args.push_back(type == kActionParamText || type == kExpressionParamText ? Arg(text)
+                                                                            : Arg(number));
   }
   return args;
 }
