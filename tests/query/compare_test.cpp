@@ -103,43 +103,36 @@ TEST(SearchCompare, ModesArgumentOrderAndSpans) {
   }
 }
 
-Element element(const ElementValue& v) {
-  Element e;
-  e.assign(v);
-  return e;
-}
-
+// Numbers against texts by leading number, texts against patterns in wildcard mode, a
+// missing operand as None; byte operands by count first, then unsigned bytes.
 TEST(CompareWithElement, ByOperandType) {
-  const ElementArray literal = settings(false, false);
-  const ElementArray wildcard = settings(true, false);
-  const Element text7 = element(ElementValue::ofText("7abc"));
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofValue(7), text7), 0);
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofValue(6), text7), -1);
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofValue(8), text7), 1);
-  const Element value7 = element(ElementValue::ofValue(7));
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofText("7"), value7), 0);
-
-  const Element pattern = element(ElementValue::ofText("ab*"));
-  const Element plain = element(ElementValue::ofText("abc"));
-  EXPECT_EQ(compareWithElement(wildcard, ElementValue::ofText("abc"), pattern), 0);
-  EXPECT_EQ(compareWithElement(wildcard, ElementValue::ofText("ab*"), plain), 1);
-
-  const Element zero = element(ElementValue::ofValue(0));
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofValue(0), zero), 0);
-  EXPECT_NE(compareWithElement(literal, ElementValue::ofText("0"), zero), 0);
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofText(""), zero), 0);
-  EXPECT_EQ(compareWithElement(literal, ElementValue{}, zero), 0);
-  EXPECT_EQ(compareWithElement(literal, ElementValue{}, plain), -1);
-
-  // Byte operands: count first, then unsigned bytes.
+  using V = ElementValue;
+  const ElementArray modes[] = {settings(false, false), settings(true, false)};
   const char bytes[3] = {'a', '\x80', 'c'};
   const char lower[3] = {'a', '\x7F', 'z'};
-  const Element file = element(ElementValue::ofBytes(bytes, 3));
-  const std::string same(bytes, 3);
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofBytes(same.data(), 3), file), 0);
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofBytes(lower, 3), file), -1);
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofBytes(bytes, 2), file), -1);
-  EXPECT_EQ(compareWithElement(literal, ElementValue::ofBytes("abcd", 4), file), 1);
+  const struct {
+    bool wildcard;
+    V operand, element;
+    int32_t result;
+  } cases[] = {// clang-format off
+      {0, V::ofValue(7), V::ofText("7abc"), 0}, {0, V::ofValue(6), V::ofText("7abc"), -1},
+      {0, V::ofValue(8), V::ofText("7abc"), 1}, {0, V::ofText("7"), V::ofValue(7), 0},
+      {1, V::ofText("abc"), V::ofText("ab*"), 0}, {1, V::ofText("ab*"), V::ofText("abc"), 1},
+      {0, V::ofValue(0), V::ofValue(0), 0}, {0, V::ofText(""), V::ofValue(0), 0},
+      {0, V{}, V::ofValue(0), 0}, {0, V{}, V::ofText("abc"), -1},
+      {0, V::ofBytes(bytes, 3), V::ofBytes(bytes, 3), 0},
+      {0, V::ofBytes(lower, 3), V::ofBytes(bytes, 3), -1},
+      {0, V::ofBytes(bytes, 2), V::ofBytes(bytes, 3), -1},
+      {0, V::ofBytes("abcd", 4), V::ofBytes(bytes, 3), 1}};
+  // clang-format on
+  for (const auto& c : cases) {
+    Element e;
+    e.assign(c.element);
+    EXPECT_EQ(compareWithElement(modes[c.wildcard], c.operand, e), c.result)
+        << (c.operand.bytes ? c.operand.bytes : "") << " " << c.operand.number;
+  }
+  Element none;
+  EXPECT_NE(compareWithElement(modes[0], V::ofText("0"), none), 0);
 }
 
 }  // namespace
