@@ -87,27 +87,9 @@ TEST_F(NativeFile, AppendAddsAtTheEndAndKeepsDimensions) {
   EXPECT_STREQ(a.getKeyString(6), "k");
 }
 
-TEST_F(NativeFile, UnusableFilesClearOnReplaceAndChangeNothingOnAppend) {
-  writeBytes(path("magic.arr"), "ZUBARRAX" + kExample.substr(8));
-  writeBytes(path("v2.arr"), kMagic + le16(2) + kExample.substr(10));
-  writeBytes(path("d11.arr"), kMagic + le16(1) + le32(11) + std::string(44, '\0'));
-  writeBytes(path("zero.arr"), "");
-  for (const std::string& file : {path("missing.arr"), dir_.string(), path("magic.arr"),
-                                  path("v2.arr"), path("d11.arr"), path("zero.arr")}) {
-    SCOPED_TRACE(file);
-    ElementArray a = shaped(2, 4);
-    a.appendString("keep");
-    a.labels = LabelList{"l"};
-    loadNativeFile(a, file.c_str(), 1);
-    EXPECT_EQ(a.size(), 1);
-    EXPECT_EQ(a.dimensions(), 2);
-    loadNativeFile(a, file.c_str(), 0);
-    EXPECT_EQ(a.size(), 0);
-    EXPECT_EQ(a.dimensions(), 0);
-    EXPECT_EQ(a.boundaryEntry(1), 4);
-    EXPECT_EQ(a.labels, LabelList{"l"});
-  }
-  // Versions 0 and 0xFFFF (negative) read like 1.
+// Files that cannot be used are the file_unusable script case's; versions 0 and 0xFFFF
+// (negative) read like 1.
+TEST_F(NativeFile, VersionsBelowTwoAreRead) {
   for (uint16_t version : {uint16_t{0}, uint16_t{0xFFFF}}) {
     EXPECT_EQ(loaded(loadNativeFile, kMagic + le16(version) + kExample.substr(10)).size(), 2);
   }
