@@ -9,6 +9,7 @@
 
 #include "array/element.h"
 #include "array/text.h"
+#include "support/array_text.h"
 
 namespace quorrel {
 namespace {
@@ -60,15 +61,11 @@ TEST(Element, StoredTypesAndTheirReadings) {
 // A key takes a whole text whatever size the operand claims, and a Value key is 4 bytes;
 // changes of value keep the key, and moving an element moves its key.
 TEST(Element, KeysFollowTheValueRulesAndSurviveNewValues) {
-  NumberText scratch;
   Element e;
   e.setKey({ElementType::String, 0, "hello", 2});
-  EXPECT_EQ(e.type(), ElementType::None);
-  EXPECT_EQ(e.key()->size(), 6);
-  EXPECT_STREQ(e.key()->asString(scratch), "hello");
+  EXPECT_EQ(describe(e), "None 0 «» 0 key String 6 «hello» 0");
   e.setKey({ElementType::Value, -3, nullptr, 9});
-  EXPECT_EQ(e.key()->size(), 4);
-  EXPECT_EQ(e.key()->asValue(), -3);
+  EXPECT_EQ(describe(e), "None 0 «» 0 key Value 4 «-3» -3");
   for (const ElementValue& v : {ElementValue::ofValue(7), ElementValue::ofBytes("ab", 2),
                                 ElementValue::ofValue(0), ElementValue::ofText("")}) {
     e.assign(v);
@@ -79,11 +76,10 @@ TEST(Element, KeysFollowTheValueRulesAndSurviveNewValues) {
     e.setKey(ElementValue::ofValue(-3));
     EXPECT_EQ(e.asValue(), v.type == ElementType::Value ? v.number : 0);
   }
-  EXPECT_EQ(e.size(), 1);
+  EXPECT_EQ(describe(e), "String 1 «» 0 key Value 4 «-3» -3");
   Element moved(std::move(e));
-  EXPECT_EQ(e.type(), ElementType::None);
-  EXPECT_EQ(e.key(), nullptr);
-  EXPECT_EQ(moved.key()->asValue(), -3);
+  EXPECT_EQ(describe(e), "None 0 «» 0");
+  EXPECT_EQ(describe(moved), "String 1 «» 0 key Value 4 «-3» -3");
 }
 
 // Elements built from a slab share its blocks but must behave as if each had its own

@@ -12,6 +12,17 @@ inline std::string contentOf(const Element& e) {
   return e.bytes() == nullptr ? std::string()
                               : std::string(e.bytes(), static_cast<size_t>(e.size()));
 }
+// One element in one text: type, size, text form and value, then its key's the same
+// way, e.g. "String 5 «-42x» -42 key Value 4 «7» 7".
+inline std::string describe(const Element& e) {
+  static const char* const kTypes[] = {"None", "Value", "String", "File"};
+  NumberText scratch;
+  std::string out = std::string(kTypes[static_cast<int>(e.type())]) + " " +
+                    std::to_string(e.size()) + " «" + e.asString(scratch) + "» " +
+                    std::to_string(e.asValue());
+  if (const Element* key = e.key()) out += " key " + describe(*key);
+  return out;
+}
 // Every element in one text: texts as they are, "~" for None, "#n" for numbers and
 // "<bytes>" for files.
 inline std::string contents(ElementArray& a) {
