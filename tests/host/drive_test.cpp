@@ -19,7 +19,6 @@ void callEveryAction(Instance& t, const std::string& text) {
 }
 
 TEST(DriveTest, EveryActionAndExpressionOnALiveInstance) {
-  ASSERT_MODULE_LOADED();
   const std::string path = ::testing::TempDir() + "quorrel_host_drive.dat";
   Instance t(SetupRecord().set(kSetupXBoundary, 3).set(kSetupAutoSelectRows, 1));
   for (int round = 0; round < 2; ++round) {
@@ -37,7 +36,6 @@ TEST(DriveTest, EveryActionAndExpressionOnALiveInstance) {
 }
 
 TEST(DriveTest, WithoutAnArrayActionsDoNothingAndExpressionsAnswerZero) {
-  ASSERT_MODULE_LOADED();
   Instance instance(SetupRecord(), false);
   ASSERT_EQ(readField<void*>(instance.record(), kRunElementArray), nullptr);
   callEveryAction(instance, "nothing");
@@ -52,7 +50,6 @@ TEST(DriveTest, WithoutAnArrayActionsDoNothingAndExpressionsAnswerZero) {
 // A delimiter that fills its field has no terminator; the between column starts at 0
 // whatever the host left in the record.
 TEST(DriveTest, CreateTakesAFullDelimiterFieldAndZeroesTheBetweenColumn) {
-  ASSERT_MODULE_LOADED();
   SetupRecord setup;
   std::memset(setup.data() + kSetupListDelimiter, 'x', kSetupListDelimiterSize);
   Instance instance(setup, false);

@@ -10,7 +10,6 @@ namespace testhost {
 namespace {
 
 TEST(ModuleTest, ExportsEveryListedEntryPointWithADistinctOrdinal) {
-  ASSERT_MODULE_LOADED();
   std::ifstream file(QUORREL_ENTRY_POINTS_FILE);
   std::set<int> ordinals;
   std::set<std::string> names;
@@ -30,7 +29,6 @@ TEST(ModuleTest, ExportsEveryListedEntryPointWithADistinctOrdinal) {
 }
 
 TEST(ModuleTest, ObjectInformationAndRect) {
-  ASSERT_MODULE_LOADED();
   auto getInfos = entry<GetInfosFn>("GetInfos");
   EXPECT_EQ(getInfos(0), 512);
   EXPECT_EQ(getInfos(6), 2);
@@ -63,7 +61,6 @@ TEST(ModuleTest, ObjectInformationAndRect) {
 }
 
 TEST(ModuleTest, RunInfoFieldsAndUntouchedBytes) {
-  ASSERT_MODULE_LOADED();
   std::vector<unsigned char> info(64, 0xAB);
   EXPECT_EQ(entry<GetRunObjectInfosFn>("GetRunObjectInfos")(0, info.data()), 1);
   const unsigned char* p = info.data();
@@ -102,7 +99,6 @@ TEST(ModuleTest, RunInfoFieldsAndUntouchedBytes) {
 // Twelve-byte entries: the code, no flags, the parameter types (which the names_list
 // case pins code by code) and no title ids.
 TEST(ModuleTest, InformationEntriesAreTheCodesInOrder) {
-  ASSERT_MODULE_LOADED();
   auto check = [](const char* entryName, int count, std::set<uint16_t> types) {
     auto infos = entry<GetInfoEntryFn>(entryName);
     for (int c = 0; c < count; ++c) {

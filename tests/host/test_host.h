@@ -17,28 +17,11 @@ using namespace quorrel::abi;
 using quorrel::hostsim::SetupRecord;
 using Arg = quorrel::hostsim::Argument;
 
-struct LoadedModule {
-  std::unique_ptr<quorrel::hostsim::Module> module;
-  std::string error;
-};
-inline LoadedModule& loadedModule() {
-  static LoadedModule loaded = [] {
-    LoadedModule l;
-    try {
-      l.module = quorrel::hostsim::Module::open(QUORREL_MODULE_PATH);
-    } catch (const std::exception& error) {
-      l.error = error.what();
-    }
-    return l;
-  }();
-  return loaded;
-}
-// Throws (a failed test) when the module could not be loaded.
+// Opened on first use; a module that cannot be opened fails each test with the reason.
 inline const quorrel::hostsim::Module& module() {
-  if (!loadedModule().module) throw std::runtime_error(loadedModule().error);
-  return *loadedModule().module;
+  static const auto loaded = quorrel::hostsim::Module::open(QUORREL_MODULE_PATH);
+  return *loaded;
 }
-#define ASSERT_MODULE_LOADED() ASSERT_NE(loadedModule().module, nullptr) << loadedModule().error
 
 inline void* symbol(const char* name) {
   return module().symbol(name);
