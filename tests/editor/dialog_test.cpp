@@ -14,13 +14,17 @@ using namespace quorrel::setup_dialog_test;
 
 class HeadlessDriver : public Driver {
  public:
-  int32_t create(Record& record, const Act& act) override {
-    EditorContext editor(*this);
-    return withAuthor(act, [&] { return CreateObject(editor.get(), 0, record.data()); });
+  HeadlessDriver() {
+    createObject = CreateObject;
+    editObject = EditObject;
   }
-  int32_t edit(Record& record, const Act& act) override {
-    EditorContext editor(*this);
-    return withAuthor(act, [&] { return EditObject(editor.get(), 0, 0, record.data()); });
+  // Plays `act` in every dialog opened during `call`.
+  int32_t withAuthor(const Act& act, const std::function<int32_t()>& call) override {
+    QuorrelSetDialogScript([](HWND dialog, void* a) { (*static_cast<const Act*>(a))(dialog); },
+                           const_cast<Act*>(&act));
+    const int32_t answer = call();
+    QuorrelSetDialogScript(nullptr, nullptr);
+    return answer;
   }
   void click(HWND dialog, int id) override {
     EXPECT_TRUE(QuorrelDialogClick(dialog, id)) << "click " << id;
@@ -34,17 +38,6 @@ class HeadlessDriver : public Driver {
   void press(HWND dialog, int key) override { EXPECT_TRUE(QuorrelDialogKey(dialog, key)); }
   bool isOpen(HWND dialog) override { return QuorrelDialogIsOpen(dialog); }
   void check(bool ok, const std::string& what) override { EXPECT_TRUE(ok) << what; }
-
- private:
-  // Plays `act` in every dialog opened during `call`.
-  template <typename Call>
-  static int32_t withAuthor(const Act& act, Call call) {
-    QuorrelSetDialogScript([](HWND dialog, void* a) { (*static_cast<const Act*>(a))(dialog); },
-                           const_cast<Act*>(&act));
-    const int32_t answer = call();
-    QuorrelSetDialogScript(nullptr, nullptr);
-    return answer;
-  }
 };
 
 TEST(SetupDialog, SharedScenarios) {

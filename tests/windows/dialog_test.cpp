@@ -44,17 +44,17 @@ LRESULT CALLBACK watch(int code, WPARAM wParam, LPARAM lParam) {
 
 class WindowsDriver : public Driver {
  public:
-  abi::CreateObjectFn createObject = nullptr;
-  abi::EditObjectFn editObject = nullptr;
   int passed = 0, failed = 0;
 
-  int32_t create(Record& record, const Act& act) override {
-    EditorContext editor(*this);
-    return withAuthor(act, [&] { return createObject(editor.get(), 0, record.data()); });
-  }
-  int32_t edit(Record& record, const Act& act) override {
-    EditorContext editor(*this);
-    return withAuthor(act, [&] { return editObject(editor.get(), 0, 0, record.data()); });
+  int32_t withAuthor(const Act& act, const std::function<int32_t()>& call) override {
+    currentAct = &act;
+    currentDialog = nullptr;
+    acted = false;
+    HHOOK hook = SetWindowsHookExA(WH_CBT, watch, nullptr, GetCurrentThreadId());
+    const int32_t answer = call();
+    UnhookWindowsHookEx(hook);
+    check(acted, "the dialog was shown (error " + std::to_string(GetLastError()) + ")");
+    return answer;
   }
   void click(HWND dialog, int id) override { SendMessageA(GetDlgItem(dialog, id), BM_CLICK, 0, 0); }
   void type(HWND dialog, int id, const std::string& text) override {
@@ -95,19 +95,6 @@ class WindowsDriver : public Driver {
     }
     check(false, std::string(name) + " is an entry point");
     return nullptr;
-  }
-
- private:
-  template <typename Call>
-  int32_t withAuthor(const Act& act, Call call) {
-    currentAct = &act;
-    currentDialog = nullptr;
-    acted = false;
-    HHOOK hook = SetWindowsHookExA(WH_CBT, watch, nullptr, GetCurrentThreadId());
-    const int32_t answer = call();
-    UnhookWindowsHookEx(hook);
-    check(acted, "the dialog was shown (error " + std::to_string(GetLastError()) + ")");
-    return answer;
   }
 };
 
