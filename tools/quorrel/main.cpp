@@ -50,6 +50,9 @@ ignored. FILE - reads the script from standard input.
 'quorrel list' shows every name with its parameters; 'quorrel list NAME' says
 what one does. Arguments are integers or quoted strings with the escapes
 \\ \" \n \r \t \xHH. An error prints FILE:LINE: error: WHAT and exits with status 2.
+Every expression call is checked against the host's rules (parameters fetched as
+declared, host flags, one text buffer of the text's size); a module that breaks
+one stops the run with status 1.
 
   --echo          print each E line beside its result: 12: E size(  →  3
   --warn-files    warn on standard error when a file action names a path it
@@ -103,7 +106,9 @@ A12 or E12, or a bare code for both kinds) describes it in the help page's words
     {"menu", R"(Usage: quorrel menu actions|expressions|conditions
 
 Prints the menu tree the editor receives, two spaces of indentation per level:
-a command as ID "Text", a submenu as "Text", a separator as -.
+a command as ID "Text", a submenu as "Text", a separator as -. A command or
+submenu whose state differs from the plain one shows it after the text, for
+example [grayed checked].
 )"},
     {"strings", R"(Usage: quorrel strings actions|expressions
 
