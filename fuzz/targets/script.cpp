@@ -50,10 +50,15 @@ bool hostArgs(const tool::Command& command, const abi::InfoEntry& info, uint16_t
 
 // Numbers under the array's cap that would make it materialise millions of elements are
 // legitimate work, not faults: the run skips calls with such numbers, and stops once
-// the array holds more than kMaxElements (each call can multiply the size by X).
+// the array holds more than kMaxElements (each call can multiply the size by X). A
+// boundary above 1024 is skipped whatever its size: in a table that wide, row indexes
+// wrap in 32 bits and one row edit can land anywhere below the cap.
 bool saneNumbers(const tool::Command& command) {
+  const bool boundary =
+      command.kind == tool::CommandKind::Action && (command.code == 30 || command.code == 31);
   for (const tool::Argument& arg : command.args) {
-    if (!arg.isText && arg.number > 1024 && arg.number < quorrel::ElementArray::kMaxSize) {
+    if (!arg.isText && arg.number > 1024 &&
+        (boundary || arg.number < quorrel::ElementArray::kMaxSize)) {
       return false;
     }
   }
