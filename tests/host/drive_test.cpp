@@ -4,6 +4,7 @@
 // text buffer.
 #include <cstdio>
 #include <cstring>
+#include <functional>
 
 #include "test_host.h"
 
@@ -57,6 +58,42 @@ TEST(DriveTest, CreateTakesAFullDelimiterFieldAndZeroesTheBetweenColumn) {
   instance.create();
   EXPECT_EQ(readField<int32_t>(instance.record(), kRunBetweenColumn), 0);
   EXPECT_EQ(instance.callExpression(51, {}).text, std::string(kSetupListDelimiterSize, 'x'));
+}
+
+// The simulator's own checks: each rule broken on purpose after a real call.
+TEST(HostRules, EachBrokenRuleIsCaught) {
+  Instance t;
+  t.callAction(8, {"abc"});
+  using Tamper = std::function<void(HostWord & answer, uint16_t & flagsBefore)>;
+  const auto verdict = [&](int code, std::vector<Arg> args, const Tamper& tamper) {
+    t.setFlags(0x0101);
+    HostWord answer = t.callExpressionRaw(code, std::move(args), 7);
+    uint16_t before = 0x0101;
+    tamper(answer, before);
+    try {
+      t.checkExpression(code, answer, before, 7);
+    } catch (const quorrel::hostsim::ContractError& error) {
+      return std::string(error.what());
+    }
+    return std::string("kept");
+  };
+  const std::string outOfOrder = " out of order, as the wrong type or without the host's token";
+  EXPECT_EQ(verdict(2, {0}, [](HostWord&, uint16_t&) {}), "kept");
+  EXPECT_EQ(verdict(2, {0}, [&](HostWord&, uint16_t&) { t.fetches.clear(); }),
+            "expression 2 fetched 0 parameters and declares 1");
+  EXPECT_EQ(verdict(39, {1, 1}, [&](HostWord&, uint16_t&) { t.fetches[1].first = true; }),
+            "expression 39 fetched parameter 2" + outOfOrder);
+  EXPECT_EQ(verdict(3, {0}, [&](HostWord&, uint16_t&) { t.fetches[0].token = 8; }),
+            "expression 3 fetched parameter 1" + outOfOrder);
+  EXPECT_EQ(verdict(0, {}, [](HostWord&, uint16_t& before) { before = 0x0100; }),
+            "expression 0 changed a host flag other than setting the string bit");
+  EXPECT_EQ(verdict(0, {}, [&](HostWord&, uint16_t&) { t.setFlags(0x8101); }),
+            "expression 0 answered a text with 0 buffers");
+  EXPECT_EQ(verdict(2, {0}, [&](HostWord&, uint16_t&) { t.setFlags(0x0101); }),
+            "expression 2 asked for a text buffer and answered a number");
+  EXPECT_EQ(
+      verdict(2, {0}, [&](HostWord&, uint16_t&) { t.allocations[0].first = 3; }),
+      "expression 2 did not answer its text in one buffer of the text's size (3 bytes for 3)");
 }
 
 }  // namespace
