@@ -125,11 +125,7 @@ void ElementArray::clear() {
 
 ElementArray ElementArray::emptyCopy() const {
   ElementArray copy;
-  copy.caseMode = caseMode;
-  copy.searchMode = searchMode;
-  copy.fileMode = fileMode;
-  copy.selectionMode = selectionMode;
-  copy.autoSelectNewRows = autoSelectNewRows;
+  copy.settings = settings;
   copy.labels = labels;
   copy.dimensions_ = dimensions_;
   std::copy(std::begin(boundaries_), std::end(boundaries_), copy.boundaries_);
@@ -365,7 +361,7 @@ int32_t ElementArray::tableRowCount() const {
 
 void ElementArray::syncRowStates() {
   const auto target = static_cast<std::size_t>(tableRowCount());
-  rowStates.resize(target, autoSelectNewRows == 1 ? RowSelected : RowUnselected);
+  rowStates.resize(target, settings.autoSelectNewRows ? RowSelected : RowUnselected);
   refreshAppendRange();
 }
 

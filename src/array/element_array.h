@@ -13,6 +13,7 @@
 
 #include "array/element.h"
 #include "array/element_store.h"
+#include "array/settings.h"
 
 namespace quorrel {
 
@@ -148,7 +149,6 @@ class ElementArray {
   // --- Settings ----------------------------------------------------------------------
   void setListDelimiter(const char* text);
   const char* listDelimiter() const { return delimiterText_.c_str(); }
-  void setAutoSelect(int32_t flag) { autoSelectNewRows = flag != 0 ? 1 : 0; }
 
   // --- Dimensions --------------------------------------------------------------------
   int32_t dimensions() const { return dimensions_; }
@@ -168,12 +168,7 @@ class ElementArray {
   int32_t tableRowCount() const;
   void syncRowStates();
 
-  // --- Settings read and written directly by the routines ---------------------------
-  int16_t caseMode = 0;       // 0 case insensitive, 1 case sensitive
-  int16_t searchMode = 0;     // 0 literal, 1 wildcard
-  int16_t fileMode = 0;       // 0 create or truncate, 1 append
-  int32_t selectionMode = 1;  // 0 AND, 1 OR
-  int32_t autoSelectNewRows = 0;
+  ArraySettings settings;
   // Column labels, set through recordset/: absent until the first setLabel, then one
   // entry per column as counted at the last setLabel; an entry is absent for a column
   // whose label was never set (an empty text is a label).

@@ -4,7 +4,7 @@
 
 namespace quorrel {
 
-void saveElementToFile(const ElementArray& array, int32_t index, const char* path, uint16_t mode) {
+void saveElementToFile(const ElementArray& array, int32_t index, const char* path, FileMode mode) {
   ByteBlock block;
   if (!array.getBytes(block, index)) return;
   try {

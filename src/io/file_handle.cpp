@@ -140,7 +140,7 @@ FileHandle FileHandle::openForReading(const char* path) {
   return file;
 }
 
-FileHandle FileHandle::openForWriting(const char* path, uint16_t mode) {
+FileHandle FileHandle::openForWriting(const char* path, FileMode mode) {
   if (path == nullptr) return {};
   return FileHandle(openRetrying(path, mode == FileModeAppend ? kWriteAppend : kWriteTruncate));
 }
@@ -197,7 +197,7 @@ std::string folderOf(const std::string& path) {
 
 }  // namespace
 
-void SaveFile::openInPlace(const char* path, uint16_t mode) {
+void SaveFile::openInPlace(const char* path, FileMode mode) {
   file_ = FileHandle::openForWriting(path, mode);
 }
 
@@ -218,7 +218,7 @@ SaveFile::~SaveFile() {
 
 #ifdef _WIN32
 
-SaveFile::SaveFile(const char* path, uint16_t mode) {
+SaveFile::SaveFile(const char* path, FileMode mode) {
   if (path == nullptr) return;
   const DWORD attributes = GetFileAttributesA(path);
   const bool exists = attributes != INVALID_FILE_ATTRIBUTES;
@@ -278,7 +278,7 @@ bool SaveFile::finish(bool written) {
 
 #else
 
-SaveFile::SaveFile(const char* path, uint16_t mode) {
+SaveFile::SaveFile(const char* path, FileMode mode) {
   if (path == nullptr) return;
   if (mode == FileModeAppend) {
     openInPlace(path, mode);

@@ -12,11 +12,12 @@
 #include <string>
 #include <string_view>
 
+#include "array/settings.h"
+
 namespace quorrel {
 
-// How a writer opens its file: 0 creates or truncates, 1 creates or appends. Every
-// other mode opens like 0.
-enum : uint16_t { FileModeTruncate = 0, FileModeAppend = 1 };
+// Whether a load replaces the array's contents or appends to them.
+enum LoadMode : int32_t { LoadReplace = 0, LoadAppend = 1 };
 
 class FileHandle {
  public:
@@ -32,7 +33,7 @@ class FileHandle {
   static FileHandle openForReading(const char* path);
   // Write only, binary, created with owner read and write permission when missing;
   // truncated (mode 0) or with every write at the end (mode 1).
-  static FileHandle openForWriting(const char* path, uint16_t mode);
+  static FileHandle openForWriting(const char* path, FileMode mode);
 
   bool isOpen() const { return fd_ >= 0; }
   // Bytes delivered (0 at the end of the file) or -1 on an error; retries interrupts.
@@ -62,7 +63,7 @@ class FileHandle {
 // always is. A target that cannot be opened for writing gets nothing.
 class SaveFile {
  public:
-  SaveFile(const char* path, uint16_t mode);
+  SaveFile(const char* path, FileMode mode);
   ~SaveFile();
   SaveFile(const SaveFile&) = delete;
   SaveFile& operator=(const SaveFile&) = delete;
@@ -75,7 +76,7 @@ class SaveFile {
   bool finish(bool written);
 
  private:
-  void openInPlace(const char* path, uint16_t mode);
+  void openInPlace(const char* path, FileMode mode);
   void discard();
 
   FileHandle file_;
