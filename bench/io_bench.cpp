@@ -166,7 +166,7 @@ void registerIoScenarios() {
          [=](benchmark::State& state) {
            const std::vector<char> bytes = fileBytes();
            for (auto _ : state) {
-             SaveFile file(target.c_str(), FileModeTruncate);
+             SaveFile file(target.c_str(), false);
              file.finish(file.handle().writeAll(bytes.data(), bytes.size()));
            }
          },

@@ -162,7 +162,7 @@ void saveCsvFile(ElementArray& array, const char* path, FileMode mode) {
     // The last row is padded to X cells; past the array's cap (X = 2147483647, say)
     // that is gigabytes of empty cells, so such a file is not written at all.
     if (rows * columns > ElementArray::kMaxSize) return;
-    SaveFile file(path, mode);
+    SaveFile file(path, mode == FileModeAppend);
     if (!file.isOpen()) return;
     BufferedWriter out(file.handle());
     const std::span<const Element> cells = std::as_const(array).slots();

@@ -8,7 +8,7 @@ void saveElementToFile(const ElementArray& array, int32_t index, const char* pat
   ByteBlock block;
   if (!array.getBytes(block, index)) return;
   try {
-    SaveFile file(path, mode);
+    SaveFile file(path, mode == FileModeAppend);
     if (!file.isOpen()) return;
     bool written = true;
     if (array.at(index).type() == ElementType::Value) {

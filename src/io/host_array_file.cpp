@@ -66,7 +66,7 @@ void writeHostFile(const char* path, FileMode mode, const ElementArray& array, i
   // (X × Y is checked first: with all three near 2^31 the product passes 64 bits.)
   const int64_t layer = int64_t{x} * y;
   if (layer > ElementArray::kMaxSize || layer * z > ElementArray::kMaxSize) return;
-  SaveFile file(path, mode);
+  SaveFile file(path, mode == FileModeAppend);
   if (!file.isOpen()) return;
   BufferedWriter out(file.handle());
   out.text(kHeader);

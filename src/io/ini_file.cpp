@@ -116,7 +116,7 @@ struct LoadSink {
 void saveIniFile(ElementArray& array, const char* path, FileMode mode) {
   array.settings.fileMode = mode;
   try {
-    SaveFile file(path, mode);
+    SaveFile file(path, mode == FileModeAppend);
     if (!file.isOpen()) return;
     BufferedWriter out(file.handle());
     writeSectionLine(out, kSectionName);

@@ -250,7 +250,7 @@ struct LoadSink {
 void saveNativeFile(ElementArray& array, const char* path, FileMode mode) {
   array.settings.fileMode = mode;
   try {
-    SaveFile file(path, mode);
+    SaveFile file(path, mode == FileModeAppend);
     if (!file.isOpen()) return;
     BufferedWriter out(file.handle());
     int32_t boundaries[kMaxDimensions];
