@@ -1,5 +1,6 @@
 # Native 32-bit Linux build (Debian's g++-multilib): the host tests run with
-# the pointer width and record layouts of the Windows DLL.
+# the pointer width and record layouts of the Windows DLL. Without SSE2, unlike the DLL,
+# so that the parsers' word-at-a-time paths stay under test.
 #
 # It is a cross build: the kernel of some build machines refuses 32-bit programs, so the
 # programs that run during the build are built for the build machine, and whether the
