@@ -72,8 +72,8 @@ void readBytes(const std::string& path, std::vector<char>& bytes) {
 }
 
 using Fill = void (*)(ElementArray&, int64_t);
-using Save = void (*)(ElementArray&, const char*, FileMode);
-using Load = void (*)(ElementArray&, const char*, LoadMode);
+using Save = FileStatus (*)(ElementArray&, const char*, FileMode);
+using Load = FileStatus (*)(ElementArray&, const char*, LoadMode);
 
 // Save and load of one format; the baselines move the bytes of the file the save made.
 void addFormat(const std::string& format, int64_t n, Fill fill, Save save, Load load) {
@@ -182,7 +182,8 @@ void registerIoScenarios() {
        [=](benchmark::State& state) {
          writeBytes(path, std::vector<char>(static_cast<std::size_t>(bytes), 'w'));
          for (auto _ : state) {
-           auto block = readWholeFile(path.c_str());
+           FileStatus status;
+           auto block = readWholeFile(path.c_str(), status);
            benchmark::DoNotOptimize(block);
          }
        },

@@ -12,7 +12,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static const std::string copy = quorrel::fuzzTempPath("element-copy");
   quorrel::writeFuzzFile(path, data, size);
 
-  auto block = quorrel::readWholeFile(path.c_str());
+  quorrel::FileStatus status;
+  auto block = quorrel::readWholeFile(path.c_str(), status);
   if (!block || block->size() != size) __builtin_trap();
   if (size > 0 && std::memcmp(block->data(), data, size) != 0) __builtin_trap();
 
@@ -26,7 +27,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
 
   // A file element writes back exactly the bytes it was read from.
   quorrel::saveElementToFile(array, array.size() - 1, copy.c_str(), quorrel::FileModeTruncate);
-  auto back = quorrel::readWholeFile(copy.c_str());
+  auto back = quorrel::readWholeFile(copy.c_str(), status);
   if (!back || back->size() != size) __builtin_trap();
   if (size > 0 && std::memcmp(back->data(), data, size) != 0) __builtin_trap();
   quorrel::saveElementToFile(array, 0, copy.c_str(), quorrel::FileModeAppend);

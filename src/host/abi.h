@@ -190,6 +190,10 @@ using DestroyRunObjectFn = int16_t(QUORREL_CALL*)(void* runRecord, HostWord unus
 using RunObjectFn = int16_t(QUORREL_CALL*)(void* runRecord);
 using GetRunObjectInfosFn = int16_t(QUORREL_CALL*)(HostWord unused, void* runInfo);
 using GetRunObjectDataSizeFn = int16_t(QUORREL_CALL*)(HostWord unused1, HostWord unused2);
+// QuorrelFileStatus, which the host never calls: the quorrel command's way to learn what
+// the last file action did. The failed step (0 when it was done) and the system's error
+// number.
+using FileStatusFn = int32_t(QUORREL_CALL*)(int32_t* error);
 // GetConditionInfos, GetActionInfos, GetExpressionInfos.
 using GetInfoEntryFn = const InfoEntry*(QUORREL_CALL*)(void* editorContext, int32_t code);
 // GetConditionMenu, GetActionMenu, GetExpressionMenu: a menu the host owns.

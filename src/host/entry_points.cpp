@@ -9,6 +9,7 @@
 
 #include "array/element_array.h"
 #include "array/int32.h"
+#include "host/routine_support.h"
 #include "host/run_record.h"
 #include "host/tables.h"
 
@@ -157,6 +158,11 @@ QUORREL_EXPORT int16_t QUORREL_CALL GetRunObjectInfos(HostWord, void* runInfo) {
 
 QUORREL_EXPORT int16_t QUORREL_CALL GetRunObjectDataSize(HostWord, HostWord) {
   return static_cast<int16_t>(abi::kRunRecordSize);
+}
+
+QUORREL_EXPORT int32_t QUORREL_CALL QuorrelFileStatus(int32_t* error) {
+  if (error != nullptr) *error = host::lastFileStatus.error;
+  return host::lastFileStatus.failed;
 }
 
 QUORREL_EXPORT const InfoEntry* QUORREL_CALL GetConditionInfos(void*, int32_t code) {

@@ -43,6 +43,9 @@ QUORREL_EXPORT int16_t QUORREL_CALL GetRunObjectInfos(quorrel::abi::HostWord unu
 QUORREL_EXPORT int16_t QUORREL_CALL GetRunObjectDataSize(quorrel::abi::HostWord unused1,
                                                          quorrel::abi::HostWord unused2);
 
+// Not the host's: what the last file action did, for the quorrel command.
+QUORREL_EXPORT int32_t QUORREL_CALL QuorrelFileStatus(int32_t* error);
+
 // Information entries.
 QUORREL_EXPORT const quorrel::abi::InfoEntry* QUORREL_CALL GetConditionInfos(void* editorContext,
                                                                              int32_t code);
@@ -96,6 +99,7 @@ static_assert(kHasType<&PauseRunObject, RunObjectFn>);
 static_assert(kHasType<&ContinueRunObject, RunObjectFn>);
 static_assert(kHasType<&GetRunObjectInfos, GetRunObjectInfosFn>);
 static_assert(kHasType<&GetRunObjectDataSize, GetRunObjectDataSizeFn>);
+static_assert(kHasType<&QuorrelFileStatus, FileStatusFn>);
 static_assert(kHasType<&GetConditionInfos, GetInfoEntryFn>);
 static_assert(kHasType<&GetActionInfos, GetInfoEntryFn>);
 static_assert(kHasType<&GetExpressionInfos, GetInfoEntryFn>);

@@ -12,6 +12,7 @@
 #include "array/element_array.h"
 #include "host/abi.h"
 #include "host/run_record.h"
+#include "platform/files.h"
 
 namespace quorrel::host {
 
@@ -35,6 +36,22 @@ int16_t runAction(void* runRecord, Op&& op) noexcept {
     // Nothing is reported to the host; the array stays as the operation left it.
   }
   return 0;
+}
+
+// The outcome of the last file action. The host's interface cannot carry it; the
+// quorrel command asks for it (QuorrelFileStatus). The host runs one thread.
+inline FileStatus lastFileStatus;
+
+// Runs a file operation as runAction does and keeps what it did, which the host is
+// not told. A missing array, or an exception the operation let out, is a failure of
+// the file action too.
+template <typename Op>
+int16_t runFileAction(void* runRecord, Op&& op) noexcept {
+  lastFileStatus = {FileStatus::Refused};
+  return runAction(runRecord, [&](ElementArray& array) {
+    lastFileStatus = {FileStatus::OutOfMemory};  // kept when op throws
+    lastFileStatus = op(array);
+  });
 }
 
 // --- Expression parameters -----------------------------------------------------------

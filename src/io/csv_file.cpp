@@ -140,8 +140,8 @@ void appendCells(ElementArray& target, std::shared_ptr<ByteBuffer> text, CsvShap
 
 }  // namespace
 
-std::optional<ByteBuffer> readTextFile(const char* path) {
-  std::optional<ByteBuffer> text = readFileBytes(path, 1);
+std::optional<ByteBuffer> readTextFile(const char* path, FileStatus& status) {
+  std::optional<ByteBuffer> text = readFileBytes(path, 1, status);
   if (!text) return std::nullopt;
   if (!text->reserve(text->size() + 1)) throw std::bad_alloc();
   text->data()[text->size()] = '\0';
@@ -149,7 +149,7 @@ std::optional<ByteBuffer> readTextFile(const char* path) {
   return text;
 }
 
-void saveCsvFile(ElementArray& array, const char* path, FileMode mode) {
+FileStatus saveCsvFile(ElementArray& array, const char* path, FileMode mode) {
   array.settings.fileMode = mode;
   try {
     const int64_t size = array.size();
@@ -161,9 +161,9 @@ void saveCsvFile(ElementArray& array, const char* path, FileMode mode) {
     }
     // The last row is padded to X cells; past the array's cap (X = 2147483647, say)
     // that is gigabytes of empty cells, so such a file is not written at all.
-    if (rows * columns > ElementArray::kMaxSize) return;
+    if (rows * columns > ElementArray::kMaxSize) return {FileStatus::Refused};
     SaveFile file(path, mode == FileModeAppend);
-    if (!file.isOpen()) return;
+    if (!file.isOpen()) return {FileStatus::Open, errno};
     BufferedWriter out(file.handle());
     const std::span<const Element> cells = std::as_const(array).slots();
     NumberText scratch;
@@ -175,14 +175,16 @@ void saveCsvFile(ElementArray& array, const char* path, FileMode mode) {
       }
       out.text(kLineEnd);
     }
-    file.finish(out.complete());
+    return out.finish(file);
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
 }
 
-void loadCsvFile(ElementArray& array, const char* path, LoadMode mode) {
+FileStatus loadCsvFile(ElementArray& array, const char* path, LoadMode mode) {
+  FileStatus status;
   try {
-    std::optional<ByteBuffer> read = readTextFile(path);
+    std::optional<ByteBuffer> read = readTextFile(path, status);
     std::shared_ptr<ByteBuffer> text =
         read ? std::make_shared<ByteBuffer>(std::move(*read)) : std::make_shared<ByteBuffer>();
     const CsvShape shape = shapeOf(text->data(), text->size());
@@ -195,7 +197,9 @@ void loadCsvFile(ElementArray& array, const char* path, LoadMode mode) {
       if (total > 0) appendCells(target, text, shape, total);
     });
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
+  return status;
 }
 
 }  // namespace quorrel

@@ -4,12 +4,13 @@
 
 namespace quorrel {
 
-void saveElementToFile(const ElementArray& array, int32_t index, const char* path, FileMode mode) {
+FileStatus saveElementToFile(const ElementArray& array, int32_t index, const char* path,
+                             FileMode mode) {
   ByteBlock block;
-  if (!array.getBytes(block, index)) return;
+  if (!array.getBytes(block, index)) return {FileStatus::Refused};
   try {
     SaveFile file(path, mode == FileModeAppend);
-    if (!file.isOpen()) return;
+    if (!file.isOpen()) return {FileStatus::Open, errno};
     bool written = true;
     if (array.at(index).type() == ElementType::Value) {
       const auto u = static_cast<uint32_t>(array.at(index).number());
@@ -19,13 +20,14 @@ void saveElementToFile(const ElementArray& array, int32_t index, const char* pat
     } else if (block.bytes != nullptr && block.length > 0) {
       written = file.handle().writeAll(block.bytes, static_cast<std::size_t>(block.length));
     }
-    file.finish(written);
+    return file.finish(written, written ? 0 : errno);
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
 }
 
-std::optional<ByteBuffer> readWholeFile(const char* path) {
-  return readFileBytes(path, 0);
+std::optional<ByteBuffer> readWholeFile(const char* path, FileStatus& status) {
+  return readFileBytes(path, 0, status);
 }
 
 }  // namespace quorrel

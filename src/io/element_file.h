@@ -14,11 +14,12 @@ namespace quorrel {
 // a File's bytes, a Value's 4 bytes little-endian, nothing for None. FileModeTruncate
 // creates or truncates the file, FileModeAppend appends. An index outside the array
 // touches no file.
-void saveElementToFile(const ElementArray& array, int32_t index, const char* path, FileMode mode);
+FileStatus saveElementToFile(const ElementArray& array, int32_t index, const char* path,
+                             FileMode mode);
 
 // Exactly the file's bytes (no terminator added); nothing when it cannot be opened,
 // std::bad_alloc when memory runs out.
 // A read error ends the reading with what was read so far.
-std::optional<ByteBuffer> readWholeFile(const char* path);
+std::optional<ByteBuffer> readWholeFile(const char* path, FileStatus& status);
 
 }  // namespace quorrel

@@ -1,6 +1,7 @@
 #include "io/file_handle.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <cstdlib>
 #include <cstring>
 #include <new>
@@ -43,32 +44,38 @@ bool ByteBuffer::reserve(std::size_t capacity) {
   return true;
 }
 
-bool readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare) {
+FileStatus readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare) {
   constexpr std::size_t kMinChunk = 4096;
+  constexpr FileStatus kNoMemory{FileStatus::OutOfMemory};
   // A regular file's size is known: room for all of it plus one read that finds the end.
   const std::size_t hint = std::min(file.sizeHint(), limit);
-  if (!buffer.reserve(buffer.size() + hint + spare + kMinChunk)) return false;
+  if (!buffer.reserve(buffer.size() + hint + spare + kMinChunk)) return kNoMemory;
   while (buffer.size() < limit) {
     std::size_t room = buffer.capacity() - buffer.size() - spare;
     if (room < kMinChunk) {
       const std::size_t wanted =
           std::min(std::max(buffer.capacity() * 2, buffer.capacity() + kMinChunk), limit + spare);
-      if (!buffer.reserve(wanted)) return false;
+      if (!buffer.reserve(wanted)) return kNoMemory;
       room = buffer.capacity() - buffer.size() - spare;
     }
     room = std::min(room, limit - buffer.size());
     const std::ptrdiff_t got = file.read(buffer.data() + buffer.size(), room);
-    if (got <= 0) return true;
+    if (got < 0) return {FileStatus::Read, errno};
+    if (got == 0) return {};
     buffer.setSize(buffer.size() + static_cast<std::size_t>(got));
   }
-  return true;
+  return {};
 }
 
-std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare) {
+std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare, FileStatus& status) {
   FileHandle file = FileHandle::openForReading(path);
-  if (!file.isOpen()) return std::nullopt;
+  if (!file.isOpen()) {
+    status = {FileStatus::Open, errno};
+    return std::nullopt;
+  }
   ByteBuffer buffer;
-  if (!readToEnd(file, buffer, kMaxFileBytes, spare)) throw std::bad_alloc();
+  status = readToEnd(file, buffer, kMaxFileBytes, spare);
+  if (status.failed == FileStatus::OutOfMemory) throw std::bad_alloc();
   return buffer;
 }
 
@@ -80,7 +87,10 @@ BufferedWriter::BufferedWriter(FileHandle& file)
 void BufferedWriter::bytesSlow(const char* data, std::size_t count) {
   flush();
   if (count >= kCapacity) {
-    failed_ = failed_ || !file_.writeAll(data, count);
+    if (!failed_ && !file_.writeAll(data, count)) {
+      failed_ = true;
+      error_ = errno;
+    }
     return;
   }
   std::memcpy(buffer_.get(), data, count);
@@ -88,7 +98,10 @@ void BufferedWriter::bytesSlow(const char* data, std::size_t count) {
 }
 
 void BufferedWriter::flush() {
-  if (used_ > 0 && !failed_) failed_ = !file_.writeAll(buffer_.get(), used_);
+  if (used_ > 0 && !failed_ && !file_.writeAll(buffer_.get(), used_)) {
+    failed_ = true;
+    error_ = errno;
+  }
   used_ = 0;
 }
 

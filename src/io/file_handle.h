@@ -45,17 +45,19 @@ class ByteBuffer {
 
 // Reads from the handle's position to the end of the file (or a read error, or
 // `limit` bytes) into the buffer, keeping `spare` writable bytes past the data.
-// Growth is geometric. What was read before an error stays; false when the buffer
-// could not grow (the file was not read to its end).
-bool readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare);
+// Growth is geometric. What was read before an error stays; the status tells of a
+// read error, or that the buffer could not grow (the file was not read to its end).
+FileStatus readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, std::size_t spare);
 
 // The largest file a reader takes in: what a block length can count.
 inline constexpr std::size_t kMaxFileBytes = INT32_MAX;
 
 // Opens the file read only, reads all of it (up to kMaxFileBytes) and closes it;
 // `spare` writable bytes stay past the data. Nothing when the file cannot be opened;
-// throws std::bad_alloc when memory runs out, so that no load takes half a file.
-std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare);
+// `status` tells why, or of a read error after which the bytes read so far are
+// returned. Throws std::bad_alloc when memory runs out, so that no load takes half a
+// file.
+std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare, FileStatus& status);
 
 // Collects output in large blocks so a file is written in few system calls; flushes
 // when destroyed. Numbers are written little-endian. After a refused write the rest
@@ -101,10 +103,10 @@ class BufferedWriter {
   void flush();
   // True once the system refused a write.
   bool failed() const { return failed_; }
-  // Flushes and tells whether every byte was written.
-  bool complete() {
+  // Flushes and hands the save over to be flushed to the disk and put in place.
+  FileStatus finish(SaveFile& file) {
     flush();
-    return !failed_;
+    return file.finish(!failed_, error_);
   }
 
   static char* putLE16(char* p, uint16_t v) {
@@ -128,6 +130,7 @@ class BufferedWriter {
   std::unique_ptr<char[]> buffer_;
   std::size_t used_ = 0;
   bool failed_ = false;
+  int error_ = 0;  // the system's reason for the refused write
 };
 
 }  // namespace quorrel

@@ -56,8 +56,8 @@ void writeCell(BufferedWriter& out, const ElementArray& array, int32_t k, Number
 
 // Writes the header, the sizes (0 written and counted as 1) and every cell (an empty
 // text past the elements). Nothing when X x Y x Z is past ElementArray::kMaxSize.
-void writeHostFile(const char* path, FileMode mode, const ElementArray& array, int32_t x, int32_t y,
-                   int32_t z) {
+FileStatus writeHostFile(const char* path, FileMode mode, const ElementArray& array, int32_t x,
+                         int32_t y, int32_t z) {
   x = atLeastOne(x);
   y = atLeastOne(y);
   z = atLeastOne(z);
@@ -65,9 +65,11 @@ void writeHostFile(const char* path, FileMode mode, const ElementArray& array, i
   // empty cells: such a file is not written at all.
   // (X × Y is checked first: with all three near 2^31 the product passes 64 bits.)
   const int64_t layer = int64_t{x} * y;
-  if (layer > ElementArray::kMaxSize || layer * z > ElementArray::kMaxSize) return;
+  if (layer > ElementArray::kMaxSize || layer * z > ElementArray::kMaxSize) {
+    return {FileStatus::Refused};
+  }
   SaveFile file(path, mode == FileModeAppend);
-  if (!file.isOpen()) return;
+  if (!file.isOpen()) return {FileStatus::Open, errno};
   BufferedWriter out(file.handle());
   out.text(kHeader);
   out.i32(kVersion);
@@ -82,7 +84,7 @@ void writeHostFile(const char* path, FileMode mode, const ElementArray& array, i
       for (int32_t k1 = 0; k1 < x; ++k1) writeCell(out, array, addWrap(row, k1), scratch);
     }
   }
-  file.finish(out.complete());
+  return out.finish(file);
 }
 
 // The number of cells X x Y x Z, or -1 when a size is negative or the product does
@@ -175,21 +177,23 @@ struct LoadSink {
 
 }  // namespace
 
-void saveHostArrayFile(ElementArray& array, const char* path, FileMode mode) {
+FileStatus saveHostArrayFile(ElementArray& array, const char* path, FileMode mode) {
   array.settings.fileMode = mode;
   try {
     const int32_t x = array.boundary(1);
     const int32_t y = array.boundary(2);
     const int32_t z = addWrap(divTrunc(array.size(), mulWrap(atLeastOne(x), atLeastOne(y))), 1);
-    writeHostFile(path, mode, array, x, y, z);
+    return writeHostFile(path, mode, array, x, y, z);
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
 }
 
-void loadHostArrayFile(ElementArray& array, const char* path, LoadMode mode) {
+FileStatus loadHostArrayFile(ElementArray& array, const char* path, LoadMode mode) {
   const bool replace = mode == LoadReplace;
+  FileStatus status;
   try {
-    std::optional<ByteBuffer> read = readFileBytes(path, 1);
+    std::optional<ByteBuffer> read = readFileBytes(path, 1, status);
     const auto bytes = read ? std::make_shared<ByteBuffer>(std::move(*read)) : nullptr;
     io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
       LoadSink sink{target, replace};
@@ -199,7 +203,9 @@ void loadHostArrayFile(ElementArray& array, const char* path, LoadMode mode) {
       if (replace && !sink.headerSeen) target.setDimensions(0);
     });
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
+  return status;
 }
 
 }  // namespace quorrel

@@ -113,11 +113,11 @@ struct LoadSink {
 
 }  // namespace
 
-void saveIniFile(ElementArray& array, const char* path, FileMode mode) {
+FileStatus saveIniFile(ElementArray& array, const char* path, FileMode mode) {
   array.settings.fileMode = mode;
   try {
     SaveFile file(path, mode == FileModeAppend);
-    if (!file.isOpen()) return;
+    if (!file.isOpen()) return {FileStatus::Open, errno};
     BufferedWriter out(file.handle());
     writeSectionLine(out, kSectionName);
     NumberText keyScratch;
@@ -127,14 +127,16 @@ void saveIniFile(ElementArray& array, const char* path, FileMode mode) {
       writeEntry(out, key, e.asString(valueScratch));
     }
     out.text(kLineEnd);
-    file.finish(out.complete());
+    return out.finish(file);
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
 }
 
-void loadIniFile(ElementArray& array, const char* path, LoadMode mode) {
+FileStatus loadIniFile(ElementArray& array, const char* path, LoadMode mode) {
+  FileStatus status;
   try {
-    std::optional<ByteBuffer> read = readTextFile(path);
+    std::optional<ByteBuffer> read = readTextFile(path, status);
     const auto text = read ? std::make_shared<ByteBuffer>(std::move(*read)) : nullptr;
     io_detail::loadAllOrNothing(array, mode == LoadReplace, [&](ElementArray& target) {
       if (!text) return;
@@ -145,7 +147,9 @@ void loadIniFile(ElementArray& array, const char* path, LoadMode mode) {
       run.flush();
     });
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
+  return status;
 }
 
 }  // namespace quorrel

@@ -10,9 +10,9 @@
 
 namespace quorrel {
 
-void saveIniFile(ElementArray& array, const char* path, FileMode mode);
+FileStatus saveIniFile(ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array first; dimensions, boundaries and labels stay. Each entry
 // appends its value (none for a line without "=") with its key as a String key.
-void loadIniFile(ElementArray& array, const char* path, LoadMode mode);
+FileStatus loadIniFile(ElementArray& array, const char* path, LoadMode mode);
 
 }  // namespace quorrel

@@ -247,11 +247,11 @@ struct LoadSink {
 
 }  // namespace
 
-void saveNativeFile(ElementArray& array, const char* path, FileMode mode) {
+FileStatus saveNativeFile(ElementArray& array, const char* path, FileMode mode) {
   array.settings.fileMode = mode;
   try {
     SaveFile file(path, mode == FileModeAppend);
-    if (!file.isOpen()) return;
+    if (!file.isOpen()) return {FileStatus::Open, errno};
     BufferedWriter out(file.handle());
     int32_t boundaries[kMaxDimensions];
     for (int32_t d = 0; d < kMaxDimensions; ++d) boundaries[d] = array.boundary(d + 1);
@@ -266,15 +266,17 @@ void saveNativeFile(ElementArray& array, const char* path, FileMode mode) {
     }
     out.i32(array.size());
     for (const Element& e : array.slots()) writeRecord(out, halfOf(&e), halfOf(e.key()));
-    file.finish(out.complete());
+    return out.finish(file);
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
 }
 
-void loadNativeFile(ElementArray& array, const char* path, LoadMode mode) {
+FileStatus loadNativeFile(ElementArray& array, const char* path, LoadMode mode) {
   const bool replace = mode == LoadReplace;
+  FileStatus status;
   try {
-    std::optional<ByteBuffer> read = readFileBytes(path, 0);
+    std::optional<ByteBuffer> read = readFileBytes(path, 0, status);
     const auto bytes = read ? std::make_shared<const ByteBuffer>(std::move(*read)) : nullptr;
     io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
       LoadSink sink{target, replace};
@@ -287,7 +289,9 @@ void loadNativeFile(ElementArray& array, const char* path, LoadMode mode) {
       }
     });
   } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
   }
+  return status;
 }
 
 }  // namespace quorrel

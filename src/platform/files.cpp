@@ -18,7 +18,10 @@ FileHandle& FileHandle::operator=(FileHandle&& other) noexcept {
 }
 
 FileHandle FileHandle::openForReading(const char* path) {
-  if (path == nullptr) return {};
+  if (path == nullptr) {
+    errno = EINVAL;
+    return {};
+  }
   FileHandle file(fsys::open(path, fsys::OpenFor::Reading));
   if (!file.isOpen()) return file;
   fsys::Kind kind{};
@@ -26,12 +29,17 @@ FileHandle FileHandle::openForReading(const char* path) {
   if (!fsys::examine(file.fd_, kind, size) ||
       (kind != fsys::Kind::Regular && kind != fsys::Kind::Pipe) || !fsys::readable(file.fd_)) {
     file.close();
+    // The reason a caller can tell the user; a device has no fitting error number.
+    errno = kind == fsys::Kind::Directory ? EISDIR : 0;
   }
   return file;
 }
 
 FileHandle FileHandle::openForWriting(const char* path, bool append) {
-  if (path == nullptr) return {};
+  if (path == nullptr) {
+    errno = EINVAL;
+    return {};
+  }
   return FileHandle(
       fsys::open(path, append ? fsys::OpenFor::Appending : fsys::OpenFor::Truncating));
 }
@@ -81,6 +89,22 @@ void SaveFile::openInPlace(const char* path, bool append) {
 
 SaveFile::~SaveFile() {
   discard();
+}
+
+FileStatus SaveFile::finish(bool written, int writeError) {
+  if (!isOpen()) return {FileStatus::Open};
+  FileStatus status;
+  if (!written) {
+    status = {FileStatus::Write, writeError};
+  } else if (!file_.sync()) {
+    status = {FileStatus::Flush, errno};
+  }
+  // A close that fails has lost a write.
+  if (!file_.close() && status.ok()) status = {FileStatus::Write, errno};
+  if (temp_.empty()) return status;
+  if (status.ok()) status = replaceTarget();
+  if (!status.ok()) discard();
+  return status;
 }
 
 }  // namespace quorrel

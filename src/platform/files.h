@@ -8,6 +8,16 @@
 
 namespace quorrel {
 
+// What a file operation did: Done, or the step at which it stopped, with the system's
+// error number where it gave one. Refused: the operation chose to write nothing (an
+// element that is not there, a table too large for its format).
+struct FileStatus {
+  enum Step : uint8_t { Done, Open, Read, Write, Flush, Replace, OutOfMemory, Refused };
+  Step failed = Done;
+  int error = 0;
+  bool ok() const { return failed == Done; }
+};
+
 class FileHandle {
  public:
   FileHandle() = default;
@@ -60,12 +70,14 @@ class SaveFile {
   bool isOpen() const { return file_.isOpen(); }
   FileHandle& handle() { return file_; }
   // Flushes to the disk and puts the temporary file in place. With `written` false (a
-  // write failed), or when the flush or the replacement fails, the temporary file is
-  // removed and the target keeps its old bytes. True when the save is complete.
-  bool finish(bool written);
+  // write failed, with `writeError`), or when the flush or the replacement fails, the
+  // temporary file is removed and the target keeps its old bytes.
+  FileStatus finish(bool written, int writeError = 0);
 
  private:
   void openInPlace(const char* path, bool append);
+  // Puts the flushed and closed temporary file in the target's place.
+  FileStatus replaceTarget();
   void discard();
 
   FileHandle file_;

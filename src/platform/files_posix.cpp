@@ -98,7 +98,10 @@ std::string folderOf(const std::string& path) {
 }  // namespace
 
 SaveFile::SaveFile(const char* path, bool append) {
-  if (path == nullptr) return;
+  if (path == nullptr) {
+    errno = EINVAL;
+    return;
+  }
   if (append) {
     openInPlace(path, append);
     return;
@@ -161,15 +164,8 @@ void SaveFile::discard() {
   temp_.clear();
 }
 
-bool SaveFile::finish(bool written) {
-  if (!isOpen()) return false;
-  bool ok = written && file_.sync();
-  ok = file_.close() && ok;
-  if (temp_.empty()) return ok;
-  if (!ok || ::rename(temp_.c_str(), target_.c_str()) != 0) {
-    discard();
-    return false;
-  }
+FileStatus SaveFile::replaceTarget() {
+  if (::rename(temp_.c_str(), target_.c_str()) != 0) return {FileStatus::Replace, errno};
   temp_.clear();
   // The new name is on the disk once the folder is.
   const std::string folder = folderOf(target_);
@@ -178,7 +174,7 @@ bool SaveFile::finish(bool written) {
     file_system::sync(dir);
     ::close(dir);
   }
-  return true;
+  return {};
 }
 
 void* allocateHugePages(std::size_t capacity) {

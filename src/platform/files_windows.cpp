@@ -28,6 +28,13 @@ int openRetrying(const char* path, int flags) {
   do {
     fd = _open(path, flags | _O_BINARY, _S_IREAD | _S_IWRITE);
   } while (fd < 0 && errno == EINTR);
+  // The runtime says "permission denied" for a folder; say what POSIX systems say.
+  if (fd < 0 && errno == EACCES) {
+    const DWORD attributes = GetFileAttributesA(path);
+    if (attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY)) {
+      errno = EISDIR;
+    }
+  }
   return fd;
 }
 
@@ -93,7 +100,10 @@ std::string folderOf(const std::string& path) {
 }  // namespace
 
 SaveFile::SaveFile(const char* path, bool append) {
-  if (path == nullptr) return;
+  if (path == nullptr) {
+    errno = EINVAL;
+    return;
+  }
   const DWORD attributes = GetFileAttributesA(path);
   const bool exists = attributes != INVALID_FILE_ATTRIBUTES;
   if (append ||
@@ -143,18 +153,13 @@ void SaveFile::discard() {
   temp_.clear();
 }
 
-bool SaveFile::finish(bool written) {
-  if (!isOpen()) return false;
-  bool ok = written && file_.sync();
-  ok = file_.close() && ok;
-  if (temp_.empty()) return ok;
-  if (ok && MoveFileExA(temp_.c_str(), target_.c_str(),
-                        MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH)) {
-    temp_.clear();
-    return true;
+FileStatus SaveFile::replaceTarget() {
+  if (!MoveFileExA(temp_.c_str(), target_.c_str(),
+                   MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH)) {
+    return {FileStatus::Replace};
   }
-  discard();
-  return false;
+  temp_.clear();
+  return {};
 }
 
 void* allocateHugePages(std::size_t) {

@@ -46,21 +46,37 @@ TEST_F(ElementFile, ReadsWholeFilesOfAnySize) {
   for (size_t i = 0; i < big.size(); ++i) big[i] = static_cast<char>((i * 2654435761u) >> 13);
   for (const std::string& bytes : {big, std::string()}) {
     writeBytes(path("in.bin"), bytes);
-    auto block = readWholeFile(path("in.bin").c_str());
+    FileStatus status{FileStatus::Read, 1};
+    auto block = readWholeFile(path("in.bin").c_str(), status);
     ASSERT_TRUE(block.has_value());
+    EXPECT_TRUE(status.ok());
     EXPECT_TRUE(blockText(*block) == bytes);
     // Passed through a File element, the bytes come out unchanged.
     ElementArray a;
     a.appendFile({block->data(), static_cast<int32_t>(block->size())});
-    saveElementToFile(a, 0, path("out.bin").c_str(), FileModeTruncate);
+    EXPECT_TRUE(saveElementToFile(a, 0, path("out.bin").c_str(), FileModeTruncate).ok());
     EXPECT_TRUE(readBytes(path("out.bin")) == bytes);
   }
-  EXPECT_FALSE(readWholeFile(path("missing.bin").c_str()).has_value());
-  EXPECT_FALSE(readWholeFile(dir_.string().c_str()).has_value());
-  EXPECT_FALSE(readWholeFile(nullptr).has_value());
+  // A file that cannot be read gives nothing, and says which step failed and why.
+  const auto failure = [](const char* file) {
+    FileStatus status;
+    const bool read = readWholeFile(file, status).has_value();
+    return std::to_string(read) + " " + std::to_string(status.failed) + " " +
+           std::to_string(status.error);
+  };
+  EXPECT_EQ(failure(path("missing.bin").c_str()), "0 1 " + std::to_string(ENOENT));
+  EXPECT_EQ(failure(dir_.string().c_str()), "0 1 " + std::to_string(EISDIR));
+  EXPECT_EQ(failure(nullptr), "0 1 " + std::to_string(EINVAL));
+  // Saves say the same: an element that is not there writes nothing.
+  ElementArray one;
+  one.appendString("x");
+  EXPECT_EQ(saveElementToFile(one, 1, path("none.bin").c_str(), FileModeTruncate).failed,
+            FileStatus::Refused);
+  EXPECT_EQ(saveElementToFile(one, 0, path("no/such/dir").c_str(), FileModeTruncate).error, ENOENT);
 #ifdef __linux__
   // Files under /proc report size 0, so the buffer has to grow as it reads.
-  auto maps = readWholeFile("/proc/self/maps");
+  FileStatus status;
+  auto maps = readWholeFile("/proc/self/maps", status);
   ASSERT_TRUE(maps.has_value());
   ASSERT_GT(maps->size(), 0u);
   EXPECT_EQ(maps->data()[maps->size() - 1], '\n');

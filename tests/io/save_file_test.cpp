@@ -161,13 +161,15 @@ TEST_F(SaveFileTest, ReadOnlyFolderWritesInPlaceAndReadOnlyFileKeepsItsBytes) {
 // Reads take regular files and pipes only, and never wait on a pipe without a writer.
 TEST_F(SaveFileTest, ReadsRefuseDevicesAndDoNotWaitOnPipes) {
   ASSERT_EQ(mkfifo(path("pipe").c_str(), 0600), 0);
-  const auto pipe = readWholeFile(path("pipe").c_str());
+  FileStatus status;
+  const auto pipe = readWholeFile(path("pipe").c_str(), status);
   ASSERT_TRUE(pipe.has_value());
   EXPECT_EQ(pipe->size(), 0u);
   for (const char* device : {"/dev/zero", "/dev/null"}) {
-    EXPECT_FALSE(readWholeFile(device).has_value()) << device;
+    EXPECT_FALSE(readWholeFile(device, status).has_value()) << device;
+    EXPECT_EQ(status.failed, FileStatus::Open) << device;
   }
-  EXPECT_FALSE(readWholeFile(dir_.c_str()).has_value());
+  EXPECT_FALSE(readWholeFile(dir_.c_str(), status).has_value());
 }
 
 // A disk that fills during the save: the target keeps its old bytes and no

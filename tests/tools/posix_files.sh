@@ -18,10 +18,10 @@ check() {  # expected-status expected-stderr command...
 }
 check 1 "quorrel: cannot read /dev/null: it is not a regular file" inspect /dev/null
 check 1 "quorrel: cannot read /dev/zero: it is not a regular file" convert /dev/zero o.arr
-echo 'A 8 "x"' >t.qs
-echo 'A 0 "/dev/null/x.arr"' >>t.qs
-check 0 't.qs:2: warning: saveToFile cannot write "/dev/null/x.arr": Not a directory' \
-  run --warn-files t.qs
+# A file action that fails is named with the step that failed; the run goes on.
+printf 'A 8 "x"\nA 0 "/dev/null/x.arr"\nA 0 "/dev/full"\n' >t.qs
+check 0 't.qs:2: warning: saveToFile "/dev/null/x.arr": could not open it (Not a directory)
+t.qs:3: warning: saveToFile "/dev/full": could not write it (No space left on device)' run t.qs
 if [[ $(id -u) != 0 ]]; then
   printf 'a,b\r\n' >locked.csv && chmod 000 locked.csv
   check 1 "quorrel: cannot read locked.csv: Permission denied" inspect locked.csv

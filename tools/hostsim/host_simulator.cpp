@@ -320,6 +320,14 @@ const RoutineTables& Module::routines() const {
   return *routines_;
 }
 
+std::optional<std::pair<int32_t, int32_t>> Module::fileStatus() const {
+  const auto status = optional<abi::FileStatusFn>(*this, "QuorrelFileStatus");
+  if (!status) return std::nullopt;
+  int32_t error = 0;
+  const int32_t step = status(&error);
+  return std::make_pair(step, error);
+}
+
 // ---------------------------------------------------------------------------------
 // The host side of one instance: its run record, the run-time header holding the
 // services, and the buffers of the last expression's text results.

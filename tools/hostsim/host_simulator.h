@@ -12,6 +12,7 @@
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "hostsim/records.h"
@@ -85,6 +86,10 @@ class Module {
   // The menu tree of "actions", "expressions" or "conditions", walked with the menu
   // services and then handed back (the host owns the menus it is given).
   std::vector<MenuItem> menu(std::string_view which) const;
+
+  // What the last file action did: the failed step (0: done) and the system's error
+  // number, from the module's QuorrelFileStatus; nothing when the module has none.
+  std::optional<std::pair<int32_t, int32_t>> fileStatus() const;
 
   // Looks up an exported symbol; null when absent.
   void* symbol(const char* name) const;

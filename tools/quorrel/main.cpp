@@ -35,7 +35,7 @@ Options:
 
 const std::map<std::string, const char*> kCommandHelp = {
     {"run", R"(Usage: quorrel run FILE
-       quorrel run [--echo] [--warn-files] FILE
+       quorrel run [--echo] [--no-warn-files] FILE
 
 Runs a script: one command per line; blank lines and lines starting with # are
 ignored. FILE - reads the script from standard input.
@@ -54,9 +54,14 @@ Every expression call is checked against the host's rules (parameters fetched as
 declared, host flags, one text buffer of the text's size); a module that breaks
 one stops the run with status 1.
 
-  --echo          print each E line beside its result: 12: E size(  →  3
-  --warn-files    warn on standard error when a file action names a path it
-                  cannot open; output and exit status stay the same
+A file action that fails (a file that cannot be opened, read, written, flushed
+or put in place) is named in a warning on standard error, with the step that
+failed; output and exit status stay the same. A script that is a directory or
+cannot be read is an error with status 1.
+
+  --echo           print each E line beside its result: 12: E size(  →  3
+  --no-warn-files  no warnings about failed file actions (--warn-files, the
+                   default, is still taken)
 )"},
     {"shell", R"(Usage: quorrel shell
        quorrel shell [--echo] [--no-warn-files]
@@ -121,7 +126,7 @@ struct Options {
   quorrel::tool::ConvertOptions convert;
   quorrel::tool::ViewOptions view;
   quorrel::tool::RunOptions run;
-  bool warnFilesGiven = false, noWarnFiles = false;
+  bool noWarnFiles = false;
   bool help = false, version = false;
   std::vector<std::pair<std::string, std::string>> owned;  // option, the command it needs
   std::vector<std::string> words;                          // the command and its operands
@@ -181,11 +186,10 @@ Options parseOptions(int argc, char** argv) {
       options.run.echo = true;
       belongs("run");
     } else if (arg == "--warn-files") {
-      options.warnFilesGiven = true;
       belongs("run");
     } else if (arg == "--no-warn-files") {
       options.noWarnFiles = true;
-      belongs("shell");
+      belongs("run");
     } else if (arg.size() > 1 && arg[0] == '-') {
       if (options.mistake.empty()) options.mistake = "unknown option " + arg;
     } else {
@@ -212,10 +216,9 @@ void expectKind(const std::string& kind, std::initializer_list<const char*> allo
 int dispatch(Options options) {
   const std::string& command = options.words[0];
   for (const auto& [option, owner] : options.owned) {
-    // --echo and --warn-files serve the shell as well as run.
+    // --echo and the file warnings' options serve the shell as well as run.
     const bool shared = owner == "run" && command == "shell";
-    const bool shellOnly = owner == "shell" && command == "shell";
-    if (owner != command && !shared && !shellOnly) {
+    if (owner != command && !shared) {
       throw UsageError(option + " belongs to " + (owner == "run" ? "run and shell" : owner));
     }
   }
@@ -251,14 +254,9 @@ int dispatch(Options options) {
   const quorrel::tool::ModuleLoader loader(
       options.module.empty() ? quorrel::tool::defaultModulePath() : options.module);
   const auto& words = options.words;
-  if (command == "run") {
-    options.run.warnFiles = options.warnFilesGiven;
-    return quorrel::tool::runCommand(loader, words[1], options.run);
-  }
-  if (command == "shell") {
-    options.run.warnFiles = !options.noWarnFiles;
-    return quorrel::tool::shellCommand(loader, options.run);
-  }
+  options.run.warnFiles = !options.noWarnFiles;
+  if (command == "run") return quorrel::tool::runCommand(loader, words[1], options.run);
+  if (command == "shell") return quorrel::tool::shellCommand(loader, options.run);
   const auto& module = loader.get();
   if (command == "inspect") return quorrel::tool::inspectCommand(module, words[1], options.view);
   if (command == "convert") {

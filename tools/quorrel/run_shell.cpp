@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <filesystem>
 #include <fstream>
 #include <iostream>
 #include <optional>
@@ -80,6 +81,10 @@ std::pair<std::string_view, std::string_view> firstWord(std::string_view line) {
 
 int runCommand(const ModuleLoader& module, const std::string& path, const RunOptions& options) {
   if (path == "-") return runScript(module, std::cin, "<stdin>", std::cout, std::cerr, options);
+  std::error_code error;
+  if (std::filesystem::is_directory(path, error)) {
+    throw FileError("cannot read " + path + ": it is a directory");
+  }
   std::ifstream in(path, std::ios::binary);
   if (!in) throw FileError("cannot read " + path + ": " + std::strerror(errno));
   return runScript(module, in, path, std::cout, std::cerr, options);

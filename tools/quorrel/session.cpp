@@ -42,35 +42,28 @@ void Session::replaceInstance(const SetupFields& setup) {
   instance_ = std::make_unique<Instance>(module_.get(), setup);
 }
 
-std::optional<std::string> fileProblem(const std::string& path, FileUse use) {
-  namespace fs = std::filesystem;
-  std::error_code error;
-  const auto status = fs::status(path, error);
-  if (fs::is_directory(status)) return "it is a directory";
-  if (use == FileUse::Read) {
-    if (!fs::exists(status)) return std::string(std::strerror(ENOENT));
-    if (!std::ifstream(path, std::ios::binary)) return std::string(std::strerror(errno));
-    return std::nullopt;
-  }
-  // Writing: open without truncating, and remove what the test itself created.
-  const bool existed = fs::exists(status);
-  if (!std::ofstream(path, std::ios::binary | std::ios::app)) {
-    return std::string(std::strerror(errno));
-  }
-  if (!existed) fs::remove(path, error);
-  return std::nullopt;
-}
+// The steps of a file action that can fail, as the module numbers them.
+constexpr const char* kFailedSteps[] = {"",
+                                        "could not open it",
+                                        "could not read it",
+                                        "could not write it",
+                                        "could not flush it to the disk",
+                                        "could not put the new file in place",
+                                        "ran out of memory",
+                                        "wrote nothing (no such element, or more cells "
+                                        "than the format holds)"};
 
 void Session::warnAboutFile(int32_t code, const std::vector<Argument>& args, const Where& where) {
   const ActionEntry& entry = actionEntry(code);
   if (entry.file == FileUse::None || !warnings_) return;
-  const std::string& path = args[entry.pathParam].text;
-  const auto problem = fileProblem(path, entry.file);
-  if (!problem) return;
-  static constexpr const char* kVerbs[] = {"", "read", "write", "append to"};
-  *warnings_ << where.file << ':' << where.line << ": warning: " << entry.name << " cannot "
-             << kVerbs[static_cast<int>(entry.file)] << ' ' << quoteText(path) << ": " << *problem
-             << '\n';
+  const auto status = module_.get().fileStatus();
+  if (!status || status->first == 0) return;
+  const auto step = static_cast<size_t>(status->first);
+  *warnings_ << where.file << ':' << where.line << ": warning: " << entry.name << ' '
+             << quoteText(args[entry.pathParam].text) << ": "
+             << (step < std::size(kFailedSteps) ? kFailedSteps[step] : "failed");
+  if (status->second != 0) *warnings_ << " (" << std::strerror(status->second) << ')';
+  *warnings_ << '\n';
 }
 
 void Session::execute(const Command& command, std::ostream& out, const Where& where) {
@@ -93,8 +86,8 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
       const std::string what = "action " + std::to_string(code);
       checkArguments(module_.get().actionSignature(code), command.args, what,
                      abi::kActionParamText);
-      if (options_.warnFiles) warnAboutFile(code, command.args, where);
       instance().callAction(code, command.args);
+      if (options_.warnFiles) warnAboutFile(code, command.args, where);
       return;
     }
     case CommandKind::Expression: {

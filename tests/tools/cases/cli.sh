@@ -15,6 +15,7 @@ q strings conditions
 q --bogus run x.qs
 q run x.qs --module
 q run missing.qs
+q run .
 echo 'E 0' >ok.qs
 q --module ./no-such-module.so run ok.qs
 q run ok.qs --module=./no-such-module.so
