@@ -17,7 +17,7 @@ _quorrel() {
   local options
   case $command in
     "") COMPREPLY=($(compgen -W "run shell inspect convert list menu strings --module --help --version" -- "$cur")); return ;;
-    run) options="--echo --warn-files --help" ;;
+    run) options="--echo --no-warn-files --help" ;;
     shell) options="--echo --no-warn-files --help" ;;
     inspect) options="--rows --all --width --help" ;;
     convert) options="--from --to --force --help" ;;
