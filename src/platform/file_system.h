@@ -4,6 +4,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <string>
 
 namespace quorrel::file_system {
 
@@ -21,5 +22,14 @@ std::ptrdiff_t read(int fd, char* into, std::size_t count);
 std::ptrdiff_t write(int fd, const char* bytes, std::size_t count);
 // False when the descriptor cannot be examined.
 bool examine(int fd, Kind& kind, int64_t& size);
+// The characters that end a path's folder part.
+extern const char* const kFolderSeparators;
 
 }  // namespace quorrel::file_system
+
+namespace quorrel {
+
+// The folder part of a path, with its separator; "" for a bare name.
+std::string folderOf(const std::string& path);
+
+}  // namespace quorrel

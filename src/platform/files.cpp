@@ -87,6 +87,21 @@ void SaveFile::openInPlace(const char* path, bool append) {
   file_ = FileHandle::openForWriting(path, append);
 }
 
+SaveFile::SaveFile(const char* path, bool append) {
+  if (path == nullptr) {
+    errno = EINVAL;
+  } else if (append) {
+    openInPlace(path, append);
+  } else {
+    openReplacing(path);
+  }
+}
+
+std::string folderOf(const std::string& path) {
+  const std::size_t cut = path.find_last_of(fsys::kFolderSeparators);
+  return cut == std::string::npos ? std::string() : path.substr(0, cut + 1);
+}
+
 SaveFile::~SaveFile() {
   discard();
 }

@@ -76,6 +76,8 @@ class SaveFile {
 
  private:
   void openInPlace(const char* path, bool append);
+  // A whole-file save: through a temporary file where the system allows one.
+  void openReplacing(const char* path);
   // Puts the flushed and closed temporary file in the target's place.
   FileStatus replaceTarget();
   void discard();

@@ -85,27 +85,11 @@ bool examine(int fd, Kind& kind, int64_t& size) {
   return true;
 }
 
+const char* const kFolderSeparators = "/";
+
 }  // namespace file_system
 
-namespace {
-
-// The folder part of a path, with its separator; "" for a bare name.
-std::string folderOf(const std::string& path) {
-  const std::size_t cut = path.rfind('/');
-  return cut == std::string::npos ? std::string() : path.substr(0, cut + 1);
-}
-
-}  // namespace
-
-SaveFile::SaveFile(const char* path, bool append) {
-  if (path == nullptr) {
-    errno = EINVAL;
-    return;
-  }
-  if (append) {
-    openInPlace(path, append);
-    return;
-  }
+void SaveFile::openReplacing(const char* path) {
   // A link is followed to the file it names, which is the one replaced. A dangling
   // link is written through, creating the file it names.
   std::string target = path;
@@ -113,14 +97,14 @@ SaveFile::SaveFile(const char* path, bool append) {
   if (::lstat(path, &st) == 0 && S_ISLNK(st.st_mode)) {
     std::unique_ptr<char, void (*)(void*)> real(::realpath(path, nullptr), std::free);
     if (real == nullptr) {
-      openInPlace(path, append);
+      openInPlace(path, false);
       return;
     }
     target = real.get();
   }
   const bool exists = ::stat(target.c_str(), &st) == 0;
   if (exists && (!S_ISREG(st.st_mode) || st.st_nlink > 1)) {
-    openInPlace(path, append);
+    openInPlace(path, false);
     return;
   }
   FileHandle existing;
@@ -136,7 +120,7 @@ SaveFile::SaveFile(const char* path, bool append) {
     if (existing.isOpen() && ::ftruncate(existing.fd_, 0) == 0) {
       file_ = std::move(existing);
     } else if (!exists) {
-      openInPlace(path, append);
+      openInPlace(path, false);
     }
     return;
   }

@@ -87,28 +87,15 @@ bool examine(int fd, Kind& kind, int64_t& size) {
   return true;
 }
 
+const char* const kFolderSeparators = "/\\:";
+
 }  // namespace file_system
 
-namespace {
-
-// The folder part of a path, with its separator; "" for a bare name.
-std::string folderOf(const std::string& path) {
-  const std::size_t cut = path.find_last_of("/\\:");
-  return cut == std::string::npos ? std::string() : path.substr(0, cut + 1);
-}
-
-}  // namespace
-
-SaveFile::SaveFile(const char* path, bool append) {
-  if (path == nullptr) {
-    errno = EINVAL;
-    return;
-  }
+void SaveFile::openReplacing(const char* path) {
   const DWORD attributes = GetFileAttributesA(path);
   const bool exists = attributes != INVALID_FILE_ATTRIBUTES;
-  if (append ||
-      (exists && (attributes & (FILE_ATTRIBUTE_DIRECTORY | FILE_ATTRIBUTE_REPARSE_POINT)))) {
-    openInPlace(path, append);
+  if (exists && (attributes & (FILE_ATTRIBUTE_DIRECTORY | FILE_ATTRIBUTE_REPARSE_POINT))) {
+    openInPlace(path, false);
     return;
   }
   FileHandle existing;
@@ -121,7 +108,7 @@ SaveFile::SaveFile(const char* path, bool append) {
     if (GetFileType(handle) != FILE_TYPE_DISK || !GetFileInformationByHandle(handle, &info) ||
         info.nNumberOfLinks > 1) {
       existing.close();
-      openInPlace(path, append);
+      openInPlace(path, false);
       return;
     }
     existing.close();
@@ -129,14 +116,14 @@ SaveFile::SaveFile(const char* path, bool append) {
   std::string folder = folderOf(path);
   char temp[MAX_PATH + 1];
   if (GetTempFileNameA(folder.empty() ? "." : folder.c_str(), "qrl", 0, temp) == 0) {
-    openInPlace(path, append);
+    openInPlace(path, false);
     return;
   }
   temp_ = temp;
   file_ = FileHandle(file_system::open(temp, file_system::OpenFor::Truncating));
   if (!file_.isOpen()) {
     discard();
-    openInPlace(path, append);
+    openInPlace(path, false);
     return;
   }
   if (exists) {
