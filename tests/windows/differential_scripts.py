@@ -40,7 +40,7 @@ OUTPUTS = ["out.arr", "out.mmf", "out.csv", "out.ini", "out.bin", "two words.txt
 TEXTS = ["", ",", ";;", "*", "?", "a?c*", "*x*", "x" * 300, "y" * 2000, "1,2,3",
          "-2147483648", "2147483647", "2147483648", "99999999999", " 42 ", "+7", "-0",
          "3.75", "1e3", "0x1F", '"q",""', "name", "score", "note", "Ann", "ann", "ANN",
-         "\u00c4\u00d6\u00fc", "\udce9", "a\tb", "line\r\nbreak", "[sec]", "k=v", "a;b;c",
+         "\u00c4\u00d6\u00fc", "\udcc9T\udce9", "\udce9t\udce9", "a\tb", "line\r\nbreak", "[sec]", "k=v", "a;b;c",
          "a,\"b,c\",d", "\\"]
 WORD_BYTES = 'abAB01 ,;*?="[]-'
 LOADERS = {".arr": "loadFromFile", ".mmf": "loadFromHostArray", ".csv": "loadFromCsv",
@@ -75,9 +75,18 @@ def quote(text):
     return '"' + "".join(out) + '"'
 
 
+def swapcase(text):
+    """Other case in ASCII and in Latin-1 (raw bytes \\xc0..\\xfe, which Windows' own
+    case folding would join): the module folds only A-Z, on every system."""
+    latin = lambda c: chr(ord(c) ^ 0x20) if 0xDCC0 <= ord(c) <= 0xDCFE and ord(c) not in (0xDCD7, 0xDCF7) else c
+    return "".join(latin(c) for c in text.swapcase())
+
+
 class Script:
     def __init__(self, rng, seeds):
-        self.rng, self.seeds, self.reads = rng, seeds, 0
+        self.rng, self.seeds, self.reads, self.written = rng, seeds, 0, []
+        # A few texts recur through the script, so that finds, keys and labels hit.
+        self.vocabulary = [self.fresh_text() for _ in range(4)]
 
     def index(self):
         r = self.rng.random()
@@ -98,14 +107,27 @@ class Script:
                                list(range(7)) * 2)
 
     def text(self):
+        if self.rng.random() < 0.6:
+            word = self.rng.choice(self.vocabulary)
+            return swapcase(word) if self.rng.random() < 0.5 else word
+        return self.fresh_text()
+
+    def fresh_text(self):
         if self.rng.random() < 0.4:
             return "".join(self.rng.choice(WORD_BYTES) for _ in range(self.rng.randrange(9)))
         return self.rng.choice(TEXTS)
 
     def path(self, reads):
+        # Often a file this script wrote, so that saves are read back and appended to.
+        if self.written and self.rng.random() < 0.4:
+            name = self.rng.choice(self.written)
+        else:
+            name = self.rng.choice(self.seeds + OUTPUTS if reads else OUTPUTS + self.seeds[:2])
         if reads:
             self.reads += 1
-        return self.rng.choice(self.seeds + OUTPUTS if reads else OUTPUTS + self.seeds[:2])
+        elif name not in self.written:
+            self.written.append(name)
+        return name
 
     def argument(self, type_, description):
         if type_ == "text":
@@ -144,6 +166,9 @@ def script(seed, k, entries, seeds):
         lines.append("A %s %s" % (LOADERS[os.path.splitext(name)[1]], quote(name)))
         s.reads += 1
     length = rng.randint(10, 80)
+    for i in range(rng.randrange(4)):  # a table whose labels and cells later calls look up
+        lines.append("A setLabel %s %d" % (quote(rng.choice(s.vocabulary)), i))
+        lines.append("A appendRowFromList " + quote(",".join(rng.sample(s.vocabulary, 3))))
     # Calls that add elements come twice as often, so that arrays are seldom empty.
     entries = entries + [e for e in entries if re.match("append|insert", e[1])]
     while len(lines) < length:

@@ -48,13 +48,13 @@ run_one() {  # label k command...
   (cd "$dir/files" && timeout 120 "$@" run - <"$script" >"$dir/stdout" 2>"$dir/stderr"
    echo $? >"$dir/status")
 }
-same() {  # label k
-  local a=$work/runs/linux/$2 b=$work/runs/$1/$2 f
+same() {  # label k [run folder]
+  local a=$work/runs/linux/$2 b=${3:-$work/runs/$1/$2} f
   for f in stdout stderr status; do cmp -s "$a/$f" "$b/$f" || return 1; done
   diff -rq "$a/files" "$b/files" >/dev/null
 }
-show() {  # label k
-  local a=$work/runs/linux/$2 b=$work/runs/$1/$2 f
+show() {  # label k [run folder]
+  local a=$work/runs/linux/$2 b=${3:-$work/runs/$1/$2} f
   echo "== $1: script $2 of seed $seed differs from Linux (status $(<"$a/status") vs $(<"$b/status")):"
   sed 's/^/  /' "$work/scripts/$2.qs" | cut -c1-200
   for f in stdout stderr; do diff -u --label "linux $f" --label "$1 $f" "$a/$f" "$b/$f" | head -40; done
@@ -75,10 +75,13 @@ check_build() {  # label command...
   for ((k = 0; k < count; k++)); do run_one "$label" "$k" "${@:2}"; done
   for ((k = 0; k < count; k++)); do
     same "$label" "$k" && continue
-    # Wine itself now and then loses a run (see run_wine_cases.sh): a second run decides.
+    # Wine itself now and then loses a run (see run_wine_cases.sh): a second run decides,
+    # and a first run that differed alone is shown too.
+    rm -rf "$work/runs/$label/$k.first" && mv "$work/runs/$label/$k" "$work/runs/$label/$k.first"
     run_one "$label" "$k" "${@:2}"
     if same "$label" "$k"; then
-      echo "== $label: script $k matched only on a second run"
+      echo "== $label: script $k matched only on a second run; the first run:"
+      show "$label" "$k" "$work/runs/$label/$k.first" | sed 1d
     else
       show "$label" "$k"
       bad=$((bad + 1))
