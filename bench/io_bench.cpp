@@ -72,8 +72,8 @@ void readBytes(const std::string& path, std::vector<char>& bytes) {
 }
 
 using Fill = void (*)(ElementArray&, int64_t);
-using Save = void (*)(ElementArray&, const char*, uint16_t);
-using Load = void (*)(ElementArray&, const char*, int32_t);
+using Save = void (*)(ElementArray&, const char*, FileMode);
+using Load = void (*)(ElementArray&, const char*, LoadMode);
 
 // Save and load of one format; the baselines move the bytes of the file the save made.
 void addFormat(const std::string& format, int64_t n, Fill fill, Save save, Load load) {
@@ -83,13 +83,13 @@ void addFormat(const std::string& format, int64_t n, Fill fill, Save save, Load 
     if (fileSize(path) > 0) return;
     ElementArray array;
     fill(array, n);
-    save(array, path.c_str(), 0);
+    save(array, path.c_str(), FileModeTruncate);
   };
   add({"save " + format, n, 1, 2.0,
        [=](benchmark::State& state) {
          ElementArray array;
          fill(array, n);
-         for (auto _ : state) save(array, path.c_str(), 0);
+         for (auto _ : state) save(array, path.c_str(), FileModeTruncate);
        },
        [=](benchmark::State& state) {
          ensureFile();
@@ -101,16 +101,16 @@ void addFormat(const std::string& format, int64_t n, Fill fill, Save save, Load 
          ensureFile();
          ElementArray array;
          const int64_t before = heapInUse();
-         load(array, path.c_str(), 0);
+         load(array, path.c_str(), LoadReplace);
          reportMemory(state, static_cast<double>(heapInUse() - before) / array.size());
-         for (auto _ : state) load(array, path.c_str(), 0);
+         for (auto _ : state) load(array, path.c_str(), LoadReplace);
          benchmark::DoNotOptimize(array.size());
        },
        [=](benchmark::State& state) {
          ensureFile();
          std::vector<char> bytes(static_cast<std::size_t>(fileSize(path)));
          ElementArray array;
-         load(array, path.c_str(), 0);
+         load(array, path.c_str(), LoadReplace);
          reportMemory(state, static_cast<double>(bytes.size()) / array.size());
          for (auto _ : state) readBytes(path, bytes);
        }});
@@ -159,14 +159,14 @@ void registerIoScenarios() {
       ElementArray array;
       fillMixed(array, scaled(1'000'000));
       const std::string path = scratchPath("durable.src");
-      saveNativeFile(array, path.c_str(), 0);
+      saveNativeFile(array, path.c_str(), FileModeTruncate);
       return std::vector<char>(static_cast<std::size_t>(fileSize(path)), 'd');
     };
     add({"flushed replace (native file)", scaled(1'000'000), 1, 2.0,
          [=](benchmark::State& state) {
            const std::vector<char> bytes = fileBytes();
            for (auto _ : state) {
-             SaveFile file(target.c_str(), FileModeTruncate);
+             SaveFile file(target.c_str(), false);
              file.finish(file.handle().writeAll(bytes.data(), bytes.size()));
            }
          },

@@ -86,7 +86,7 @@ void registerSearches(int64_t n) {
   add({"findString wildcard *x*, no hit", n, n, 2.0,
        [texts](benchmark::State& state) {
          ElementArray array;
-         array.searchMode = SearchWildcard;
+         array.settings.searchMode = SearchWildcard;
          fill(array, *texts);
          for (auto _ : state) benchmark::DoNotOptimize(findString(array, "*x*"));
        },

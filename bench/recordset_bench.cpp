@@ -57,7 +57,7 @@ std::shared_ptr<Table> makeTable(const std::vector<int32_t>& keys) {
 // Row sorts work on the visible rows, so their tables start with every row selected;
 // the selections start from none.
 void fill(ElementArray& array, const Table& table, bool keysAsText, bool allSelected = false) {
-  array.setAutoSelect(allSelected ? 1 : 0);
+  array.settings.autoSelectNewRows = allSelected ? 1 : 0;
   array.setDimensions(2);
   array.setBoundary(1, kColumns);
   for (std::size_t r = 0; r < table.keys.size(); ++r) {

@@ -40,9 +40,9 @@ std::string describe(const ElementArray& a) {
   for (int32_t d = 0; d < ElementArray::kBoundaryCount; ++d) {
     s += std::to_string(a.boundaryEntry(d)) + ",";
   }
-  s += "/" + std::to_string(a.caseMode) + std::to_string(a.searchMode) +
-       std::to_string(a.selectionMode) + std::to_string(a.autoSelectNewRows) + "/" +
-       a.listDelimiter() + "/";
+  s += "/" + std::to_string(a.settings.caseMode) + std::to_string(a.settings.searchMode) +
+       std::to_string(a.settings.selectionMode) + std::to_string(a.settings.autoSelectNewRows) +
+       "/" + a.listDelimiter() + "/";
   if (a.labels) {
     for (const auto& label : *a.labels) s += label ? "[" + *label + "]" : "-";
   }

@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 #include <string>
 
 #include "array/element_array.h"
@@ -14,9 +15,10 @@
 namespace quorrel {
 
 inline std::string fuzzTempPath(const char* name) {
-  const char* dir = std::getenv("TMPDIR");
-  std::string base = (dir != nullptr && *dir != '\0') ? dir : "/tmp";
-  return base + "/quorrel-fuzz-" + std::to_string(getpid()) + "-" + name;
+  std::error_code error;
+  std::filesystem::path base = std::filesystem::temp_directory_path(error);
+  if (error) base = ".";
+  return (base / ("quorrel-fuzz-" + std::to_string(getpid()) + "-" + name)).string();
 }
 
 inline void writeFuzzFile(const std::string& path, const uint8_t* data, size_t size) {

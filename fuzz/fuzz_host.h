@@ -8,9 +8,6 @@
 // temporary folder that is emptied before each input.
 #pragma once
 
-#include <dirent.h>
-#include <unistd.h>
-
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
@@ -25,7 +22,6 @@
 #include "array/element_array.h"
 #include "fuzz_files.h"
 #include "host/abi.h"
-#include "host/entry_points.h"
 #include "host/run_record.h"
 #include "hostsim/host_simulator.h"
 
@@ -34,9 +30,16 @@ namespace quorrel::fuzz {
 namespace fs = std::filesystem;
 using abi::HostWord;
 
-// The module linked into this program, reached as a host reaches it.
-inline const hostsim::Module& linkedModule() {
+// The module, reached as a host reaches it: linked into this program (so that the
+// sanitizers and coverage see it), or on Windows the quorrel.dll beside the program, so
+// that the corpora replay through the DLL that ships.
+inline const hostsim::Module& fuzzModule() {
+#ifdef _WIN32
+  static const std::unique_ptr<hostsim::Module> module =
+      hostsim::Module::open(hostsim::defaultModulePath());
+#else
   static const std::unique_ptr<hostsim::Module> module = hostsim::Module::linked();
+#endif
   return *module;
 }
 
@@ -69,10 +72,10 @@ class FuzzFolder {
   }
 
  private:
-  FuzzFolder() {
-    std::string pattern = fuzzTempPath("session-XXXXXX");
-    if (mkdtemp(pattern.data()) == nullptr) std::abort();
-    path_ = pattern;
+  FuzzFolder() : path_(fuzzTempPath("session")) {
+    std::error_code error;
+    fs::remove_all(path_, error);  // left by an earlier process with this number
+    if (!fs::create_directory(path_, error)) std::abort();
     workingDirectory_ = listing(".");
   }
   ~FuzzFolder() {
@@ -144,9 +147,9 @@ class ObservedCall {
 // use are checked.
 class FuzzInstance final : hostsim::Instance::ServiceObserver {
  public:
-  explicit FuzzInstance(const hostsim::SetupRecord& setup)
-      : instance_(linkedModule(), setup, false) {
-    if (GetRunObjectDataSize(0, 0) < static_cast<int16_t>(abi::kRunRecordSize)) __builtin_trap();
+  explicit FuzzInstance(const hostsim::SetupRecord& setup) : instance_(fuzzModule(), setup, false) {
+    const auto dataSize = fuzzModule().entry<abi::GetRunObjectDataSizeFn>("GetRunObjectDataSize");
+    if (dataSize(0, 0) < static_cast<int16_t>(abi::kRunRecordSize)) __builtin_trap();
     instance_.serviceObserver = this;
     ObservedCall call(nullptr);
     instance_.create();
@@ -206,10 +209,10 @@ class FuzzInstance final : hostsim::Instance::ServiceObserver {
 
 // The declared parameter types of a code, from the information entries.
 inline const abi::InfoEntry& actionInfo(int code) {
-  return *GetActionInfos(nullptr, code);
+  return *fuzzModule().entry<abi::GetInfoEntryFn>("GetActionInfos")(nullptr, code);
 }
 inline const abi::InfoEntry& expressionInfo(int code) {
-  return *GetExpressionInfos(nullptr, code);
+  return *fuzzModule().entry<abi::GetInfoEntryFn>("GetExpressionInfos")(nullptr, code);
 }
 
 // Actions whose text parameter is a file path: (code, parameter number).

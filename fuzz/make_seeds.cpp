@@ -46,9 +46,10 @@ ElementArray cube() {
 // The array_file target reads its first byte as the format: 0 native, 1 host array,
 // 2 CSV, 3 INI. Saves go to a scratch file that is copied in behind that byte.
 void addArraySeed(const std::filesystem::path& dir, const char* name, char format,
-                  void (*save)(ElementArray&, const char*, uint16_t), ElementArray& array) {
+                  void (*save)(ElementArray&, const char*, quorrel::FileMode),
+                  ElementArray& array) {
   const std::filesystem::path scratch = dir / ".scratch";
-  save(array, scratch.c_str(), 0);
+  save(array, scratch.c_str(), quorrel::FileModeTruncate);
   std::ifstream in(scratch, std::ios::binary);
   std::ofstream out(dir / name, std::ios::binary);
   out << format << in.rdbuf();
@@ -78,8 +79,11 @@ int main(int argc, char** argv) {
   addArraySeed(arrays, "cube.csv", 2, quorrel::saveCsvFile, c);
   addArraySeed(arrays, "table.ini", 3, quorrel::saveIniFile, t);
   addArraySeed(arrays, "empty.ini", 3, quorrel::saveIniFile, empty);
-  quorrel::saveElementToFile(t, 0, (dir("element_file") / "string.bin").c_str(), 0);
-  quorrel::saveElementToFile(t, 8, (dir("element_file") / "file.bin").c_str(), 0);
-  quorrel::saveElementToFile(t, 6, (dir("element_file") / "value.bin").c_str(), 0);
+  quorrel::saveElementToFile(t, 0, (dir("element_file") / "string.bin").c_str(),
+                             quorrel::FileModeTruncate);
+  quorrel::saveElementToFile(t, 8, (dir("element_file") / "file.bin").c_str(),
+                             quorrel::FileModeTruncate);
+  quorrel::saveElementToFile(t, 6, (dir("element_file") / "value.bin").c_str(),
+                             quorrel::FileModeTruncate);
   return 0;
 }

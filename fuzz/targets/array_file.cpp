@@ -15,14 +15,14 @@ namespace {
 using quorrel::ElementArray;
 
 struct Format {
-  void (*load)(ElementArray&, const char* path, int32_t append);
+  void (*load)(ElementArray&, const char* path, quorrel::LoadMode mode);
   void (*save)(ElementArray&, const char* path);
 };
 
 template <auto load, auto save>
 constexpr Format formatOf() {
-  return {[](ElementArray& a, const char* path, int32_t append) { load(a, path, append); },
-          [](ElementArray& a, const char* path) { save(a, path, 0); }};
+  return {[](ElementArray& a, const char* path, quorrel::LoadMode mode) { load(a, path, mode); },
+          [](ElementArray& a, const char* path) { save(a, path, quorrel::FileModeTruncate); }};
 }
 
 // The seeds in the corpus start with their index here: native, host array, CSV, INI.
@@ -52,20 +52,20 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   quorrel::writeFuzzFile(path, data + 1, size - 1);
 
   ElementArray replaced;
-  format.load(replaced, path.c_str(), 0);
+  format.load(replaced, path.c_str(), quorrel::LoadReplace);
   quorrel::checkInvariants(replaced);
   {
     // A few bytes may declare millions of empty cells: one such array at a time.
     ElementArray appended;
     quorrel::fillSample(appended);
-    format.load(appended, path.c_str(), 1);
+    format.load(appended, path.c_str(), quorrel::LoadAppend);
     quorrel::checkInvariants(appended);
   }
 
   if (savesHugeFile(format, replaced)) return 0;
   format.save(replaced, copy.c_str());
   ElementArray again;
-  format.load(again, copy.c_str(), 0);
+  format.load(again, copy.c_str(), quorrel::LoadReplace);
   quorrel::checkInvariants(again);
   // The native format keeps every element.
   if (&format == &kFormats[0] && again.size() != replaced.size()) __builtin_trap();

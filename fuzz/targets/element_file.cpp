@@ -25,10 +25,10 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   quorrel::checkInvariants(array);
 
   // A file element writes back exactly the bytes it was read from.
-  quorrel::saveElementToFile(array, array.size() - 1, copy.c_str(), 0);
+  quorrel::saveElementToFile(array, array.size() - 1, copy.c_str(), quorrel::FileModeTruncate);
   auto back = quorrel::readWholeFile(copy.c_str());
   if (!back || back->size() != size) __builtin_trap();
   if (size > 0 && std::memcmp(back->data(), data, size) != 0) __builtin_trap();
-  quorrel::saveElementToFile(array, 0, copy.c_str(), 1);
+  quorrel::saveElementToFile(array, 0, copy.c_str(), quorrel::FileModeAppend);
   return 0;
 }

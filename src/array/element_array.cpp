@@ -121,68 +121,6 @@ void ElementArray::clear() {
   syncRowStates();
 }
 
-// --- All or nothing --------------------------------------------------------------------
-
-ElementArray ElementArray::emptyCopy() const {
-  ElementArray copy;
-  copy.caseMode = caseMode;
-  copy.searchMode = searchMode;
-  copy.fileMode = fileMode;
-  copy.selectionMode = selectionMode;
-  copy.autoSelectNewRows = autoSelectNewRows;
-  copy.labels = labels;
-  copy.dimensions_ = dimensions_;
-  std::copy(std::begin(boundaries_), std::end(boundaries_), copy.boundaries_);
-  copy.delimiterText_ = delimiterText_;
-  copy.syncRowStates();
-  return copy;
-}
-
-ElementArray::Mark ElementArray::mark() const {
-  Mark m;
-  m.size = size();
-  m.capacity = capacity_;
-  m.dimensions = dimensions_;
-  std::copy(std::begin(boundaries_), std::end(boundaries_), m.boundaries);
-  m.labels = labels;
-  m.rowStates = rowStates;
-  return m;
-}
-
-void ElementArray::rollBack(Mark& m) noexcept {
-  elements_.truncate(static_cast<std::size_t>(m.size));
-  capacity_ = m.capacity;
-  dimensions_ = m.dimensions;
-  std::copy(std::begin(m.boundaries), std::end(m.boundaries), boundaries_);
-  labels.swap(m.labels);
-  rowStates.swap(m.rowStates);
-  refreshAppendRange();
-}
-
-void ElementArray::undoInserts(const EditMark& m, int32_t index) noexcept {
-  if (index >= m.size) {
-    elements_.truncate(static_cast<std::size_t>(m.size));
-  } else {
-    for (int32_t i = size() - m.size - 1; i >= 0; --i) {
-      elements_.eraseAt(static_cast<std::size_t>(index + i));
-    }
-  }
-  capacity_ = m.capacity;
-  if (rowStates.size() > m.rows) rowStates.resize(m.rows);
-  refreshAppendRange();
-}
-
-void ElementArray::swapElements(int32_t index, std::span<Element> other) noexcept {
-  for (std::size_t i = 0; i < other.size(); ++i) {
-    std::swap(at(index + static_cast<int32_t>(i)), other[i]);
-  }
-}
-
-void ElementArray::rebalanceCapacity() noexcept {
-  capacity_ = rebalancedCapacity(capacity_, size(), size());
-  refreshAppendRange();
-}
-
 // --- Settings ------------------------------------------------------------------------
 
 // Out of line: inlined into callers that pass a literal, the assignment trips a false
@@ -365,7 +303,7 @@ int32_t ElementArray::tableRowCount() const {
 
 void ElementArray::syncRowStates() {
   const auto target = static_cast<std::size_t>(tableRowCount());
-  rowStates.resize(target, autoSelectNewRows == 1 ? RowSelected : RowUnselected);
+  rowStates.resize(target, settings.autoSelectNewRows ? RowSelected : RowUnselected);
   refreshAppendRange();
 }
 

@@ -13,6 +13,7 @@
 
 #include "array/element.h"
 #include "array/element_store.h"
+#include "array/settings.h"
 
 namespace quorrel {
 
@@ -113,42 +114,9 @@ class ElementArray {
   // array is cleared (or destroyed), since any element may still read from it.
   void keepBlock(std::shared_ptr<const void> block) { blocks_.push_back(std::move(block)); }
 
-  // --- All or nothing ------------------------------------------------------------------
-  // The array as clear() leaves it, with the same settings, dimensions and labels: a
-  // replacing load fills it and is swapped in only once it is complete.
-  ElementArray emptyCopy() const;
-  // What appending to the end can change, kept so that an append that fails part-way
-  // can be undone: elements past the mark are dropped and the rest is restored.
-  struct Mark {
-    int32_t size = 0;
-    int32_t capacity = 0;
-    int32_t dimensions = 0;
-    int32_t boundaries[kBoundaryCount] = {};
-    std::optional<LabelList> labels;
-    std::vector<uint8_t> rowStates;
-  };
-  Mark mark() const;
-  void rollBack(Mark& mark) noexcept;
-  // The lighter mark of a run of inserts at one index, which changes no setting.
-  struct EditMark {
-    int32_t size = 0;
-    int32_t capacity = 0;
-    std::size_t rows = 0;
-  };
-  EditMark editMark() const { return {size(), capacity_, rowStates.size()}; }
-  // Removes what the inserts at `index` since the mark added (at or past the marked
-  // size: everything past it, the empty elements of a growth included).
-  void undoInserts(const EditMark& mark, int32_t index) noexcept;
-  // Exchanges the elements from index on (all in range) with those of `other`, without
-  // allocating: a caller makes every new element first and can swap them back.
-  void swapElements(int32_t index, std::span<Element> other) noexcept;
-  // What an edit that keeps the size does to the capacity (setElement in range).
-  void rebalanceCapacity() noexcept;
-
   // --- Settings ----------------------------------------------------------------------
   void setListDelimiter(const char* text);
   const char* listDelimiter() const { return delimiterText_.c_str(); }
-  void setAutoSelect(int32_t flag) { autoSelectNewRows = flag != 0 ? 1 : 0; }
 
   // --- Dimensions --------------------------------------------------------------------
   int32_t dimensions() const { return dimensions_; }
@@ -168,12 +136,7 @@ class ElementArray {
   int32_t tableRowCount() const;
   void syncRowStates();
 
-  // --- Settings read and written directly by the routines ---------------------------
-  int16_t caseMode = 0;       // 0 case insensitive, 1 case sensitive
-  int16_t searchMode = 0;     // 0 literal, 1 wildcard
-  int16_t fileMode = 0;       // 0 create or truncate, 1 append
-  int32_t selectionMode = 1;  // 0 AND, 1 OR
-  int32_t autoSelectNewRows = 0;
+  ArraySettings settings;
   // Column labels, set through recordset/: absent until the first setLabel, then one
   // entry per column as counted at the last setLabel; an entry is absent for a column
   // whose label was never set (an empty text is a label).
@@ -181,6 +144,8 @@ class ElementArray {
   std::vector<uint8_t> rowStates;  // one RowState per table row, always tableRowCount()
 
  private:
+  friend class ArrayEdit;  // records and restores what an edit may change
+
   static ElementValue fileOperand(ByteBlock block) {
     return ElementValue::ofBytes(block.bytes, block.length);
   }

@@ -45,9 +45,11 @@ void applySetup(ElementArray& array, const void* setupRecord) {
   if (host::setupListDelimiter(setupRecord, delimiter)[0] != '\0') {
     array.setListDelimiter(delimiter);
   }
-  array.caseMode = setup.caseSensitive == 0 ? 0 : 1;
-  array.searchMode = setup.wildcardSearch == 0 ? 0 : 1;
-  array.setAutoSelect(setup.autoSelectRows == 1 ? 1 : 0);
+  quorrel::ArraySettings& settings = array.settings;
+  settings.caseMode = setup.caseSensitive == 0 ? quorrel::CaseInsensitive : quorrel::CaseSensitive;
+  settings.searchMode =
+      setup.wildcardSearch == 0 ? quorrel::SearchLiteral : quorrel::SearchWildcard;
+  settings.autoSelectNewRows = setup.autoSelectRows == 1;
 }
 
 // Codes arrive in a full word; the host means its low 16 bits, signed.

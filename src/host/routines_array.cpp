@@ -60,16 +60,16 @@ QUORREL_ACTION_ROUTINE(resizeDimensionBoundary) {
   });
 }
 QUORREL_ACTION_ROUTINE(caseInsensitive) {
-  return runAction(runRecord, [](ElementArray& a) { a.caseMode = 0; });
+  return runAction(runRecord, [](ElementArray& a) { a.settings.caseMode = CaseInsensitive; });
 }
 QUORREL_ACTION_ROUTINE(caseSensitive) {
-  return runAction(runRecord, [](ElementArray& a) { a.caseMode = 1; });
+  return runAction(runRecord, [](ElementArray& a) { a.settings.caseMode = CaseSensitive; });
 }
 QUORREL_ACTION_ROUTINE(literalSearch) {
-  return runAction(runRecord, [](ElementArray& a) { a.searchMode = 0; });
+  return runAction(runRecord, [](ElementArray& a) { a.settings.searchMode = SearchLiteral; });
 }
 QUORREL_ACTION_ROUTINE(wildcardSearch) {
-  return runAction(runRecord, [](ElementArray& a) { a.searchMode = 1; });
+  return runAction(runRecord, [](ElementArray& a) { a.settings.searchMode = SearchWildcard; });
 }
 QUORREL_ACTION_ROUTINE(setListDelimiter) {
   return runAction(runRecord, [&](ElementArray& a) { a.setListDelimiter(textParam(param1)); });

@@ -29,52 +29,65 @@ namespace quorrel::host::act {
 
 // Whole-array saves write a new file (mode 0); loads replace (0) or append (1).
 QUORREL_ACTION_ROUTINE(saveToFile) {
-  return runAction(runRecord, [&](ElementArray& a) { saveNativeFile(a, textParam(param1), 0); });
+  return runAction(
+      runRecord, [&](ElementArray& a) { saveNativeFile(a, textParam(param1), FileModeTruncate); });
 }
 QUORREL_ACTION_ROUTINE(loadFromFile) {
-  return runAction(runRecord, [&](ElementArray& a) { loadNativeFile(a, textParam(param1), 0); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { loadNativeFile(a, textParam(param1), LoadReplace); });
 }
 QUORREL_ACTION_ROUTINE(appendElementsFromFile) {
-  return runAction(runRecord, [&](ElementArray& a) { loadNativeFile(a, textParam(param1), 1); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { loadNativeFile(a, textParam(param1), LoadAppend); });
 }
 QUORREL_ACTION_ROUTINE(saveAsHostArray) {
-  return runAction(runRecord, [&](ElementArray& a) { saveHostArrayFile(a, textParam(param1), 0); });
+  return runAction(runRecord, [&](ElementArray& a) {
+    saveHostArrayFile(a, textParam(param1), FileModeTruncate);
+  });
 }
 QUORREL_ACTION_ROUTINE(loadFromHostArray) {
-  return runAction(runRecord, [&](ElementArray& a) { loadHostArrayFile(a, textParam(param1), 0); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { loadHostArrayFile(a, textParam(param1), LoadReplace); });
 }
 QUORREL_ACTION_ROUTINE(appendElementsFromHostArray) {
-  return runAction(runRecord, [&](ElementArray& a) { loadHostArrayFile(a, textParam(param1), 1); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { loadHostArrayFile(a, textParam(param1), LoadAppend); });
 }
 
 QUORREL_ACTION_ROUTINE(saveToCsvFile) {
-  return runAction(runRecord, [&](ElementArray& a) { saveCsvFile(a, textParam(param1), 0); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { saveCsvFile(a, textParam(param1), FileModeTruncate); });
 }
 QUORREL_ACTION_ROUTINE(loadFromCsvFile) {
-  return runAction(runRecord, [&](ElementArray& a) { loadCsvFile(a, textParam(param1), 0); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { loadCsvFile(a, textParam(param1), LoadReplace); });
 }
 QUORREL_ACTION_ROUTINE(appendElementsFromCsvFile) {
-  return runAction(runRecord, [&](ElementArray& a) { loadCsvFile(a, textParam(param1), 1); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { loadCsvFile(a, textParam(param1), LoadAppend); });
 }
 QUORREL_ACTION_ROUTINE(saveToIniFile) {
-  return runAction(runRecord, [&](ElementArray& a) { saveIniFile(a, textParam(param1), 0); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { saveIniFile(a, textParam(param1), FileModeTruncate); });
 }
 QUORREL_ACTION_ROUTINE(loadFromIniFile) {
-  return runAction(runRecord, [&](ElementArray& a) { loadIniFile(a, textParam(param1), 0); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { loadIniFile(a, textParam(param1), LoadReplace); });
 }
 QUORREL_ACTION_ROUTINE(appendElementsFromIniFile) {
-  return runAction(runRecord, [&](ElementArray& a) { loadIniFile(a, textParam(param1), 1); });
+  return runAction(runRecord,
+                   [&](ElementArray& a) { loadIniFile(a, textParam(param1), LoadAppend); });
 }
 
 // Element files: index first, path second; a new file (0) or appended to (1).
 QUORREL_ACTION_ROUTINE(saveElementToFile) {
   return runAction(runRecord, [&](ElementArray& a) {
-    quorrel::saveElementToFile(a, numberParam(param1), textParam(param2), 0);
+    quorrel::saveElementToFile(a, numberParam(param1), textParam(param2), FileModeTruncate);
   });
 }
 QUORREL_ACTION_ROUTINE(appendElementToFile) {
   return runAction(runRecord, [&](ElementArray& a) {
-    quorrel::saveElementToFile(a, numberParam(param1), textParam(param2), 1);
+    quorrel::saveElementToFile(a, numberParam(param1), textParam(param2), FileModeAppend);
   });
 }
 

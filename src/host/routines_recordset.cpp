@@ -110,10 +110,10 @@ QUORREL_ACTION_ROUTINE(sortRowsByLabelStringDescending) {
 
 // --- Selection modes and whole-selection edits ---------------------------------------
 QUORREL_ACTION_ROUTINE(andMode) {
-  return runAction(runRecord, [](ElementArray& a) { a.selectionMode = SelectAnd; });
+  return runAction(runRecord, [](ElementArray& a) { a.settings.selectionMode = SelectAnd; });
 }
 QUORREL_ACTION_ROUTINE(orMode) {
-  return runAction(runRecord, [](ElementArray& a) { a.selectionMode = SelectOr; });
+  return runAction(runRecord, [](ElementArray& a) { a.settings.selectionMode = SelectOr; });
 }
 QUORREL_ACTION_ROUTINE(selectAllRows) {
   return runAction(runRecord, [](ElementArray& a) { quorrel::selectAllRows(a); });

@@ -10,6 +10,7 @@
 #include <utility>
 #include <vector>
 
+#include "array/array_edit.h"
 #include "array/element_array.h"
 #include "recordset/table.h"
 
@@ -66,23 +67,13 @@ class AppendRun {
 };
 
 // Runs a load all or nothing: a replacing load fills an empty copy of the array that
-// is swapped in once complete; an appending load that fails part-way is undone. An
+// is moved in once complete; an appending load that fails part-way is undone. An
 // exception (memory ran out) thus leaves the array as it was, and is passed on.
 template <typename Load>
 void loadAllOrNothing(ElementArray& array, bool replace, Load&& load) {
-  if (replace) {
-    ElementArray staged = array.emptyCopy();
-    load(staged);
-    array = std::move(staged);
-    return;
-  }
-  ElementArray::Mark mark = array.mark();
-  try {
-    load(array);
-  } catch (...) {
-    array.rollBack(mark);
-    throw;
-  }
+  ArrayEdit edit(array, replace ? ArrayEdit::Replacing : ArrayEdit::Growing);
+  load(edit.target());
+  edit.commit();
 }
 
 // setLabel, which leaves the labels of a table past kMaxLabelColumns alone (only a

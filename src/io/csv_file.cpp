@@ -149,8 +149,8 @@ std::optional<ByteBuffer> readTextFile(const char* path) {
   return text;
 }
 
-void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
-  array.fileMode = static_cast<int16_t>(mode);
+void saveCsvFile(ElementArray& array, const char* path, FileMode mode) {
+  array.settings.fileMode = mode;
   try {
     const int64_t size = array.size();
     int64_t columns = size;
@@ -162,7 +162,7 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
     // The last row is padded to X cells; past the array's cap (X = 2147483647, say)
     // that is gigabytes of empty cells, so such a file is not written at all.
     if (rows * columns > ElementArray::kMaxSize) return;
-    SaveFile file(path, mode);
+    SaveFile file(path, mode == FileModeAppend);
     if (!file.isOpen()) return;
     BufferedWriter out(file.handle());
     const std::span<const Element> cells = std::as_const(array).slots();
@@ -180,13 +180,13 @@ void saveCsvFile(ElementArray& array, const char* path, uint16_t mode) {
   }
 }
 
-void loadCsvFile(ElementArray& array, const char* path, int32_t append) {
+void loadCsvFile(ElementArray& array, const char* path, LoadMode mode) {
   try {
     std::optional<ByteBuffer> read = readTextFile(path);
     std::shared_ptr<ByteBuffer> text =
         read ? std::make_shared<ByteBuffer>(std::move(*read)) : std::make_shared<ByteBuffer>();
     const CsvShape shape = shapeOf(text->data(), text->size());
-    io_detail::loadAllOrNothing(array, append == 0, [&](ElementArray& target) {
+    io_detail::loadAllOrNothing(array, mode == LoadReplace, [&](ElementArray& target) {
       target.setDimensions(2);
       target.setBoundary(1, shape.columns);
       // Appends past the array's size limit change nothing.

@@ -13,11 +13,11 @@ namespace quorrel {
 
 // One line per row of the X boundary's width when the array has two or more
 // dimensions and an X boundary of at least 1; otherwise the whole array on one line.
-void saveCsvFile(ElementArray& array, const char* path, uint16_t mode);
+void saveCsvFile(ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array first. Either way the array becomes two-dimensional with
 // the widest line's cell count as X boundary, and every line adds that many String
 // elements (short lines padded with empty texts).
-void loadCsvFile(ElementArray& array, const char* path, int32_t append);
+void loadCsvFile(ElementArray& array, const char* path, LoadMode mode);
 
 // The file as zero-terminated text: a zero byte inside the file ends the text (size()
 // is the text's length). Nothing when the file cannot be opened; std::bad_alloc when

@@ -4,11 +4,11 @@
 
 namespace quorrel {
 
-void saveElementToFile(const ElementArray& array, int32_t index, const char* path, uint16_t mode) {
+void saveElementToFile(const ElementArray& array, int32_t index, const char* path, FileMode mode) {
   ByteBlock block;
   if (!array.getBytes(block, index)) return;
   try {
-    SaveFile file(path, mode);
+    SaveFile file(path, mode == FileModeAppend);
     if (!file.isOpen()) return;
     bool written = true;
     if (array.at(index).type() == ElementType::Value) {

@@ -11,9 +11,10 @@
 namespace quorrel {
 
 // Writes the bytes of the element at index: a String's text with its terminating zero,
-// a File's bytes, a Value's 4 bytes little-endian, nothing for None. Mode 0 creates or
-// truncates the file, mode 1 appends. An index outside the array touches no file.
-void saveElementToFile(const ElementArray& array, int32_t index, const char* path, uint16_t mode);
+// a File's bytes, a Value's 4 bytes little-endian, nothing for None. FileModeTruncate
+// creates or truncates the file, FileModeAppend appends. An index outside the array
+// touches no file.
+void saveElementToFile(const ElementArray& array, int32_t index, const char* path, FileMode mode);
 
 // Exactly the file's bytes (no terminator added); nothing when it cannot be opened,
 // std::bad_alloc when memory runs out.

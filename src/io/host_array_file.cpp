@@ -56,7 +56,7 @@ void writeCell(BufferedWriter& out, const ElementArray& array, int32_t k, Number
 
 // Writes the header, the sizes (0 written and counted as 1) and every cell (an empty
 // text past the elements). Nothing when X x Y x Z is past ElementArray::kMaxSize.
-void writeHostFile(const char* path, uint16_t mode, const ElementArray& array, int32_t x, int32_t y,
+void writeHostFile(const char* path, FileMode mode, const ElementArray& array, int32_t x, int32_t y,
                    int32_t z) {
   x = atLeastOne(x);
   y = atLeastOne(y);
@@ -66,7 +66,7 @@ void writeHostFile(const char* path, uint16_t mode, const ElementArray& array, i
   // (X × Y is checked first: with all three near 2^31 the product passes 64 bits.)
   const int64_t layer = int64_t{x} * y;
   if (layer > ElementArray::kMaxSize || layer * z > ElementArray::kMaxSize) return;
-  SaveFile file(path, mode);
+  SaveFile file(path, mode == FileModeAppend);
   if (!file.isOpen()) return;
   BufferedWriter out(file.handle());
   out.text(kHeader);
@@ -175,8 +175,8 @@ struct LoadSink {
 
 }  // namespace
 
-void saveHostArrayFile(ElementArray& array, const char* path, uint16_t mode) {
-  array.fileMode = static_cast<int16_t>(mode);
+void saveHostArrayFile(ElementArray& array, const char* path, FileMode mode) {
+  array.settings.fileMode = mode;
   try {
     const int32_t x = array.boundary(1);
     const int32_t y = array.boundary(2);
@@ -186,8 +186,8 @@ void saveHostArrayFile(ElementArray& array, const char* path, uint16_t mode) {
   }
 }
 
-void loadHostArrayFile(ElementArray& array, const char* path, int32_t append) {
-  const bool replace = append == 0;
+void loadHostArrayFile(ElementArray& array, const char* path, LoadMode mode) {
+  const bool replace = mode == LoadReplace;
   try {
     std::optional<ByteBuffer> read = readFileBytes(path, 1);
     const auto bytes = read ? std::make_shared<ByteBuffer>(std::move(*read)) : nullptr;

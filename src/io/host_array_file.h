@@ -6,15 +6,16 @@
 #include <cstdint>
 
 #include "array/element_array.h"
+#include "io/file_handle.h"
 
 namespace quorrel {
 
 // Writes every element's text form as a text cell. X and Y are the boundaries of
 // dimensions 1 and 2 (0 counts as 1); Z is size / (X x Y) + 1.
-void saveHostArrayFile(ElementArray& array, const char* path, uint16_t mode);
+void saveHostArrayFile(ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array and makes it three-dimensional with the file's X and Y as
 // boundaries 1 and 2 (a file that cannot be used still clears it and sets 0
 // dimensions); otherwise the cells are added at the end and dimensions stay.
-void loadHostArrayFile(ElementArray& array, const char* path, int32_t append);
+void loadHostArrayFile(ElementArray& array, const char* path, LoadMode mode);
 
 }  // namespace quorrel

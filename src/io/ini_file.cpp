@@ -113,10 +113,10 @@ struct LoadSink {
 
 }  // namespace
 
-void saveIniFile(ElementArray& array, const char* path, uint16_t mode) {
-  array.fileMode = static_cast<int16_t>(mode);
+void saveIniFile(ElementArray& array, const char* path, FileMode mode) {
+  array.settings.fileMode = mode;
   try {
-    SaveFile file(path, mode);
+    SaveFile file(path, mode == FileModeAppend);
     if (!file.isOpen()) return;
     BufferedWriter out(file.handle());
     writeSectionLine(out, kSectionName);
@@ -132,11 +132,11 @@ void saveIniFile(ElementArray& array, const char* path, uint16_t mode) {
   }
 }
 
-void loadIniFile(ElementArray& array, const char* path, int32_t append) {
+void loadIniFile(ElementArray& array, const char* path, LoadMode mode) {
   try {
     std::optional<ByteBuffer> read = readTextFile(path);
     const auto text = read ? std::make_shared<ByteBuffer>(std::move(*read)) : nullptr;
-    io_detail::loadAllOrNothing(array, append == 0, [&](ElementArray& target) {
+    io_detail::loadAllOrNothing(array, mode == LoadReplace, [&](ElementArray& target) {
       if (!text) return;
       io_detail::AppendRun run(target);
       LoadSink sink{run};

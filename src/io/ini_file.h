@@ -6,12 +6,13 @@
 #include <cstdint>
 
 #include "array/element_array.h"
+#include "io/file_handle.h"
 
 namespace quorrel {
 
-void saveIniFile(ElementArray& array, const char* path, uint16_t mode);
+void saveIniFile(ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array first; dimensions, boundaries and labels stay. Each entry
 // appends its value (none for a line without "=") with its key as a String key.
-void loadIniFile(ElementArray& array, const char* path, int32_t append);
+void loadIniFile(ElementArray& array, const char* path, LoadMode mode);
 
 }  // namespace quorrel

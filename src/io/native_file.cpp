@@ -247,10 +247,10 @@ struct LoadSink {
 
 }  // namespace
 
-void saveNativeFile(ElementArray& array, const char* path, uint16_t mode) {
-  array.fileMode = static_cast<int16_t>(mode);
+void saveNativeFile(ElementArray& array, const char* path, FileMode mode) {
+  array.settings.fileMode = mode;
   try {
-    SaveFile file(path, mode);
+    SaveFile file(path, mode == FileModeAppend);
     if (!file.isOpen()) return;
     BufferedWriter out(file.handle());
     int32_t boundaries[kMaxDimensions];
@@ -271,8 +271,8 @@ void saveNativeFile(ElementArray& array, const char* path, uint16_t mode) {
   }
 }
 
-void loadNativeFile(ElementArray& array, const char* path, int32_t append) {
-  const bool replace = append == 0;
+void loadNativeFile(ElementArray& array, const char* path, LoadMode mode) {
+  const bool replace = mode == LoadReplace;
   try {
     std::optional<ByteBuffer> read = readFileBytes(path, 0);
     const auto bytes = read ? std::make_shared<const ByteBuffer>(std::move(*read)) : nullptr;

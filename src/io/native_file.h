@@ -5,14 +5,15 @@
 #include <cstdint>
 
 #include "array/element_array.h"
+#include "io/file_handle.h"
 
 namespace quorrel {
 
-// Writes the whole array; stores `mode` in fileMode (0 create or truncate, 1 append).
-void saveNativeFile(ElementArray& array, const char* path, uint16_t mode);
+// Writes the whole array; stores `mode` in the settings' fileMode.
+void saveNativeFile(ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array and takes the file's dimensions and boundaries (a file
 // that cannot be used still clears it and sets 0 dimensions); otherwise the file's
 // elements are added at the end. Labels of the file replace column labels in both.
-void loadNativeFile(ElementArray& array, const char* path, int32_t append);
+void loadNativeFile(ElementArray& array, const char* path, LoadMode mode);
 
 }  // namespace quorrel

@@ -15,16 +15,11 @@
 
 namespace quorrel {
 
-// Codes held in ElementArray::caseMode; any non-zero value is case sensitive.
-enum CompareMode : int16_t { CaseInsensitive = 0, CaseSensitive = 1 };
-// Codes held in ElementArray::searchMode; any non-zero value is wildcard.
-enum SearchMode : int16_t { SearchLiteral = 0, SearchWildcard = 1 };
-
 inline bool isCaseSensitive(const ElementArray& array) {
-  return array.caseMode != 0;
+  return array.settings.caseMode == CaseSensitive;
 }
 inline bool isWildcardSearch(const ElementArray& array) {
-  return array.searchMode != 0;
+  return array.settings.searchMode == SearchWildcard;
 }
 
 // 'A'..'Z' to 'a'..'z'; every other byte unchanged.

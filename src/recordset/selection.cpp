@@ -35,9 +35,9 @@ void walkWhere(ElementArray& array, int32_t column, Test& passes) {
 
 template <typename Test>
 void applyWhere(ElementArray& array, int32_t column, Test&& passes) {
-  if (array.selectionMode == SelectOr) {
+  if (array.settings.selectionMode == SelectOr) {
     walkWhere<true>(array, column, passes);
-  } else if (array.selectionMode == SelectAnd) {
+  } else if (array.settings.selectionMode == SelectAnd) {
     walkWhere<false>(array, column, passes);
   }
 }
@@ -80,7 +80,7 @@ void invertSelection(ElementArray& array) {
 }
 
 void startNewWhere(ElementArray& array) {
-  array.selectionMode = SelectOr;
+  array.settings.selectionMode = SelectOr;
   clearSelection(array);
 }
 

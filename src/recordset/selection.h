@@ -14,8 +14,6 @@
 
 namespace quorrel {
 
-enum SelectionMode : int32_t { SelectAnd = 0, SelectOr = 1 };
-
 void clearSelection(ElementArray& array);
 void selectAllRows(ElementArray& array);
 void invertSelection(ElementArray& array);

@@ -5,6 +5,7 @@
 #include <utility>
 #include <vector>
 
+#include "array/array_edit.h"
 #include "array/text.h"
 #include "query/compare.h"
 
@@ -125,13 +126,9 @@ void insertRowFromList(ElementArray& array, const char* list, int32_t n) {
   if (int64_t{array.size()} + columns > ElementArray::kMaxSize) return;
   const std::vector<std::string> fields = splitFields(array, list, columns);
   const int32_t base = visibleCellIndex(array, n, 0);
-  const ElementArray::EditMark mark = array.editMark();
-  try {
-    for (int32_t i = 0; i < columns; ++i) array.insertString(fieldText(fields, i), base + i);
-  } catch (...) {
-    array.undoInserts(mark, base);
-    throw;
-  }
+  ArrayEdit edit(array, ArrayEdit::InsertingAt, base);
+  for (int32_t i = 0; i < columns; ++i) array.insertString(fieldText(fields, i), base + i);
+  edit.commit();
 }
 
 void appendRowFromList(ElementArray& array, const char* list) {
@@ -147,7 +144,6 @@ void replaceRowWithList(ElementArray& array, const char* list, int32_t n) {
   // Cells in range are made first (keys kept) and swapped in; only a row number out of
   // range also lands past the end, where setString grows the array. A failure swaps
   // the old cells back and takes any growth back.
-  const ElementArray::EditMark mark = array.editMark();
   const int32_t first = std::max(base, 0);
   const int32_t inRange = std::max(0, std::min(base + columns, array.size()) - first);
   std::vector<Element> cells;
@@ -157,17 +153,12 @@ void replaceRowWithList(ElementArray& array, const char* list, int32_t n) {
     const ElementValue value = ElementValue::ofText(fieldText(fields, k - base));
     cells.push_back(old.hasKey() ? Element::keyed(value, old.key()->view()) : Element::of(value));
   }
-  array.swapElements(first, cells);
-  if (inRange > 0) array.rebalanceCapacity();
-  try {
-    for (int32_t i = first + inRange - base; i < columns; ++i) {
-      array.setString(fieldText(fields, i), base + i);
-    }
-  } catch (...) {
-    array.undoInserts(mark, mark.size);
-    array.swapElements(first, cells);
-    throw;
+  ArrayEdit edit(array, ArrayEdit::InsertingAt, array.size());
+  edit.swapIn(first, cells);
+  for (int32_t i = first + inRange - base; i < columns; ++i) {
+    array.setString(fieldText(fields, i), base + i);
   }
+  edit.commit();
 }
 
 void deleteRow(ElementArray& array, int32_t n) {

@@ -54,7 +54,7 @@ TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
     const int32_t dims = 1 + pick(3), x = 1 + pick(4), y = 1 + pick(3), count = pick(70);
     const int32_t autoSelect = pick(2);
     for (ElementArray* a : {&fast, &slow}) {
-      a->setAutoSelect(autoSelect);
+      a->settings.autoSelectNewRows = autoSelect;
       a->setDimensions(3);
       a->setBoundary(1, x);
       a->setBoundary(2, y);
@@ -82,14 +82,14 @@ TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
 TEST(RowStates, StatesBelongToPositionsNotRows) {
   ElementArray a = threeColumns();
   EXPECT_EQ(a.indexOfDimIndex(nullptr), 0);  // no list at all reads as index 0
-  a.setAutoSelect(1);
+  a.settings.autoSelectNewRows = true;
   for (int i = 1; i <= 6; ++i) a.appendValue(i);
   a.rowStates = {U, S};
   a.deleteAt(4);
   EXPECT_EQ(a.rowStates, (States{U}));
   for (int i = 0; i < 4; ++i) a.insertValue(9, 0);
   EXPECT_EQ(a.rowStates, (States{U, S, S}));
-  a.setAutoSelect(0);
+  a.settings.autoSelectNewRows = false;
   EXPECT_EQ(a.rowStates, (States{U, S, S}));
   for (int i = 0; i < 3; ++i) a.appendValue(9);
   EXPECT_EQ(a.rowStates, (States{U, S, S, U}));
@@ -97,7 +97,7 @@ TEST(RowStates, StatesBelongToPositionsNotRows) {
   EXPECT_EQ(a.rowStates.size(), 4u);
 
   // Setting changes bring the list up to date.
-  a.setAutoSelect(1);
+  a.settings.autoSelectNewRows = true;
   a.setBoundary(1, 4);
   EXPECT_EQ(a.rowStates, (States{U, S, S}));
   a.setBoundary(1, 2);
@@ -135,7 +135,7 @@ TEST(RowStates, AlwaysOnePerTableRow) {
     } else if (pick < 90) {
       a.clear();
     } else if (pick < 95) {
-      a.setAutoSelect(small > 1 ? 1 : 0);
+      a.settings.autoSelectNewRows = small > 1 ? 1 : 0;
     } else if (a.size() > 60) {
       a.deleteAt(0);
     }

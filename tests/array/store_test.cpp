@@ -204,7 +204,7 @@ TEST(Store, AppendsMatchSingleInsertsAtTheEnd) {
   const auto prepare = [](ElementArray& a, int32_t start) {
     a.setDimensions(2);
     a.setBoundary(1, 4);
-    a.setAutoSelect(1);
+    a.settings.autoSelectNewRows = true;
     for (int32_t i = 0; i < start; ++i) a.appendValue(i + 1);
     // A sparse array, whose next append may shrink the capacity; at 600, down to 20
     // elements in a large capacity, so that appends past 25 shrink it again.

@@ -94,6 +94,17 @@ TEST(HostRules, EachBrokenRuleIsCaught) {
   EXPECT_EQ(
       verdict(2, {0}, [&](HostWord&, uint16_t&) { t.allocations[0].first = 3; }),
       "expression 2 did not answer its text in one buffer of the text's size (3 bytes for 3)");
+  // The host allocates exactly the record size the module asks for: a byte written
+  // after it (here by hand) is caught at the next call.
+  static_cast<unsigned char*>(t.record())[kRunRecordSize] ^= 1;
+  try {
+    t.callAction(8, {"abc"});
+    ADD_FAILURE() << "a write past the run record went unnoticed";
+  } catch (const quorrel::hostsim::ContractError& error) {
+    EXPECT_EQ(std::string(error.what()), "the module wrote past its run record of " +
+                                             std::to_string(kRunRecordSize) + " bytes");
+  }
+  static_cast<unsigned char*>(t.record())[kRunRecordSize] ^= 1;
 }
 
 }  // namespace

@@ -13,7 +13,7 @@ TEST_F(CsvFile, SavesTableRowsWithEmptyCellsAsTwoQuotes) {
   a.appendValue(7);
   EXPECT_EQ(saved(saveCsvFile, a), "name,age\r\n7,\"\"\r\n");
   ElementArray b;
-  loadCsvFile(b, path("out").c_str(), 0);
+  loadCsvFile(b, path("out").c_str(), LoadReplace);
   EXPECT_EQ(b.dimensions(), 2);
   EXPECT_EQ(b.boundary(1), 2);
   EXPECT_EQ(contents(b), "name|age|7|");
@@ -28,8 +28,8 @@ TEST_F(CsvFile, SavesTableRowsWithEmptyCellsAsTwoQuotes) {
   c.appendFile({"bin", 3});
   EXPECT_EQ(saved(saveCsvFile, c), "a,\"\",-5,\"\"\r\n");
   c.setDimensions(2);  // X boundary still 0
-  EXPECT_EQ(saved(saveCsvFile, c, 1), "a,\"\",-5,\"\"\r\na,\"\",-5,\"\"\r\n");
-  EXPECT_EQ(c.fileMode, 1);
+  EXPECT_EQ(saved(saveCsvFile, c, FileModeAppend), "a,\"\",-5,\"\"\r\na,\"\",-5,\"\"\r\n");
+  EXPECT_EQ(c.settings.fileMode, FileModeAppend);
   c.setDimensions(3);
   c.setBoundary(1, 3);
   EXPECT_EQ(saved(saveCsvFile, c), "a,\"\",-5\r\n\"\",\"\",\"\"\r\n");
@@ -50,7 +50,7 @@ TEST_F(CsvFile, RowsWiderThanTheCapWriteNothing) {
   writeBytes(path("out"), "old");
   EXPECT_EQ(saved(saveCsvFile, a), "old");  // not even truncated
   a.setBoundary(1, ElementArray::kMaxSize + 1);
-  saveCsvFile(a, path("new.csv").c_str(), 0);
+  saveCsvFile(a, path("new.csv").c_str(), FileModeTruncate);
   EXPECT_FALSE(exists(path("new.csv")));
 }
 
@@ -85,7 +85,7 @@ TEST_F(CsvFile, AppendAndEmptyFiles) {
   ElementArray a;
   for (int32_t v : {1, 2, 3}) a.appendValue(v);
   a.setKeyString("k", 0);
-  a = loaded(loadCsvFile, "p,q\r\n", std::move(a), 1);
+  a = loaded(loadCsvFile, "p,q\r\n", std::move(a), LoadAppend);
   EXPECT_EQ(a.dimensions(), 2);
   EXPECT_EQ(a.boundary(1), 2);
   EXPECT_STREQ(a.getKeyString(0), "k");

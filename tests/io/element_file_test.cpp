@@ -18,26 +18,26 @@ TEST_F(ElementFile, WritesExactlyTheElementsBytes) {
   a.appendValue(-2);
   a.appendFile({"\0x\0", 3});
   a.appendValue(0);
-  const auto savedElement = [&](int32_t index, uint16_t mode = 0) {
+  const auto savedElement = [&](int32_t index, FileMode mode = FileModeTruncate) {
     return saved([&](ElementArray& array, const char* file,
-                     uint16_t m) { saveElementToFile(array, index, file, m); },
+                     FileMode m) { saveElementToFile(array, index, file, m); },
                  a, mode);
   };
   EXPECT_EQ(savedElement(0), std::string("abc\0", 4));
-  EXPECT_EQ(savedElement(0, 1), std::string("abc\0abc\0", 8));
+  EXPECT_EQ(savedElement(0, FileModeAppend), std::string("abc\0abc\0", 8));
   EXPECT_EQ(savedElement(1), bytesOf({0x02, 0x01, 0, 0}));
   EXPECT_EQ(savedElement(2), bytesOf({0xFE, 0xFF, 0xFF, 0xFF}));
   EXPECT_EQ(savedElement(3), std::string("\0x\0", 3));
-  // A None element: mode 1 leaves the file alone, mode 0 empties it, and a missing
+  // A None element: appending leaves the file alone, truncating empties it, and a missing
   // file is created empty either way.
-  EXPECT_EQ(savedElement(4, 1).size(), 3u);
-  EXPECT_EQ(savedElement(4, 0).size(), 0u);
+  EXPECT_EQ(savedElement(4, FileModeAppend).size(), 3u);
+  EXPECT_EQ(savedElement(4, FileModeTruncate).size(), 0u);
   EXPECT_TRUE(exists(path("out")));
-  saveElementToFile(a, 4, path("new.bin").c_str(), 1);
+  saveElementToFile(a, 4, path("new.bin").c_str(), FileModeAppend);
   EXPECT_TRUE(exists(path("new.bin")));
   // Out of range: no file is touched.
-  saveElementToFile(a, 5, path("none.bin").c_str(), 0);
-  saveElementToFile(a, -1, path("none.bin").c_str(), 0);
+  saveElementToFile(a, 5, path("none.bin").c_str(), FileModeTruncate);
+  saveElementToFile(a, -1, path("none.bin").c_str(), FileModeTruncate);
   EXPECT_FALSE(exists(path("none.bin")));
 }
 
@@ -52,7 +52,7 @@ TEST_F(ElementFile, ReadsWholeFilesOfAnySize) {
     // Passed through a File element, the bytes come out unchanged.
     ElementArray a;
     a.appendFile({block->data(), static_cast<int32_t>(block->size())});
-    saveElementToFile(a, 0, path("out.bin").c_str(), 0);
+    saveElementToFile(a, 0, path("out.bin").c_str(), FileModeTruncate);
     EXPECT_TRUE(readBytes(path("out.bin")) == bytes);
   }
   EXPECT_FALSE(readWholeFile(path("missing.bin").c_str()).has_value());

@@ -23,7 +23,7 @@ TEST_F(HostArrayFile, WritesTheExampleByteForByte) {
   a.appendString("");
   a.setKeyString("key", 0);
   EXPECT_EQ(saved(saveHostArrayFile, a), kExample);
-  EXPECT_EQ(a.fileMode, 0);
+  EXPECT_EQ(a.settings.fileMode, FileModeTruncate);
   // Exactly X x Y elements still get a further, empty layer.
   a.appendFile({"bin", 3});
   EXPECT_EQ(saved(saveHostArrayFile, a),
@@ -36,8 +36,8 @@ TEST_F(HostArrayFile, WritesTheExampleByteForByte) {
   EXPECT_EQ(saved(saveHostArrayFile, b),
             head(2, 1, 1, 3, 2) + le32(3) + "-12" + le32(2) + "xy" + le32(0));
   ElementArray empty = shaped(2, 3);
-  saveHostArrayFile(empty, path("empty.arr").c_str(), 1);
-  EXPECT_EQ(empty.fileMode, 1);
+  saveHostArrayFile(empty, path("empty.arr").c_str(), FileModeAppend);
+  EXPECT_EQ(empty.settings.fileMode, FileModeAppend);
   EXPECT_EQ(readBytes(path("empty.arr")), head(2, 3, 1, 1, 2) + le32(0) + le32(0) + le32(0));
 }
 
@@ -68,13 +68,13 @@ TEST_F(HostArrayFile, MoreCellsThanAnArrayHoldsWriteNothing) {
   EXPECT_EQ(saved(saveHostArrayFile, a), "old");  // not even truncated
   a.setBoundary(1, 65536);
   a.setBoundary(2, 65536);  // 2^32 cells: wraps to 0 in 32 bits
-  saveHostArrayFile(a, path("square.arr").c_str(), 0);
+  saveHostArrayFile(a, path("square.arr").c_str(), FileModeTruncate);
   EXPECT_FALSE(exists(path("square.arr")));
   a.appendString("b");
   a.appendString("c");
   a.setBoundary(1, INT32_MAX);
   a.setBoundary(2, INT32_MAX);  // X × Y wraps to 1, so Z = size + 1 = 4: X × Y × Z > 2^63
-  saveHostArrayFile(a, path("huge.arr").c_str(), 0);
+  saveHostArrayFile(a, path("huge.arr").c_str(), FileModeTruncate);
   EXPECT_FALSE(exists(path("huge.arr")));
 
   // Wide but within the cap: every empty cell is written, 4 bytes each.
@@ -87,7 +87,7 @@ TEST_F(HostArrayFile, MoreCellsThanAnArrayHoldsWriteNothing) {
 TEST_F(HostArrayFile, ByteLessCellsUpToTheLimit) {
   ElementArray a = shaped(2, 3);
   a.appendString("first");
-  a = loaded(loadHostArrayFile, head(1, 4096, 4096, 1, 2), std::move(a), 1);
+  a = loaded(loadHostArrayFile, head(1, 4096, 4096, 1, 2), std::move(a), LoadAppend);
   ASSERT_EQ(a.size(), 1 + 16777216);
   EXPECT_STREQ(a.getString(0), "first");
   EXPECT_EQ(a.at(16777216).type(), ElementType::None);
@@ -100,7 +100,7 @@ TEST_F(HostArrayFile, ByteLessCellsUpToTheLimit) {
 TEST_F(HostArrayFile, AppendKeepsDimensions) {
   ElementArray a = shaped(2, 7);
   a.appendValue(1);
-  a = loaded(loadHostArrayFile, kExample, std::move(a), 1);
+  a = loaded(loadHostArrayFile, kExample, std::move(a), LoadAppend);
   EXPECT_EQ(contents(a), "#1|a|5|~|~");
   EXPECT_EQ(a.dimensions(), 2);
   EXPECT_EQ(a.boundary(1), 7);

@@ -30,15 +30,15 @@ TEST_F(IniFile, SavesOneSectionWithALinePerElement) {
   ElementArray b = shaped(2, 3);
   b.labels = LabelList{"l"};
   b.appendValue(1);
-  loadIniFile(b, path("out").c_str(), 0);
+  loadIniFile(b, path("out").c_str(), LoadReplace);
   EXPECT_EQ(entriesOf(b), "k1=a|=5");
   EXPECT_EQ(b.dimensions(), 2);
   EXPECT_EQ(b.boundary(1), 3);
   EXPECT_EQ(b.labels, LabelList{"l"});
 
   ElementArray empty;
-  saveIniFile(empty, path("e.ini").c_str(), 1);
-  EXPECT_EQ(empty.fileMode, 1);
+  saveIniFile(empty, path("e.ini").c_str(), FileModeAppend);
+  EXPECT_EQ(empty.settings.fileMode, FileModeAppend);
   EXPECT_EQ(readBytes(path("e.ini")), "[ZUBArray]\r\n\r\n");
 
   // Keys of every type, and equals signs in keys.
@@ -53,7 +53,7 @@ TEST_F(IniFile, SavesOneSectionWithALinePerElement) {
   k.setKeyString(" sp ", 3);
   EXPECT_EQ(saved(saveIniFile, k), "[ZUBArray]\r\na=b=x\r\n-4=\r\n=\r\n sp =\r\n\r\n");
   // The line "=" is a single character and so is skipped by the reader.
-  loadIniFile(k, path("out").c_str(), 0);
+  loadIniFile(k, path("out").c_str(), LoadReplace);
   EXPECT_EQ(entriesOf(k), "a=b=x|-4=|sp =");
 }
 
@@ -84,7 +84,7 @@ TEST_F(IniFile, ReaderRules) {
 TEST_F(IniFile, AppendAddsEveryEntry) {
   ElementArray a;
   a.appendValue(3);
-  a = loaded(loadIniFile, "[s]\r\nk=v\r\n[t]\r\nm=n\r\n", std::move(a), 1);
+  a = loaded(loadIniFile, "[s]\r\nk=v\r\n[t]\r\nm=n\r\n", std::move(a), LoadAppend);
   ASSERT_EQ(a.size(), 3);
   EXPECT_EQ(a.getValue(0), 3);
   EXPECT_STREQ(a.getString(1), "v");

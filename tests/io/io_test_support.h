@@ -44,14 +44,14 @@ class IoTest : public ::testing::Test {
   // The array after loading the bytes into it from a file.
   template <typename Load>
   ElementArray loaded(Load load, const std::string& bytes, ElementArray a = {},
-                      int32_t append = 0) {
+                      LoadMode mode = LoadReplace) {
     writeBytes(path("in"), bytes);
-    load(a, path("in").c_str(), append);
+    load(a, path("in").c_str(), mode);
     return a;
   }
   // The bytes of the file "out" after saving the array into it.
   template <typename Save>
-  std::string saved(Save save, ElementArray& a, uint16_t mode = 0) {
+  std::string saved(Save save, ElementArray& a, FileMode mode = FileModeTruncate) {
     save(a, path("out").c_str(), mode);
     return readBytes(path("out"));
   }

@@ -33,16 +33,16 @@ TEST_F(NativeFile, WritesTheExampleAndTheEmptyArrayByteForByte) {
   ASSERT_EQ(kExample.size(), 63u);
   ElementArray a = exampleArray();
   EXPECT_EQ(saved(saveNativeFile, a), kExample);
-  EXPECT_EQ(a.fileMode, 0);
+  EXPECT_EQ(a.settings.fileMode, FileModeTruncate);
 
   ElementArray empty;
   const std::string expected = kHead + le32(0) + le32(0);
   EXPECT_EQ(expected.size(), 26u);
   EXPECT_EQ(saved(saveNativeFile, empty), expected);
   // Mode 1 appends a second copy; mode 0 truncates again.
-  EXPECT_EQ(saved(saveNativeFile, empty, 1), expected + expected);
-  EXPECT_EQ(empty.fileMode, 1);
-  EXPECT_EQ(saved(saveNativeFile, empty, 0), expected);
+  EXPECT_EQ(saved(saveNativeFile, empty, FileModeAppend), expected + expected);
+  EXPECT_EQ(empty.settings.fileMode, FileModeAppend);
+  EXPECT_EQ(saved(saveNativeFile, empty, FileModeTruncate), expected);
 
   ElementArray b = shaped(3, 4, 5);
   b.appendValue(0);
@@ -64,21 +64,21 @@ TEST_F(NativeFile, LabelsTravelAndLengthZeroLeavesAColumnAlone) {
 
   ElementArray b = shaped(2, 3);
   b.labels = LabelList{"x", "y", "z"};
-  loadNativeFile(b, path("out").c_str(), 0);
+  loadNativeFile(b, path("out").c_str(), LoadReplace);
   EXPECT_EQ(b.labels, (LabelList{"name", "y", "age"}));
   // Labels only apply to a two-dimensional array, within its columns.
   ElementArray c = shaped(1);
-  loadNativeFile(c, path("out").c_str(), 1);
+  loadNativeFile(c, path("out").c_str(), LoadAppend);
   EXPECT_FALSE(c.labels.has_value());
   ElementArray d = shaped(2, 2);
-  loadNativeFile(d, path("out").c_str(), 1);
+  loadNativeFile(d, path("out").c_str(), LoadAppend);
   EXPECT_EQ(d.labels, (LabelList{"name", std::nullopt}));
 }
 
 TEST_F(NativeFile, AppendAddsAtTheEndAndKeepsDimensions) {
   ElementArray a = shaped(3, 5, 6);
   for (int i = 1; i <= 5; ++i) a.appendValue(i);
-  a = loaded(loadNativeFile, kExample, std::move(a), 1);
+  a = loaded(loadNativeFile, kExample, std::move(a), LoadAppend);
   EXPECT_EQ(contents(a), "#1|#2|#3|#4|#5|ab|#7");
   EXPECT_EQ(a.dimensions(), 3);
   EXPECT_EQ(a.boundary(1), 5);
@@ -152,7 +152,7 @@ TEST_F(NativeFile, HostileCountsAndSizesAreBoundedByTheFile) {
     const std::string bytes =
         kHead + le32(count) + le32(2) + "ab" + le32(count) + le16(2) + le32(2) + "x";
     EXPECT_LE(loaded(loadNativeFile, bytes).size(), 2);
-    const ElementArray labelled = loaded(loadNativeFile, bytes, shaped(2, 2), 1);
+    const ElementArray labelled = loaded(loadNativeFile, bytes, shaped(2, 2), LoadAppend);
     EXPECT_EQ(labelled.labels,
               count > 0 ? std::optional<LabelList>(LabelList{"ab", "\x02"}) : std::nullopt);
   }

@@ -27,11 +27,12 @@ using Save = std::function<void(ElementArray&, const char*)>;
 // Every whole-file save, by name.
 const std::vector<std::pair<const char*, Save>>& allSaves() {
   static const std::vector<std::pair<const char*, Save>> saves = {
-      {"native", [](ElementArray& a, const char* p) { saveNativeFile(a, p, 0); }},
-      {"host", [](ElementArray& a, const char* p) { saveHostArrayFile(a, p, 0); }},
-      {"csv", [](ElementArray& a, const char* p) { saveCsvFile(a, p, 0); }},
-      {"ini", [](ElementArray& a, const char* p) { saveIniFile(a, p, 0); }},
-      {"element", [](ElementArray& a, const char* p) { saveElementToFile(a, 0, p, 0); }},
+      {"native", [](ElementArray& a, const char* p) { saveNativeFile(a, p, FileModeTruncate); }},
+      {"host", [](ElementArray& a, const char* p) { saveHostArrayFile(a, p, FileModeTruncate); }},
+      {"csv", [](ElementArray& a, const char* p) { saveCsvFile(a, p, FileModeTruncate); }},
+      {"ini", [](ElementArray& a, const char* p) { saveIniFile(a, p, FileModeTruncate); }},
+      {"element",
+       [](ElementArray& a, const char* p) { saveElementToFile(a, 0, p, FileModeTruncate); }},
   };
   return saves;
 }
@@ -212,13 +213,13 @@ TEST_F(SaveFileTest, KilledSaveLeavesOldOrNewBytes) {
   }
   std::string bytes[2];
   for (int v = 0; v < 2; ++v) {
-    saveNativeFile(versions[v], path("v").c_str(), 0);
+    saveNativeFile(versions[v], path("v").c_str(), FileModeTruncate);
     bytes[v] = readBytes(path("v"));
   }
   const std::string target = path("target");
-  saveNativeFile(versions[0], target.c_str(), 0);
+  saveNativeFile(versions[0], target.c_str(), FileModeTruncate);
   const auto start = std::chrono::steady_clock::now();
-  saveNativeFile(versions[1], target.c_str(), 0);
+  saveNativeFile(versions[1], target.c_str(), FileModeTruncate);
   const auto saveTime = std::chrono::steady_clock::now() - start;
   int current = 1;
   int whole = 0;
@@ -229,7 +230,7 @@ TEST_F(SaveFileTest, KilledSaveLeavesOldOrNewBytes) {
     const int next = 1 - current;
     const pid_t pid = fork();
     if (pid == 0) {
-      saveNativeFile(versions[next], target.c_str(), 0);
+      saveNativeFile(versions[next], target.c_str(), FileModeTruncate);
       _exit(0);
     }
     std::this_thread::sleep_for(saveTime * std::uniform_real_distribution<>(0.0, 2.5)(random));

@@ -12,8 +12,8 @@ namespace quorrel {
 
 inline ElementArray settings(bool wildcard, bool caseSensitive) {
   ElementArray a;
-  a.searchMode = wildcard ? SearchWildcard : SearchLiteral;
-  a.caseMode = caseSensitive ? CaseSensitive : CaseInsensitive;
+  a.settings.searchMode = wildcard ? SearchWildcard : SearchLiteral;
+  a.settings.caseMode = caseSensitive ? CaseSensitive : CaseInsensitive;
   return a;
 }
 

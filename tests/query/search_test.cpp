@@ -38,8 +38,8 @@ TEST(FindContaining, AgreesWithSpanComparisonAtEveryOffset) {
   const std::string alphabet = "aAb?*\x01\xE1";
   for (int round = 0; round < 3000; ++round) {
     ElementArray array;
-    array.caseMode = static_cast<int16_t>(round & 1);
-    array.searchMode = static_cast<int16_t>((round >> 1) & 1);
+    array.settings.caseMode = static_cast<CaseMode>(round & 1);
+    array.settings.searchMode = static_cast<SearchMode>((round >> 1) & 1);
     for (int e = 0; e < 4; ++e) {
       std::string bytes(rng() % 7, ' ');
       for (char& c : bytes) c = alphabet[rng() % alphabet.size()];

@@ -117,7 +117,7 @@ void fillRandom(ElementArray& array, std::mt19937& rng, int count) {
 
 void checkAgainstReference(std::mt19937& rng, int count, int round, bool allowTables) {
   ElementArray original;
-  original.caseMode = static_cast<int16_t>(round % 2);
+  original.settings.caseMode = static_cast<CaseMode>(round % 2);
   fillRandom(original, rng, count);
   static const SortKind kKinds[] = {SortByText, SortByValue, static_cast<SortKind>(3)};
   const SortKind kind = kKinds[(round / 2) % 3];
@@ -129,7 +129,7 @@ void checkAgainstReference(std::mt19937& rng, int count, int round, bool allowTa
   for (auto& id : expected) id += 1;
 
   ElementArray fast;
-  fast.caseMode = original.caseMode;
+  fast.settings.caseMode = original.settings.caseMode;
   for (int32_t i = 0; i < original.size(); ++i) {
     const Element& e = original.at(i);
     fast.insertElement({e.type(), e.number(), e.bytes(), e.size()}, i);
@@ -137,7 +137,7 @@ void checkAgainstReference(std::mt19937& rng, int count, int round, bool allowTa
   }
   sortdetail::sortRange(fast, kind, static_cast<int16_t>(descending), 0, count - 1, allowTables);
   ASSERT_EQ(keyIds(fast), expected)
-      << "kind " << kind << " descending " << descending << " case " << original.caseMode;
+      << "kind " << kind << " descending " << descending << " case " << original.settings.caseMode;
 }
 
 // With a table of keys and, as when no memory can be had for one, in place.

@@ -76,7 +76,7 @@ RandomTable randomTable(std::mt19937& rng) {
   t.columns = 1 + static_cast<int32_t>(rng() % 3);
   t.array.setDimensions(2);
   t.array.setBoundary(1, t.columns);
-  t.array.setAutoSelect(static_cast<int32_t>(rng() % 2));
+  t.array.settings.autoSelectNewRows = rng() % 2 == 1;
   const auto count = rng() % 14;
   for (unsigned i = 0; i < count; ++i) appendRandomCell(rng, t);
   for (uint8_t& state : t.array.rowStates) state = rng() % 2 == 0 ? RowSelected : RowUnselected;
@@ -102,8 +102,8 @@ std::vector<uint8_t> expectedStates(const RandomTable& t, int32_t column, Test&&
   for (std::size_t r = 0; r < states.size(); ++r) {
     const ModelCell* cell = modelCell(t, static_cast<int32_t>(r), column);
     const bool pass = cell != nullptr && passes(*cell);
-    if (t.array.selectionMode == SelectOr && pass) states[r] = RowSelected;
-    if (t.array.selectionMode == SelectAnd && !pass) states[r] = RowUnselected;
+    if (t.array.settings.selectionMode == SelectOr && pass) states[r] = RowSelected;
+    if (t.array.settings.selectionMode == SelectAnd && !pass) states[r] = RowUnselected;
   }
   return states;
 }
@@ -169,9 +169,9 @@ TEST(RandomTables, SelectionsAndAggregatesAgreeWithTheModel) {
     expectAggregatesOfTheModel(t, column, round);
     if (HasFatalFailure()) return;
 
-    a.caseMode = static_cast<int16_t>(rng() % 2);
-    a.searchMode = static_cast<int16_t>(rng() % 2);
-    a.selectionMode = static_cast<int32_t>(rng() % 2);
+    a.settings.caseMode = static_cast<CaseMode>(rng() % 2);
+    a.settings.searchMode = static_cast<SearchMode>(rng() % 2);
+    a.settings.selectionMode = static_cast<SelectionMode>(rng() % 2);
     // Texts: the probe is the low end of a between test, another random text the high end.
     const std::string probe = randomProbe(rng, t);
     const std::string high = randomProbe(rng, t);
@@ -209,8 +209,8 @@ TEST(RandomTables, SelectionsAndAggregatesAgreeWithTheModel) {
     where.select(a, column);
     ASSERT_EQ(a.rowStates, expected)
         << "round " << round << " " << where.name << " probe «" << (low ? probe : "(none)")
-        << "» column " << column << " case " << a.caseMode << " wildcard " << a.searchMode
-        << " mode " << a.selectionMode;
+        << "» column " << column << " case " << a.settings.caseMode << " wildcard "
+        << a.settings.searchMode << " mode " << a.settings.selectionMode;
     for (std::size_t r = 0; r < before.size(); ++r) {
       passes += before[r] != expected[r] && expected[r] == RowSelected;
       failures += before[r] != expected[r] && expected[r] == RowUnselected;

@@ -50,7 +50,8 @@ void expectSameAsReference(ElementArray& a, ElementArray& copy, int32_t kind, bo
   referenceRowSort(copy, 0, kind, descending, 0, copy.tableRowCount() - 1);
   sortRows(a, 0, kind, descending);
   ASSERT_EQ(columnTexts(a, 1), columnTexts(copy, 1))
-      << what << " kind " << kind << " descending " << descending << " case " << a.caseMode;
+      << what << " kind " << kind << " descending " << descending << " case "
+      << a.settings.caseMode;
 }
 
 // Keys from a small alphabet so that ties (including case-only ties) abound: codes below 10
@@ -61,10 +62,10 @@ TEST(RowSortExactness, RandomTablesWithManyTies) {
   for (int round = 0; round < 3000; ++round) {
     std::vector<uint32_t> codes(rng() % 14);
     for (uint32_t& code : codes) code = rng() % 4 == 0 ? 10 + rng() % 7 : rng() % 10;
-    const auto caseMode = static_cast<int16_t>(rng() % 2);
+    const auto caseMode = static_cast<CaseMode>(rng() % 2);
     auto build = [&] {
       ElementArray t = makeTable(2);
-      t.caseMode = caseMode;
+      t.settings.caseMode = caseMode;
       for (int32_t r = 0; r < static_cast<int32_t>(codes.size()); ++r) {
         const uint32_t code = codes[static_cast<std::size_t>(r)];
         if (code < 10) t.setString(kTexts[code], 2 * r);

@@ -23,7 +23,7 @@ inline ElementArray makeTable(int32_t columns, std::initializer_list<const char*
   ElementArray a;
   a.setDimensions(2);
   a.setBoundary(1, columns);
-  a.setAutoSelect(autoSelect);
+  a.settings.autoSelectNewRows = autoSelect;
   for (const char* row : rows) appendRowFromList(a, row);
   return a;
 }

@@ -5,7 +5,7 @@
 # is missing.
 #   run_wine_cases.sh BUILD64 BUILD32 CASES EXAMPLES WORK
 # BUILD64 and BUILD32 hold quorrel.exe beside quorrel.dll (cross builds mingw64 and
-# mingw); the 32-bit one runs too where Wine runs 32-bit programs.
+# mingw); the 32-bit one, the shipped DLL, runs too where 32-bit Wine is set up.
 set -u
 build64=$1 build32=$2 cases=$3 examples=$4 work=$5
 here=$(cd "$(dirname "$0")" && pwd)
@@ -27,7 +27,7 @@ run_case() {  # command case workdir
   bash "$here/../tools/run_case.sh" "$1" "$2" "$3" "$examples"
 }
 run_all() {  # wine build label
-  local wine=$1 build=$2 label=$3 passed=0 failed=0 case name
+  local wine=$1 build=$2 label=$3 passed=0 failed=0 case name start=$SECONDS
   local command=$work/quorrel-$label
   printf '#!/bin/sh\nexec "%s" "%s" "$@"\n' "$wine" "$build/quorrel.exe" >"$command"
   chmod +x "$command"
@@ -48,7 +48,7 @@ run_all() {  # wine build label
       cat "$work/$label.log"
     fi
   done
-  echo "$label: $passed passed, $failed failed"
+  echo "$label: $passed passed, $failed failed ($((SECONDS - start)) s)"
   total_fail=$((total_fail + failed))
 }
 

@@ -26,15 +26,19 @@ fi
 
 wine_session_start "$work" || exit 77
 # Windows in a Wine desktop of their own: with no window manager on the display, every
-# dialog that closes would wait two seconds for one to acknowledge it.
-if [[ ! -f $work/desktop-set ]]; then
-  "$WINE64" reg add 'HKCU\Software\Wine\Explorer' /v Desktop /d Default /f >/dev/null &&
-    "$WINE64" reg add 'HKCU\Software\Wine\Explorer\Desktops' /v Default /d 800x600 /f >/dev/null &&
-    touch "$work/desktop-set"
-  "$WINESERVER" -k
-  "$WINESERVER" -w
-  "$WINESERVER" -p
-fi
+# dialog that closes would wait two seconds for one to acknowledge it (the first 32-bit
+# run took a minute without it). Each prefix keeps the setting once it has it.
+use_own_desktop() {  # wine prefix wineserver
+  [[ -f $2/desktop-set ]] && return 0
+  "$1" reg add 'HKCU\Software\Wine\Explorer' /v Desktop /d Default /f >/dev/null &&
+    "$1" reg add 'HKCU\Software\Wine\Explorer\Desktops' /v Default /d 800x600 /f >/dev/null &&
+    touch "$2/desktop-set"
+  "$3" -k
+  "$3" -w
+  "$3" -p
+}
+use_own_desktop "$WINE64" "$WINEPREFIX" "$WINESERVER"
+[[ -n $WINE32 ]] && use_own_desktop "$WINE32" "$work/prefix32" "$WINESERVER32"
 
 status=0
 echo "win64:"

@@ -1,11 +1,43 @@
-# Sourced by the Wine test scripts: finds Wine and starts one persistent wineserver
-# for every program the script runs (a Wine start then costs a fraction of a second).
-#   wine_session_start DIR   prefix in DIR/prefix; returns 1 (and says why) without wine64
-# Sets WINE64, and WINE32 where Wine runs 32-bit programs (WINE32_WHY otherwise).
+# Sourced by the Wine test scripts: finds Wine and starts one persistent wineserver per
+# prefix for every program the script runs (a Wine start then costs a fraction of a
+# second).
+#   wine_session_start DIR   64-bit prefix in DIR/prefix, 32-bit one in DIR/prefix32;
+#                            returns 1 (and says why) without wine64
+# Sets WINE64 and WINESERVER, and WINE32 (a command running a 32-bit program in the
+# 32-bit prefix, through scripts/wine32) where 32-bit Wine is set up; WINE32_WHY otherwise.
+
+wine_session_repo=$(cd "$(dirname "${BASH_SOURCE[0]}")/../.." && pwd)
+wine32_home=${QUORREL_WINE32_HOME:-/var/lib/quorrel-wine32}
 
 wine_session_stop() {
   [[ -n ${WINESERVER:-} ]] && "$WINESERVER" -k >/dev/null 2>&1
+  [[ -n ${WINESERVER32:-} ]] && "$WINESERVER32" -k >/dev/null 2>&1
   return 0
+}
+
+# Writes DIR/NAME: a command that runs scripts/wine32 PROGRAM in the 32-bit prefix.
+wine32_command() {
+  printf '#!/bin/sh\nWINEPREFIX="%s" exec "%s" %s "$@"\n' "$1/prefix32" \
+    "$wine_session_repo/scripts/wine32" "$3" >"$1/$2"
+  chmod +x "$1/$2"
+}
+
+wine32_start() {
+  local dir=$1
+  WINE32= WINESERVER32=
+  if [[ ! -x $wine32_home/root/usr/lib/wine/wine || ! -f $wine32_home/route ]]; then
+    WINE32_WHY=$(cat "$wine32_home/why" 2>/dev/null ||
+      echo "there is no i386 root with wine32 in $wine32_home")
+    WINE32_WHY="32-bit Wine is not set up (scripts/install-wine): $WINE32_WHY"
+    return 1
+  fi
+  wine32_command "$dir" wine32 wine
+  wine32_command "$dir" wineserver32 wineserver
+  WINESERVER32=$dir/wineserver32
+  mkdir -p "$dir/prefix32"
+  "$WINESERVER32" -p || { WINE32_WHY="the 32-bit wineserver does not start"; return 1; }
+  WINE32=$dir/wine32
+  "$WINE32" cmd /c exit >/dev/null 2>&1 </dev/null
 }
 
 wine_session_start() {
@@ -17,15 +49,14 @@ wine_session_start() {
     echo "programs did not run"
     return 1
   fi
-  WINE32=$(ls /usr/lib/wine/wine 2>/dev/null || true)
   WINE32_WHY=
-  [[ -z $WINE32 ]] && WINE32_WHY="wine32 is not installed: the i386 architecture is not usable here"
   mkdir -p "$dir/prefix"
   export WINEPREFIX=$dir/prefix WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml="
   "$WINESERVER" -p
   trap wine_session_stop EXIT
   # The first start of a new prefix sets it up; do it once, outside any measured case.
   "$WINE64" cmd /c exit >/dev/null 2>&1 </dev/null
+  wine32_start "$dir"
   return 0
 }
 

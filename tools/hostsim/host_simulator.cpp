@@ -13,12 +13,61 @@
 #include <cstdio>
 #include <cstring>
 #include <filesystem>
+#include <string>
 
 namespace quorrel::hostsim {
 namespace {
 
 using abi::readField;
 using abi::writeField;
+
+#if defined(_WIN32) && defined(__i386__)
+// The host calls every routine as stdcall: the routine removes its own arguments. One
+// built with another convention leaves the stack pointer where the host does not expect
+// it, which a game would not survive, while a call made by C++ here would hide it (the
+// caller soon restores its frame). So the call is made by hand: three words pushed, the
+// routine called, and the bytes it left on the stack handed back.
+extern "C" uint32_t quorrelCallStdcall(const void* routine, uint32_t first, uint32_t second,
+                                       uint32_t third, uint32_t* bytesLeft);
+asm(R"(
+  .text
+  .globl _quorrelCallStdcall
+_quorrelCallStdcall:
+  pushl %ebp
+  movl %esp, %ebp
+  pushl %esi
+  movl %esp, %esi
+  pushl 20(%ebp)
+  pushl 16(%ebp)
+  pushl 12(%ebp)
+  call *8(%ebp)
+  movl %esi, %ecx
+  subl %esp, %ecx
+  movl 24(%ebp), %edx
+  movl %ecx, (%edx)
+  movl %esi, %esp
+  popl %esi
+  popl %ebp
+  ret
+)");
+
+// Calls ROUTINE (KIND CODE) with its arguments, ARGUMENT_BYTES of the three words, as the
+// host does.
+template <typename Routine>
+uint32_t callAsHost(const char* kind, int32_t code, Routine routine, uint32_t argumentBytes,
+                    uint32_t first, uint32_t second, uint32_t third) {
+  uint32_t bytesLeft = 0;
+  const uint32_t answer =
+      quorrelCallStdcall(reinterpret_cast<const void*>(routine), first, second, third, &bytesLeft);
+  if (bytesLeft != 12 - argumentBytes) {
+    throw ContractError(kind + (" " + std::to_string(code)) + " removed " +
+                        std::to_string(12 - bytesLeft) + " of its " +
+                        std::to_string(argumentBytes) +
+                        " argument bytes from the stack (not stdcall)");
+  }
+  return answer;
+}
+#endif
 
 template <typename Fn>
 Fn optional(const Module& module, const char* name) {
@@ -278,7 +327,11 @@ Instance::Instance(const Module& module, SetupRecord setup, bool createNow)
     : module_(module), setup_(std::move(setup)) {
   module.routines();  // a module with the wrong tables fails before any instance exists
   const auto size = module.entry<abi::GetRunObjectDataSizeFn>("GetRunObjectDataSize")(0, 0);
-  runRecord_.assign(std::max<size_t>(static_cast<uint16_t>(size), abi::kRunRecordSize), 0);
+  // The host allocates just the size the module asks for; the guard bytes after it show
+  // a module that writes past its record (a field placed for the other pointer width).
+  recordSize_ = std::max<size_t>(static_cast<uint16_t>(size), abi::kRunHostPartSize);
+  runRecord_.assign(recordSize_ + kRecordGuardBytes, kRecordGuard);
+  std::fill_n(runRecord_.begin(), recordSize_, 0);
   runHeader_.assign(abi::kRunHeaderMinSize, 0);
   writeField(runHeader_.data(), abi::kFetchFirstParameter,
              static_cast<abi::FetchParameterService>(&fetchFirst));
@@ -295,6 +348,15 @@ Instance::Instance(const Module& module, SetupRecord setup, bool createNow)
 void Instance::create() {
   created_ = true;
   module_.entry<abi::CreateRunObjectFn>("CreateRunObject")(record(), setup_.data(), 0);
+  checkRecordEnd();
+}
+
+void Instance::checkRecordEnd() const {
+  const auto guard = runRecord_.begin() + static_cast<std::ptrdiff_t>(recordSize_);
+  if (std::any_of(guard, runRecord_.end(), [](unsigned char b) { return b != kRecordGuard; })) {
+    throw ContractError("the module wrote past its run record of " + std::to_string(recordSize_) +
+                        " bytes");
+  }
 }
 
 void Instance::destroy() {
@@ -366,7 +428,16 @@ int16_t Instance::callAction(int32_t code, const std::vector<Argument>& args) {
   const Argument none;
   const Argument& first = args.size() > 0 ? args[0] : none;
   const Argument& second = args.size() > 1 ? args[1] : none;
-  return module_.routines().actions[code](record(), first.word(), second.word());
+  const abi::ActionRoutine routine = module_.routines().actions[code];
+#if defined(_WIN32) && defined(__i386__)
+  const auto answer = static_cast<int16_t>(callAsHost("action", code, routine, 12,
+                                                      reinterpret_cast<uint32_t>(record()),
+                                                      first.word(), second.word()));
+#else
+  const int16_t answer = routine(record(), first.word(), second.word());
+#endif
+  checkRecordEnd();
+  return answer;
 }
 
 abi::HostWord Instance::callExpressionRaw(int32_t code, std::vector<Argument> args,
@@ -376,7 +447,15 @@ abi::HostWord Instance::callExpressionRaw(int32_t code, std::vector<Argument> ar
   fetches.clear();
   allocations.clear();
   results_.clear();
-  return module_.routines().expressions[code](record(), token);
+  const abi::ExpressionRoutine routine = module_.routines().expressions[code];
+#if defined(_WIN32) && defined(__i386__)
+  const abi::HostWord answer =
+      callAsHost("expression", code, routine, 8, reinterpret_cast<uint32_t>(record()), token, 0);
+#else
+  const abi::HostWord answer = routine(record(), token);
+#endif
+  checkRecordEnd();
+  return answer;
 }
 
 ExpressionResult Instance::callExpression(int32_t code, const std::vector<Argument>& args) {

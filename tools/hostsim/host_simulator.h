@@ -180,11 +180,17 @@ class Instance {
                                               abi::HostWord token);
   static char* QUORREL_CALL allocate(void* runRecord, int32_t byteCount, int32_t reserved);
   abi::HostWord fetch(bool first, int32_t typeFlag, abi::HostWord token);
+  // Throws ContractError when the module wrote past the record size it asked for.
+  void checkRecordEnd() const;
+
+  static constexpr size_t kRecordGuardBytes = 64;
+  static constexpr unsigned char kRecordGuard = 0xA5;
 
   const Module& module_;
   SetupRecord setup_;
   bool created_ = false;
-  std::vector<unsigned char> runRecord_;
+  size_t recordSize_ = 0;
+  std::vector<unsigned char> runRecord_;  // the record, then guard bytes
   std::vector<unsigned char> runHeader_;
   std::vector<Argument> pending_;  // parameters of the expression being called
   size_t nextParameter_ = 0;

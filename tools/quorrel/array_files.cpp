@@ -77,7 +77,7 @@ ArrayFormat formatOfOutputPath(std::string_view path) {
 std::vector<ElementTypes> readNativeElementTypes(const std::string& path) {
   // The module's own reader, linked in: no expression tells an element's type.
   ElementArray array;
-  loadNativeFile(array, path.c_str(), 0);
+  loadNativeFile(array, path.c_str(), LoadReplace);
   std::vector<ElementTypes> types;
   for (int32_t i = 0; i < array.size(); ++i) {
     const Element& element = array.at(i);

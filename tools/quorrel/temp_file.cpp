@@ -9,11 +9,6 @@
 #include <iterator>
 #include <random>
 
-#ifdef _WIN32
-#include <fcntl.h>
-#include <io.h>
-#endif
-
 #include "commands.h"
 
 namespace quorrel::tool {
@@ -63,19 +58,14 @@ void writeWholeFile(const std::string& path, std::string_view bytes) {
   if (!out.flush()) throw FileError("cannot write " + path);
 }
 
+// main() made the standard streams binary on every system.
 std::string readStandardInput() {
-#ifdef _WIN32
-  _setmode(_fileno(stdin), _O_BINARY);
-#endif
   std::string bytes(std::istreambuf_iterator<char>(std::cin), {});
   return bytes;
 }
 
 void writeStandardOutput(std::string_view bytes) {
   std::cout.flush();
-#ifdef _WIN32
-  _setmode(_fileno(stdout), _O_BINARY);
-#endif
   std::fwrite(bytes.data(), 1, bytes.size(), stdout);
   std::fflush(stdout);
 }
