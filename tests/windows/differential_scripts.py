@@ -78,7 +78,9 @@ def quote(text):
 def swapcase(text):
     """Other case in ASCII and in Latin-1 (raw bytes \\xc0..\\xfe, which Windows' own
     case folding would join): the module folds only A-Z, on every system."""
-    latin = lambda c: chr(ord(c) ^ 0x20) if 0xDCC0 <= ord(c) <= 0xDCFE and ord(c) not in (0xDCD7, 0xDCF7) else c
+    def latin(c):
+        letter = 0xDCC0 <= ord(c) <= 0xDCFE and ord(c) not in (0xDCD7, 0xDCF7)
+        return chr(ord(c) ^ 0x20) if letter else c
     return "".join(latin(c) for c in text.swapcase())
 
 
@@ -151,7 +153,8 @@ class Script:
 
     def call(self, entry):
         kind, name, params = entry
-        if sum(t == "text" and d.endswith("to read") for t, d in params) and self.reads >= MAX_READS:
+        reads = any(t == "text" and d.endswith("to read") for t, d in params)
+        if reads and self.reads >= MAX_READS:
             return None
         args = [self.argument(t, d) for t, d in params]
         return " ".join([kind, name if kind == "A" else name + "("] + args)

@@ -102,5 +102,5 @@ else
   echo "win32: skipped ($WINE32_WHY)"
 fi
 ((compared > 0)) || skip "no Windows build could run"
-echo "differential: $compared scripts, $differences differences ($labels against linux)"
+echo "differential: $compared scripts, $differences differences (${labels# } against linux)"
 ((differences == 0))
