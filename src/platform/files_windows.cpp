@@ -140,10 +140,33 @@ void SaveFile::discard() {
   temp_.clear();
 }
 
+namespace {
+
+// The error number a POSIX system gives for the same failure, so that both say the
+// same; 0 where there is none to match.
+int errnoOf(DWORD error) {
+  switch (error) {
+    case ERROR_FILE_NOT_FOUND:
+    case ERROR_PATH_NOT_FOUND:
+    case ERROR_INVALID_NAME:
+      return ENOENT;
+    case ERROR_ACCESS_DENIED:
+    case ERROR_SHARING_VIOLATION:
+      return EACCES;
+    case ERROR_DISK_FULL:
+    case ERROR_HANDLE_DISK_FULL:
+      return ENOSPC;
+    default:
+      return 0;
+  }
+}
+
+}  // namespace
+
 FileStatus SaveFile::replaceTarget() {
   if (!MoveFileExA(temp_.c_str(), target_.c_str(),
                    MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH)) {
-    return {FileStatus::Replace};
+    return {FileStatus::Replace, errnoOf(GetLastError())};
   }
   temp_.clear();
   return {};
