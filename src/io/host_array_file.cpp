@@ -18,7 +18,6 @@ namespace {
 
 using io_detail::Cursor;
 
-constexpr std::string_view kHeader{"CNC ARRAY\0", 10};
 constexpr int32_t kVersion = 2;
 constexpr int32_t kTextCells = 2;
 // Text cells without bytes cost nothing to read, so a tiny file could declare
@@ -71,7 +70,7 @@ FileStatus writeHostFile(const char* path, FileMode mode, const ElementArray& ar
   SaveFile file(path, mode == FileModeAppend);
   if (!file.isOpen()) return {FileStatus::Open, errno};
   BufferedWriter out(file.handle());
-  out.text(kHeader);
+  out.text(kHostFileHeader);
   out.i32(kVersion);
   out.i32(x);
   out.i32(y);
@@ -104,7 +103,7 @@ int64_t cellCount(int32_t x, int32_t y, int32_t z) {
 template <class Sink>
 bool parseHost(char* data, std::size_t size, Sink& sink) {
   Cursor in({data, size});
-  if (!in.matches(kHeader)) return false;
+  if (!in.matches(kHostFileHeader)) return false;
   const int32_t version = in.i32();
   const int32_t x = in.i32();
   const int32_t y = in.i32();

@@ -4,11 +4,15 @@
 #pragma once
 
 #include <cstdint>
+#include <string_view>
 
 #include "array/element_array.h"
 #include "io/file_handle.h"
 
 namespace quorrel {
+
+// The first bytes of every host array file.
+inline constexpr std::string_view kHostFileHeader{"CNC ARRAY\0", 10};
 
 // Writes every element's text form as a text cell. X and Y are the boundaries of
 // dimensions 1 and 2 (0 counts as 1); Z is size / (X x Y) + 1.

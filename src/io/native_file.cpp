@@ -39,7 +39,6 @@ struct ElementRecord {
 
 using io_detail::Cursor;
 
-constexpr std::string_view kMagic{"ZUBARRAY", 8};
 constexpr uint16_t kTypeValue = static_cast<uint16_t>(ElementType::Value);
 constexpr uint16_t kTypeString = static_cast<uint16_t>(ElementType::String);
 constexpr int32_t kMaxDimensions = ElementArray::kBoundaryCount;
@@ -47,7 +46,7 @@ constexpr int32_t kMaxDimensions = ElementArray::kBoundaryCount;
 // --- Writing -------------------------------------------------------------------------
 
 void writeHeader(BufferedWriter& out, int32_t dimensions, const int32_t* boundaries) {
-  out.text(kMagic);
+  out.text(kNativeFileMagic);
   out.u16(1);
   out.i32(dimensions);
   for (int32_t d = 0; d < std::min(dimensions, kMaxDimensions); ++d) out.i32(boundaries[d]);
@@ -143,7 +142,7 @@ template <class Sink>
 template <class Sink>
 bool parseNative(std::string_view file, Sink& sink) {
   Cursor in(file);
-  if (!in.matches(kMagic)) return false;
+  if (!in.matches(kNativeFileMagic)) return false;
   const uint16_t version = in.u16();
   sink.version(version);
   if (static_cast<int16_t>(version) > 1) return false;

@@ -3,11 +3,15 @@
 #pragma once
 
 #include <cstdint>
+#include <string_view>
 
 #include "array/element_array.h"
 #include "io/file_handle.h"
 
 namespace quorrel {
+
+// The first bytes of every native array file.
+inline constexpr std::string_view kNativeFileMagic{"ZUBARRAY", 8};
 
 // Writes the whole array; stores `mode` in the settings' fileMode.
 FileStatus saveNativeFile(ElementArray& array, const char* path, FileMode mode);

@@ -4,19 +4,17 @@
 #include <cstring>
 
 #include "array/element_array.h"
+#include "io/host_array_file.h"
 #include "io/native_file.h"
 
 namespace quorrel::tool {
 namespace {
 
-constexpr std::string_view kNativeMagic{"ZUBARRAY", 8};
-constexpr std::string_view kHostHeader{"CNC ARRAY\0", 10};
-
 const FormatInfo kFormats[] = {
-    {"native", "native array file", 3, 0},
-    {"host", "host array file", 4, 1},
-    {"csv", "CSV file", 5, 2},
-    {"ini", "INI file", 59, 58},
+    {"native", "native array file", "loadFromFile", "saveToFile"},
+    {"host", "host array file", "loadFromHostArray", "saveToHostArray"},
+    {"csv", "CSV file", "loadFromCsv", "saveToCsv"},
+    {"ini", "INI file", "loadFromIni", "saveToIni"},
 };
 
 bool startsWith(std::string_view text, std::string_view prefix) {
@@ -60,8 +58,8 @@ std::optional<ArrayFormat> formatOfName(std::string_view name) {
 }
 
 std::optional<ArrayFormat> recogniseFormat(std::string_view bytes) {
-  if (startsWith(bytes, kNativeMagic)) return ArrayFormat::Native;
-  if (startsWith(bytes, kHostHeader)) return ArrayFormat::Host;
+  if (startsWith(bytes, kNativeFileMagic)) return ArrayFormat::Native;
+  if (startsWith(bytes, kHostFileHeader)) return ArrayFormat::Host;
   if (bytes.find('\0') != std::string_view::npos) return std::nullopt;
   const std::string_view line = firstMeaningfulLine(bytes);
   if (startsWith(line, "[") && line.find(']') != std::string_view::npos) return ArrayFormat::Ini;

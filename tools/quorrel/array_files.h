@@ -16,8 +16,8 @@ enum class ArrayFormat { Native, Host, Csv, Ini };
 struct FormatInfo {
   const char* name;         // as --to takes it
   const char* description;  // as inspect prints it
-  int32_t loadAction;
-  int32_t saveAction;
+  const char* loadAction;   // the actions' names, as scripts call them
+  const char* saveAction;
 };
 
 const FormatInfo& formatInfo(ArrayFormat format);

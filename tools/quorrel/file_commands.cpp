@@ -8,6 +8,7 @@
 #include <iostream>
 
 #include "array_files.h"
+#include "catalog.h"
 #include "commands.h"
 #include "temp_file.h"
 #include "text_formats.h"
@@ -81,7 +82,7 @@ std::unique_ptr<Instance> loadInto(const Module& module, ArrayFormat format,
   SetupFields setup;
   setup.dims = 1;
   auto instance = std::make_unique<Instance>(module, setup);
-  instance->callAction(formatInfo(format).loadAction, {text(path)});
+  instance->callAction(actionCodeOfName(formatInfo(format).loadAction).value(), {text(path)});
   return instance;
 }
 
@@ -89,7 +90,8 @@ std::unique_ptr<Instance> loadInto(const Module& module, ArrayFormat format,
 std::vector<ElementTypes> snapshotTypes(Instance& instance) {
   try {
     const TempFile snapshot;
-    instance.callAction(formatInfo(ArrayFormat::Native).saveAction, {text(snapshot.path())});
+    instance.callAction(actionCodeOfName(formatInfo(ArrayFormat::Native).saveAction).value(),
+                        {text(snapshot.path())});
     return readNativeElementTypes(snapshot.path());
   } catch (const FileError&) {
     return {};
@@ -441,7 +443,8 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
     warnLosses(contents, target, false, std::cerr);
     // The save action reports nothing: make sure beforehand that the file can be written.
     const TempFile staging;
-    instance->callAction(formatInfo(target).saveAction, {text(staging.path())});
+    instance->callAction(actionCodeOfName(formatInfo(target).saveAction).value(),
+                         {text(staging.path())});
     bytes = readWholeFile(staging.path());
   }
   if (out == "-") {
