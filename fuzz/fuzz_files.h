@@ -1,24 +1,60 @@
-// Shared by the file-format fuzz targets: a private temporary file per process and the
-// invariants every array must keep whatever it loaded.
+// Shared by the file-format fuzz targets: a private temporary folder per process and the
+// invariants every array must keep whatever it loaded. Portable: the Windows builds
+// replay the corpora under Wine (tests/windows/run_wine_fuzz.sh).
 #pragma once
-
-#include <unistd.h>
 
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
+#include <random>
 #include <string>
 
 #include "array/element_array.h"
 
 namespace quorrel {
 
+// This process's own folder in the system's temporary folder (TMPDIR, or TMP and TEMP
+// on Windows), made on first use under a random name: making it fails when the name is
+// taken, so no two processes share one, whatever their process numbers (Wine numbers
+// the processes of each prefix on its own). Removed with its files when the process
+// ends normally.
+class FuzzTempFolder {
+ public:
+  static const std::filesystem::path& path() {
+    static const FuzzTempFolder folder;
+    return folder.path_;
+  }
+  FuzzTempFolder(const FuzzTempFolder&) = delete;
+  FuzzTempFolder& operator=(const FuzzTempFolder&) = delete;
+
+ private:
+  FuzzTempFolder() {
+    namespace fs = std::filesystem;
+    std::error_code error;
+    fs::path base = fs::temp_directory_path(error);
+    if (error) base = ".";
+    std::random_device random;
+    for (int attempt = 0; attempt < 100; ++attempt) {
+      fs::path candidate = base / ("quorrel-fuzz-" + std::to_string(random()));
+      if (fs::create_directory(candidate, error)) {
+        path_ = std::move(candidate);
+        return;
+      }
+    }
+    std::fprintf(stderr, "cannot make a folder in %s\n", base.string().c_str());
+    std::abort();
+  }
+  ~FuzzTempFolder() {
+    std::error_code error;
+    std::filesystem::remove_all(path_, error);
+  }
+  std::filesystem::path path_;
+};
+
+// A file or folder name in this process's temporary folder.
 inline std::string fuzzTempPath(const char* name) {
-  std::error_code error;
-  std::filesystem::path base = std::filesystem::temp_directory_path(error);
-  if (error) base = ".";
-  return (base / ("quorrel-fuzz-" + std::to_string(getpid()) + "-" + name)).string();
+  return (FuzzTempFolder::path() / name).string();
 }
 
 inline void writeFuzzFile(const std::string& path, const uint8_t* data, size_t size) {

@@ -1,11 +1,18 @@
 // A host for the fuzz targets that drive the module: the routine tables come from
 // GetRunObjectInfos, instances from CreateRunObject, and expressions reach the three
 // host services through a fake run-time header, as the real host does. The module is
-// linked in statically so that the sanitizers and coverage see all of it.
+// linked in statically so that the sanitizers and coverage see all of it; in the Windows
+// builds it is the quorrel.dll that ships, loaded as quorrel.exe loads it (fuzzModule).
 //
 // After every call the instance's array and the call's result are checked; any broken
 // invariant is a crash. File paths handed to the module always lie inside a private
 // temporary folder that is emptied before each input.
+//
+// The check reads the instance's ElementArray through the run record, which a host never
+// does. With the DLL the array lives in the DLL's memory and this program reads it with
+// its own copy of the core's code: the same headers and the same compiler and flags
+// (one build tree) give both the same layout, and the program only reads it, never
+// allocates or frees what the DLL owns.
 #pragma once
 
 #include <cstdint>
@@ -31,15 +38,27 @@ namespace fs = std::filesystem;
 using abi::HostWord;
 
 // The module, reached as a host reaches it: linked into this program (so that the
-// sanitizers and coverage see it), or on Windows the quorrel.dll beside the program, so
-// that the corpora replay through the DLL that ships.
-inline const hostsim::Module& fuzzModule() {
+// sanitizers and coverage see it), or on Windows a DLL opened with LoadLibrary and its
+// entry points found by ordinal, so that the corpora replay through the DLL that ships:
+// $QUORREL_FUZZ_MODULE, else the quorrel.dll beside the program (the build's own, the
+// one scripts/build-dll copies to dist/). A DLL that does not load ends the run.
+inline std::unique_ptr<hostsim::Module> openFuzzModule() {
 #ifdef _WIN32
-  static const std::unique_ptr<hostsim::Module> module =
-      hostsim::Module::open(hostsim::defaultModulePath());
+  const char* chosen = std::getenv("QUORREL_FUZZ_MODULE");
+  const std::string path =
+      chosen != nullptr && *chosen != '\0' ? chosen : hostsim::defaultModulePath();
+  try {
+    return hostsim::Module::open(path);
+  } catch (const hostsim::ModuleError& error) {
+    std::fprintf(stderr, "%s\n", error.what());
+    std::exit(2);
+  }
 #else
-  static const std::unique_ptr<hostsim::Module> module = hostsim::Module::linked();
+  return hostsim::Module::linked();
 #endif
+}
+inline const hostsim::Module& fuzzModule() {
+  static const std::unique_ptr<hostsim::Module> module = openFuzzModule();
   return *module;
 }
 
@@ -74,7 +93,6 @@ class FuzzFolder {
  private:
   FuzzFolder() : path_(fuzzTempPath("session")) {
     std::error_code error;
-    fs::remove_all(path_, error);  // left by an earlier process with this number
     if (!fs::create_directory(path_, error)) std::abort();
     workingDirectory_ = listing(".");
   }
