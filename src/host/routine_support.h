@@ -1,6 +1,6 @@
-// The calling conventions shared by every action and expression routine: parameter
-// slots, parameter fetching, text result handover, and the guard that keeps
-// exceptions and a missing array away from the host.
+// The calling conventions shared by every action and expression routine: the shapes
+// of the routines, parameter slots, parameter fetching, text result handover, and the
+// guard that keeps exceptions and a missing array away from the host.
 #pragma once
 
 #include <cstdint>
@@ -8,6 +8,8 @@
 #include <optional>
 #include <string>
 #include <tuple>
+#include <type_traits>
+#include <variant>
 
 #include "array/element_array.h"
 #include "host/abi.h"
@@ -17,12 +19,41 @@ namespace quorrel::host {
 
 using abi::HostWord;
 
-// --- Action parameters ---------------------------------------------------------------
-inline int32_t numberParam(HostWord slot) {
-  return static_cast<int32_t>(slot);
-}
-inline const char* textParam(HostWord slot) {
-  return reinterpret_cast<const char*>(slot);
+// --- Routine shapes ------------------------------------------------------------------
+// A parameter as a row of host/table.inc declares it, and what a routine receives for it.
+enum class Param { None, Number, Text };
+template <Param P>
+using ParamOf = std::conditional_t<P == Param::Text, const char*, int32_t>;
+
+// What an action works on: the instance's array, and its run record for the state an
+// action keeps there.
+struct Instance {
+  ElementArray& array;
+  void* runRecord;
+};
+
+// The function type of a routine: First, then the declared parameters.
+template <typename Answer, typename First, Param P1, Param P2>
+struct Signature {
+  using Type = Answer(First, ParamOf<P1>, ParamOf<P2>);
+};
+template <typename Answer, typename First, Param P1>
+struct Signature<Answer, First, P1, Param::None> {
+  using Type = Answer(First, ParamOf<P1>);
+};
+template <typename Answer, typename First>
+struct Signature<Answer, First, Param::None, Param::None> {
+  using Type = Answer(First);
+};
+
+// --- Actions -------------------------------------------------------------------------
+template <Param P>
+ParamOf<P> actionParam(HostWord slot) {
+  if constexpr (P == Param::Text) {
+    return reinterpret_cast<const char*>(slot);
+  } else {
+    return static_cast<int32_t>(slot);
+  }
 }
 
 // Runs op on the instance's array; no array means nothing to do. Always answers 0.
@@ -35,6 +66,23 @@ int16_t runAction(void* runRecord, Op&& op) noexcept {
     // Nothing is reported to the host; the array stays as the operation left it.
   }
   return 0;
+}
+
+// The routine the host calls for an action: its parameters as declared, then the
+// action's routine on the instance.
+template <auto Routine, Param P1, Param P2>
+int16_t QUORREL_CALL callAction(void* runRecord, [[maybe_unused]] HostWord param1,
+                                [[maybe_unused]] HostWord param2) noexcept {
+  return runAction(runRecord, [&](ElementArray& array) {
+    const Instance instance{array, runRecord};
+    if constexpr (P1 == Param::None) {
+      Routine(instance);
+    } else if constexpr (P2 == Param::None) {
+      Routine(instance, actionParam<P1>(param1));
+    } else {
+      Routine(instance, actionParam<P1>(param1), actionParam<P2>(param2));
+    }
+  });
 }
 
 // --- Expression parameters -----------------------------------------------------------
@@ -98,9 +146,20 @@ inline HostWord resultWord(void* runRecord, Borrowed text) {
 inline HostWord resultWord(void* runRecord, const std::string& text) {
   return handOverText(runRecord, text.c_str());
 }
-// A fresh text that may be absent.
-inline HostWord resultWord(void* runRecord, const std::optional<std::string>& text) {
-  return handOverText(runRecord, text ? text->c_str() : nullptr);
+
+// What an expression routine answers: a number or a text.
+struct Result {
+  Result(int32_t number) : value(number) {}
+  Result(Borrowed text) : value(text) {}
+  Result(std::string text) : value(std::move(text)) {}
+  // No text answers as a null borrowed one.
+  Result(std::optional<std::string> text) : value(Borrowed{nullptr}) {
+    if (text) value = std::move(*text);
+  }
+  std::variant<int32_t, Borrowed, std::string> value;
+};
+inline HostWord resultWord(void* runRecord, const Result& result) {
+  return std::visit([&](const auto& value) { return resultWord(runRecord, value); }, result.value);
 }
 
 // Fetches the declared parameters in order, then runs op(array, parameters...) and
@@ -118,6 +177,22 @@ HostWord runExpression(void* runRecord, HostWord token, Op&& op) noexcept {
                       params);
   } catch (...) {
     return 0;
+  }
+}
+
+template <Param P>
+using KindOf = std::conditional_t<P == Param::Text, Text, Int>;
+
+// The routine the host calls for an expression: its parameters fetched as declared, then
+// the expression's routine.
+template <auto Routine, Param P1, Param P2>
+HostWord QUORREL_CALL callExpression(void* runRecord, HostWord parameterToken) noexcept {
+  if constexpr (P1 == Param::None) {
+    return runExpression<>(runRecord, parameterToken, Routine);
+  } else if constexpr (P2 == Param::None) {
+    return runExpression<KindOf<P1>>(runRecord, parameterToken, Routine);
+  } else {
+    return runExpression<KindOf<P1>, KindOf<P2>>(runRecord, parameterToken, Routine);
   }
 }
 

@@ -2,7 +2,6 @@
 // file contents taken into elements.
 #include <optional>
 
-#include "host/routine_support.h"
 #include "host/routines.h"
 #include "io/csv_file.h"
 #include "io/element_file.h"
@@ -28,86 +27,61 @@ void withFileContents(const char* path, Use&& use) {
 namespace quorrel::host::act {
 
 // Whole-array saves write a new file (mode 0); loads replace (0) or append (1).
-QUORREL_ACTION_ROUTINE(saveToFile) {
-  return runAction(
-      runRecord, [&](ElementArray& a) { saveNativeFile(a, textParam(param1), FileModeTruncate); });
+void saveToFile(Instance in, const char* path) {
+  saveNativeFile(in.array, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(loadFromFile) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { loadNativeFile(a, textParam(param1), LoadReplace); });
+void loadFromFile(Instance in, const char* path) {
+  loadNativeFile(in.array, path, LoadReplace);
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromFile) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { loadNativeFile(a, textParam(param1), LoadAppend); });
+void appendElementsFromFile(Instance in, const char* path) {
+  loadNativeFile(in.array, path, LoadAppend);
 }
-QUORREL_ACTION_ROUTINE(saveAsHostArray) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    saveHostArrayFile(a, textParam(param1), FileModeTruncate);
-  });
+void saveToHostArray(Instance in, const char* path) {
+  saveHostArrayFile(in.array, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(loadFromHostArray) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { loadHostArrayFile(a, textParam(param1), LoadReplace); });
+void loadFromHostArray(Instance in, const char* path) {
+  loadHostArrayFile(in.array, path, LoadReplace);
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromHostArray) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { loadHostArrayFile(a, textParam(param1), LoadAppend); });
+void appendElementsFromHostArray(Instance in, const char* path) {
+  loadHostArrayFile(in.array, path, LoadAppend);
 }
 
-QUORREL_ACTION_ROUTINE(saveToCsvFile) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { saveCsvFile(a, textParam(param1), FileModeTruncate); });
+void saveToCsv(Instance in, const char* path) {
+  saveCsvFile(in.array, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(loadFromCsvFile) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { loadCsvFile(a, textParam(param1), LoadReplace); });
+void loadFromCsv(Instance in, const char* path) {
+  loadCsvFile(in.array, path, LoadReplace);
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromCsvFile) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { loadCsvFile(a, textParam(param1), LoadAppend); });
+void appendElementsFromCsv(Instance in, const char* path) {
+  loadCsvFile(in.array, path, LoadAppend);
 }
-QUORREL_ACTION_ROUTINE(saveToIniFile) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { saveIniFile(a, textParam(param1), FileModeTruncate); });
+void saveToIni(Instance in, const char* path) {
+  saveIniFile(in.array, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(loadFromIniFile) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { loadIniFile(a, textParam(param1), LoadReplace); });
+void loadFromIni(Instance in, const char* path) {
+  loadIniFile(in.array, path, LoadReplace);
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromIniFile) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { loadIniFile(a, textParam(param1), LoadAppend); });
+void appendElementsFromIni(Instance in, const char* path) {
+  loadIniFile(in.array, path, LoadAppend);
 }
 
 // Element files: index first, path second; a new file (0) or appended to (1).
-QUORREL_ACTION_ROUTINE(saveElementToFile) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    quorrel::saveElementToFile(a, numberParam(param1), textParam(param2), FileModeTruncate);
-  });
+void saveElementToFile(Instance in, int32_t index, const char* path) {
+  quorrel::saveElementToFile(in.array, index, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(appendElementToFile) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    quorrel::saveElementToFile(a, numberParam(param1), textParam(param2), FileModeAppend);
-  });
+void appendElementToFile(Instance in, int32_t index, const char* path) {
+  quorrel::saveElementToFile(in.array, index, path, FileModeAppend);
 }
 
 // File contents become File elements.
-QUORREL_ACTION_ROUTINE(setFileAt) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    withFileContents(textParam(param1),
-                     [&](ByteBlock block) { a.setFile(block, numberParam(param2)); });
-  });
+void setFileAt(Instance in, const char* path, int32_t index) {
+  withFileContents(path, [&](ByteBlock block) { in.array.setFile(block, index); });
 }
-QUORREL_ACTION_ROUTINE(insertFileAt) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    withFileContents(textParam(param1),
-                     [&](ByteBlock block) { a.insertFile(block, numberParam(param2)); });
-  });
+void insertFileAt(Instance in, const char* path, int32_t index) {
+  withFileContents(path, [&](ByteBlock block) { in.array.insertFile(block, index); });
 }
-QUORREL_ACTION_ROUTINE(appendFile) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    withFileContents(textParam(param1), [&](ByteBlock block) { a.appendFile(block); });
-  });
+void appendFile(Instance in, const char* path) {
+  withFileContents(path, [&](ByteBlock block) { in.array.appendFile(block); });
 }
 
 }  // namespace quorrel::host::act
