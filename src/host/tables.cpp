@@ -41,6 +41,19 @@ constexpr Row<abi::ExpressionRoutine> kExpressionRows[] = {
 #include "host/table.inc"
 };
 
+// A parameter has a meaning, and only a declared one: the help page and the quorrel
+// command print the two side by side.
+constexpr bool described(Param param, const char* meaning) {
+  return (param == Param::None) == (meaning[0] == '\0');
+}
+#define ACTION(code, name, param1, param2, file, meaning1, meaning2)                      \
+  static_assert(described(Param::param1, meaning1) && described(Param::param2, meaning2), \
+                "action " #code ": a parameter without its meaning, or the other way round");
+#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2)               \
+  static_assert(described(Param::param1, meaning1) && described(Param::param2, meaning2), \
+                "expression " #code ": a parameter without its meaning, or the other way round");
+#include "host/table.inc"
+
 template <typename Routine, std::size_t N>
 constexpr bool codesInOrder(const Row<Routine> (&rows)[N]) {
   for (std::size_t i = 0; i < N; ++i) {
