@@ -1,13 +1,12 @@
 // Builds the help page from the data the extension itself uses: the menu trees and
 // strings as the editor receives them (printed by `quorrel menu` and `quorrel strings`),
-// the parameter types from the module's information entry points, and the prose of
-// descriptions.txt. It refuses to build a page that misses a code or describes one that
-// does not exist, so the page can never drift from the module.
-#include <dlfcn.h>
-
+// the parameters of each row of host/table.inc, and the prose of descriptions.txt. It
+// refuses to build a page that misses a code or describes one that does not exist, so
+// the page can never drift from the module.
 #include <cstdint>
 #include <cstdio>
 #include <fstream>
+#include <initializer_list>
 #include <iostream>
 #include <map>
 #include <memory>
@@ -19,7 +18,6 @@
 namespace {
 
 struct Description {
-  std::vector<std::string> params;
   std::vector<std::string> prose;
   std::string bad;
 };
@@ -151,8 +149,8 @@ std::map<std::string, Description> parseDescriptions(const std::string& path) {
       current = &result[key];
     } else if (current == nullptr) {
       fail(path + ":" + std::to_string(number) + ": text before the first block");
-    } else if (line.rfind("param: ", 0) == 0) {
-      current->params.push_back(line.substr(7));
+    } else if (line.rfind("param:", 0) == 0) {
+      fail(path + ":" + std::to_string(number) + ": parameters are described in host/table.inc");
     } else if (line.rfind("bad: ", 0) == 0) {
       current->bad = line.substr(5);
     } else {
@@ -162,35 +160,33 @@ std::map<std::string, Description> parseDescriptions(const std::string& path) {
   return result;
 }
 
-// The information entries, read through the module's exported entry points.
-struct InfoTables {
-  std::vector<std::vector<int>> actionParams;  // per code: parameter types
-  std::vector<std::vector<int>> expressionParams;
+// A parameter as the page names it: its type, then what it is.
+struct Param {
+  const char* type;
+  const char* meaning;
 };
+using Params = std::vector<std::vector<Param>>;  // per code
 
-InfoTables readInfos(const std::string& modulePath, int actions, int expressions) {
-  void* module = dlopen(modulePath.c_str(), RTLD_NOW | RTLD_LOCAL);
-  if (module == nullptr) fail(std::string("cannot load module: ") + dlerror());
-  using InfoFn = const uint16_t* (*)(void*, int32_t);
-  auto actionInfos = reinterpret_cast<InfoFn>(dlsym(module, "GetActionInfos"));
-  auto expressionInfos = reinterpret_cast<InfoFn>(dlsym(module, "GetExpressionInfos"));
-  if (actionInfos == nullptr || expressionInfos == nullptr) fail("module lacks info entry points");
-  auto params = [](const uint16_t* entry) {
-    std::vector<int> types;
-    for (int i = 2; i < 4; ++i) {
-      if (entry[i] != 0) types.push_back(entry[i]);
-    }
-    return types;
-  };
-  InfoTables tables;
-  for (int code = 0; code < actions; ++code) {
-    tables.actionParams.push_back(params(actionInfos(nullptr, code)));
+// The host's names of the types: an action takes numbers, an expression integers.
+std::vector<Param> params(const char* numberName, std::initializer_list<Param> declared) {
+  std::vector<Param> result;
+  for (Param p : declared) {
+    if (std::string(p.type) == "Number") result.push_back({numberName, p.meaning});
+    if (std::string(p.type) == "Text") result.push_back({"text", p.meaning});
   }
-  for (int code = 0; code < expressions; ++code) {
-    tables.expressionParams.push_back(params(expressionInfos(nullptr, code)));
-  }
-  return tables;  // the module stays loaded until exit; nothing else runs in it
+  return result;
 }
+
+const Params kActionParams = {
+#define ACTION(code, name, param1, param2, file, meaning1, meaning2) \
+  params("number", {{#param1, meaning1}, {#param2, meaning2}}),
+#include "host/table.inc"
+};
+const Params kExpressionParams = {
+#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2) \
+  params("integer", {{#param1, meaning1}, {#param2, meaning2}}),
+#include "host/table.inc"
+};
 
 std::string escape(const std::string& text) {
   std::string out;
@@ -215,21 +211,6 @@ std::string escape(const std::string& text) {
   return out;
 }
 
-std::string typeName(int type) {
-  switch (type) {
-    case 22:
-      return "number";
-    case 45:
-      return "text";
-    case 1:
-      return "integer";
-    case 3:
-      return "text";
-    default:
-      return "type " + std::to_string(type);
-  }
-}
-
 struct Kind {
   char letter;         // 'A' or 'E'
   const char* anchor;  // "a" or "e"
@@ -243,8 +224,7 @@ struct Generated {
 };
 
 Generated render(const Kind& kind, const std::vector<MenuNode>& menu,
-                 const std::map<int, CodeStrings>& strings,
-                 const std::vector<std::vector<int>>& params,
+                 const std::map<int, CodeStrings>& strings, const Params& params,
                  const std::map<std::string, Description>& descriptions) {
   Generated out;
   std::vector<std::string> path;
@@ -275,11 +255,7 @@ Generated render(const Kind& kind, const std::vector<MenuNode>& menu,
     auto found = descriptions.find(key);
     if (found == descriptions.end()) fail("no description for " + key);
     const Description& d = found->second;
-    const std::vector<int>& types = params[static_cast<std::size_t>(code)];
-    if (d.params.size() != types.size()) {
-      fail(key + " describes " + std::to_string(d.params.size()) +
-           " parameters, the module declares " + std::to_string(types.size()));
-    }
+    const std::vector<Param>& declared = params[static_cast<std::size_t>(code)];
     auto s = strings.find(code);
     if (s == strings.end()) fail("no display string for " + key);
     out.body +=
@@ -289,10 +265,10 @@ Generated render(const Kind& kind, const std::vector<MenuNode>& menu,
                 " " + std::to_string(code) + " · menu: " + escape(group) + " › " +
                 escape(node.text) + " · " + (kind.letter == 'A' ? "display string " : "name ") +
                 "<code>" + escape(s->second.display) + "</code></div>\n";
-    if (!types.empty()) {
+    if (!declared.empty()) {
       out.body += "<ol class=\"params\">\n";
-      for (std::size_t i = 0; i < types.size(); ++i) {
-        out.body += "<li><i>" + typeName(types[i]) + "</i>: " + escape(d.params[i]) + "</li>\n";
+      for (const Param& p : declared) {
+        out.body += "<li><i>" + std::string(p.type) + "</i>: " + escape(p.meaning) + "</li>\n";
       }
       out.body += "</ol>\n";
     }
@@ -356,21 +332,19 @@ int main(int argc, char** argv) {
   std::map<std::string, std::string> args;
   for (int i = 1; i + 1 < argc; i += 2) args[argv[i]] = argv[i + 1];
   for (const char* required :
-       {"--module", "--descriptions", "--template", "--out", "--menu-actions", "--menu-expressions",
+       {"--descriptions", "--template", "--out", "--menu-actions", "--menu-expressions",
         "--strings-actions", "--strings-expressions"}) {
     if (!args.count(required)) fail(std::string("missing ") + required);
   }
-  constexpr int kActions = 79;
-  constexpr int kExpressions = 60;
+  const int kActions = static_cast<int>(kActionParams.size());
+  const int kExpressions = static_cast<int>(kExpressionParams.size());
   auto descriptions = parseDescriptions(args["--descriptions"]);
   checkNoStrayDescriptions(descriptions, kActions, kExpressions);
-  InfoTables infos = readInfos(args["--module"], kActions, kExpressions);
-  Generated actions =
-      render({'A', "a", 25000, kActions}, parseMenu(args["--menu-actions"]),
-             parseStrings(args["--strings-actions"]), infos.actionParams, descriptions);
+  Generated actions = render({'A', "a", 25000, kActions}, parseMenu(args["--menu-actions"]),
+                             parseStrings(args["--strings-actions"]), kActionParams, descriptions);
   Generated expressions =
       render({'E', "e", 27000, kExpressions}, parseMenu(args["--menu-expressions"]),
-             parseStrings(args["--strings-expressions"]), infos.expressionParams, descriptions);
+             parseStrings(args["--strings-expressions"]), kExpressionParams, descriptions);
   std::string page = readFile(args["--template"]);
   replace(page, "@@VERSION@@", args.count("--version") ? args["--version"] : "");
   replace(page, "@@TOC_ACTIONS@@", actions.toc);

@@ -66,8 +66,15 @@ constexpr std::size_t hostWordOffset(std::size_t offset32) {
 
 // --- Counts and codes ----------------------------------------------------------------
 inline constexpr int kConditionCount = 0;
-inline constexpr int kActionCount = 79;
-inline constexpr int kExpressionCount = 60;
+// One per row of table.inc.
+inline constexpr int kActionCount = 0
+#define ACTION(...) +1
+#include "host/table.inc"
+    ;
+inline constexpr int kExpressionCount = 0
+#define EXPRESSION(...) +1
+#include "host/table.inc"
+    ;
 
 // Parameter types in the information entries.
 inline constexpr uint16_t kActionParamNumber = 22;

@@ -1,6 +1,6 @@
-// The calling conventions shared by every action and expression routine: parameter
-// slots, parameter fetching, text result handover, and the guard that keeps
-// exceptions and a missing array away from the host.
+// The calling conventions shared by every action and expression routine: the shapes
+// of the routines, parameter slots, parameter fetching, text result handover, and the
+// guard that keeps exceptions and a missing array away from the host.
 #pragma once
 
 #include <cstdint>
@@ -8,6 +8,9 @@
 #include <optional>
 #include <string>
 #include <tuple>
+#include <type_traits>
+#include <utility>
+#include <variant>
 
 #include "array/element_array.h"
 #include "host/abi.h"
@@ -18,12 +21,41 @@ namespace quorrel::host {
 
 using abi::HostWord;
 
-// --- Action parameters ---------------------------------------------------------------
-inline int32_t numberParam(HostWord slot) {
-  return static_cast<int32_t>(slot);
-}
-inline const char* textParam(HostWord slot) {
-  return reinterpret_cast<const char*>(slot);
+// --- Routine shapes ------------------------------------------------------------------
+// A parameter as a row of host/table.inc declares it, and what a routine receives for it.
+enum class Param { None, Number, Text };
+template <Param P>
+using ParamOf = std::conditional_t<P == Param::Text, const char*, int32_t>;
+
+// What an action works on: the instance's array, and its run record for the state an
+// action keeps there.
+struct Instance {
+  ElementArray& array;
+  void* runRecord;
+};
+
+// The function type of a routine: First, then the declared parameters.
+template <typename Answer, typename First, Param P1, Param P2>
+struct Signature {
+  using Type = Answer(First, ParamOf<P1>, ParamOf<P2>);
+};
+template <typename Answer, typename First, Param P1>
+struct Signature<Answer, First, P1, Param::None> {
+  using Type = Answer(First, ParamOf<P1>);
+};
+template <typename Answer, typename First>
+struct Signature<Answer, First, Param::None, Param::None> {
+  using Type = Answer(First);
+};
+
+// --- Actions -------------------------------------------------------------------------
+template <Param P>
+ParamOf<P> actionParam(HostWord slot) {
+  if constexpr (P == Param::Text) {
+    return reinterpret_cast<const char*>(slot);
+  } else {
+    return static_cast<int32_t>(slot);
+  }
 }
 
 // Runs op on the instance's array; no array means nothing to do. Always answers 0.
@@ -42,15 +74,39 @@ int16_t runAction(void* runRecord, Op&& op) noexcept {
 // quorrel command asks for it (QuorrelFileStatus). The host runs one thread.
 inline FileStatus lastFileStatus;
 
-// Runs a file operation as runAction does and keeps what it did, which the host is
-// not told. A missing array, or an exception the operation let out, is a failure of
-// the file action too.
-template <typename Op>
-int16_t runFileAction(void* runRecord, Op&& op) noexcept {
-  lastFileStatus = {FileStatus::Refused};
+// What an action's routine answers, by the file column of its row: a file action tells
+// what it did, any other action nothing.
+enum class FileUse { None, Read, Write, Extend };
+template <FileUse F>
+using ActionAnswer = std::conditional_t<F == FileUse::None, void, FileStatus>;
+
+template <auto Routine, Param P1, Param P2>
+auto invokeAction(const Instance& instance, HostWord param1, HostWord param2) {
+  if constexpr (P1 == Param::None) {
+    return Routine(instance);
+  } else if constexpr (P2 == Param::None) {
+    return Routine(instance, actionParam<P1>(param1));
+  } else {
+    return Routine(instance, actionParam<P1>(param1), actionParam<P2>(param2));
+  }
+}
+
+// The routine the host calls for an action: its parameters as declared, then the
+// action's routine on the instance. A file action's outcome is kept: no array, or an
+// exception the routine let out, is a failure of the file action too.
+template <auto Routine, Param P1, Param P2>
+int16_t QUORREL_CALL callAction(void* runRecord, [[maybe_unused]] HostWord param1,
+                                [[maybe_unused]] HostWord param2) noexcept {
+  using Answer = decltype(invokeAction<Routine, P1, P2>(std::declval<const Instance&>(), 0, 0));
+  if constexpr (std::is_same_v<Answer, FileStatus>) lastFileStatus = {FileStatus::Refused};
   return runAction(runRecord, [&](ElementArray& array) {
-    lastFileStatus = {FileStatus::OutOfMemory};  // kept when op throws
-    lastFileStatus = op(array);
+    const Instance instance{array, runRecord};
+    if constexpr (std::is_same_v<Answer, FileStatus>) {
+      lastFileStatus = {FileStatus::OutOfMemory};  // kept when the routine throws
+      lastFileStatus = invokeAction<Routine, P1, P2>(instance, param1, param2);
+    } else {
+      invokeAction<Routine, P1, P2>(instance, param1, param2);
+    }
   });
 }
 
@@ -115,9 +171,20 @@ inline HostWord resultWord(void* runRecord, Borrowed text) {
 inline HostWord resultWord(void* runRecord, const std::string& text) {
   return handOverText(runRecord, text.c_str());
 }
-// A fresh text that may be absent.
-inline HostWord resultWord(void* runRecord, const std::optional<std::string>& text) {
-  return handOverText(runRecord, text ? text->c_str() : nullptr);
+
+// What an expression routine answers: a number or a text.
+struct Result {
+  Result(int32_t number) : value(number) {}
+  Result(Borrowed text) : value(text) {}
+  Result(std::string text) : value(std::move(text)) {}
+  // No text answers as a null borrowed one.
+  Result(std::optional<std::string> text) : value(Borrowed{nullptr}) {
+    if (text) value = std::move(*text);
+  }
+  std::variant<int32_t, Borrowed, std::string> value;
+};
+inline HostWord resultWord(void* runRecord, const Result& result) {
+  return std::visit([&](const auto& value) { return resultWord(runRecord, value); }, result.value);
 }
 
 // Fetches the declared parameters in order, then runs op(array, parameters...) and
@@ -135,6 +202,22 @@ HostWord runExpression(void* runRecord, HostWord token, Op&& op) noexcept {
                       params);
   } catch (...) {
     return 0;
+  }
+}
+
+template <Param P>
+using KindOf = std::conditional_t<P == Param::Text, Text, Int>;
+
+// The routine the host calls for an expression: its parameters fetched as declared, then
+// the expression's routine.
+template <auto Routine, Param P1, Param P2>
+HostWord QUORREL_CALL callExpression(void* runRecord, HostWord parameterToken) noexcept {
+  if constexpr (P1 == Param::None) {
+    return runExpression<>(runRecord, parameterToken, Routine);
+  } else if constexpr (P2 == Param::None) {
+    return runExpression<KindOf<P1>>(runRecord, parameterToken, Routine);
+  } else {
+    return runExpression<KindOf<P1>, KindOf<P2>>(runRecord, parameterToken, Routine);
   }
 }
 

@@ -1,153 +1,19 @@
-// Every action and expression routine, by the name of what it does. The tables in
-// tables.cpp place them at their codes.
+// The routine of every action and expression, declared in the shape its row in
+// table.inc gives it: an action takes the Instance, an expression the array, and each
+// then takes its declared parameters; a file action answers what it did. The
+// definitions are in routines_*.cpp.
 #pragma once
 
-#include "host/abi.h"
-
-#define QUORREL_ACTION_ROUTINE(name)                                                \
-  int16_t QUORREL_CALL name(void* runRecord, [[maybe_unused]] abi::HostWord param1, \
-                            [[maybe_unused]] abi::HostWord param2)
-#define QUORREL_EXPRESSION_ROUTINE(name) \
-  abi::HostWord QUORREL_CALL name(void* runRecord, abi::HostWord parameterToken)
+#include "host/routine_support.h"
 
 namespace quorrel::host::act {
-QUORREL_ACTION_ROUTINE(saveToFile);
-QUORREL_ACTION_ROUTINE(saveAsHostArray);
-QUORREL_ACTION_ROUTINE(saveToCsvFile);
-QUORREL_ACTION_ROUTINE(loadFromFile);
-QUORREL_ACTION_ROUTINE(loadFromHostArray);
-QUORREL_ACTION_ROUTINE(loadFromCsvFile);
-QUORREL_ACTION_ROUTINE(insertStringAt);
-QUORREL_ACTION_ROUTINE(insertValueAt);
-QUORREL_ACTION_ROUTINE(appendString);
-QUORREL_ACTION_ROUTINE(appendValue);
-QUORREL_ACTION_ROUTINE(appendElementsFromFile);
-QUORREL_ACTION_ROUTINE(appendElementsFromHostArray);
-QUORREL_ACTION_ROUTINE(appendElementsFromCsvFile);
-QUORREL_ACTION_ROUTINE(setStringAt);
-QUORREL_ACTION_ROUTINE(setValueAt);
-QUORREL_ACTION_ROUTINE(pickColumnForBetween);
-QUORREL_ACTION_ROUTINE(deleteAt);
-QUORREL_ACTION_ROUTINE(deleteAll);
-QUORREL_ACTION_ROUTINE(saveElementToFile);
-QUORREL_ACTION_ROUTINE(appendElementToFile);
-QUORREL_ACTION_ROUTINE(setKeyStringAt);
-QUORREL_ACTION_ROUTINE(setKeyValueAt);
-QUORREL_ACTION_ROUTINE(sortStringsAscending);
-QUORREL_ACTION_ROUTINE(sortStringsDescending);
-QUORREL_ACTION_ROUTINE(sortValuesAscending);
-QUORREL_ACTION_ROUTINE(sortValuesDescending);
-QUORREL_ACTION_ROUTINE(selectRowsBetweenValues);
-QUORREL_ACTION_ROUTINE(setArrayDimension);
-QUORREL_ACTION_ROUTINE(use2DArray);
-QUORREL_ACTION_ROUTINE(use3DArray);
-QUORREL_ACTION_ROUTINE(setDimensionBoundary);
-QUORREL_ACTION_ROUTINE(resizeDimensionBoundary);
-QUORREL_ACTION_ROUTINE(insertRowFromList);
-QUORREL_ACTION_ROUTINE(selectLabelGreaterOrEqual);
-QUORREL_ACTION_ROUTINE(appendRowFromList);
-QUORREL_ACTION_ROUTINE(selectLabelLess);
-QUORREL_ACTION_ROUTINE(replaceRowWithList);
-QUORREL_ACTION_ROUTINE(selectLabelLessOrEqual);
-QUORREL_ACTION_ROUTINE(pickLabelForBetween);
-QUORREL_ACTION_ROUTINE(deleteRow);
-QUORREL_ACTION_ROUTINE(sortRowsByColumnValueAscending);
-QUORREL_ACTION_ROUTINE(sortRowsByColumnValueDescending);
-QUORREL_ACTION_ROUTINE(sortRowsByColumnStringAscending);
-QUORREL_ACTION_ROUTINE(sortRowsByColumnStringDescending);
-QUORREL_ACTION_ROUTINE(sortRowsByLabelValueAscending);
-QUORREL_ACTION_ROUTINE(sortRowsByLabelValueDescending);
-QUORREL_ACTION_ROUTINE(sortRowsByLabelStringAscending);
-QUORREL_ACTION_ROUTINE(sortRowsByLabelStringDescending);
-QUORREL_ACTION_ROUTINE(setLabel);
-QUORREL_ACTION_ROUTINE(selectRowsBetweenStrings);
-QUORREL_ACTION_ROUTINE(caseInsensitive);
-QUORREL_ACTION_ROUTINE(caseSensitive);
-QUORREL_ACTION_ROUTINE(setFileAt);
-QUORREL_ACTION_ROUTINE(insertFileAt);
-QUORREL_ACTION_ROUTINE(appendFile);
-QUORREL_ACTION_ROUTINE(literalSearch);
-QUORREL_ACTION_ROUTINE(wildcardSearch);
-QUORREL_ACTION_ROUTINE(setListDelimiter);
-QUORREL_ACTION_ROUTINE(saveToIniFile);
-QUORREL_ACTION_ROUTINE(loadFromIniFile);
-QUORREL_ACTION_ROUTINE(appendElementsFromIniFile);
-QUORREL_ACTION_ROUTINE(andMode);
-QUORREL_ACTION_ROUTINE(orMode);
-QUORREL_ACTION_ROUTINE(selectAllRows);
-QUORREL_ACTION_ROUTINE(invertSelection);
-QUORREL_ACTION_ROUTINE(selectColumnMatching);
-QUORREL_ACTION_ROUTINE(selectColumnContaining);
-QUORREL_ACTION_ROUTINE(selectColumnEqual);
-QUORREL_ACTION_ROUTINE(selectColumnNotEqual);
-QUORREL_ACTION_ROUTINE(selectColumnGreater);
-QUORREL_ACTION_ROUTINE(selectColumnGreaterOrEqual);
-QUORREL_ACTION_ROUTINE(selectColumnLess);
-QUORREL_ACTION_ROUTINE(selectColumnLessOrEqual);
-QUORREL_ACTION_ROUTINE(selectLabelMatching);
-QUORREL_ACTION_ROUTINE(selectLabelContaining);
-QUORREL_ACTION_ROUTINE(selectLabelEqual);
-QUORREL_ACTION_ROUTINE(selectLabelNotEqual);
-QUORREL_ACTION_ROUTINE(selectLabelGreater);
-QUORREL_ACTION_ROUTINE(startNewWhere);
+#define ACTION(code, name, param1, param2, file, meaning1, meaning2) \
+  Signature<ActionAnswer<FileUse::file>, Instance, Param::param1, Param::param2>::Type name;
+#include "host/table.inc"
 }  // namespace quorrel::host::act
 
 namespace quorrel::host::expr {
-QUORREL_EXPRESSION_ROUTINE(size);
-QUORREL_EXPRESSION_ROUTINE(capacity);
-QUORREL_EXPRESSION_ROUTINE(getString);
-QUORREL_EXPRESSION_ROUTINE(getValue);
-QUORREL_EXPRESSION_ROUTINE(keyString);
-QUORREL_EXPRESSION_ROUTINE(keyValue);
-QUORREL_EXPRESSION_ROUTINE(indexOfKeyString);
-QUORREL_EXPRESSION_ROUTINE(indexOfKeyValue);
-QUORREL_EXPRESSION_ROUTINE(stringWithStringKey);
-QUORREL_EXPRESSION_ROUTINE(stringWithValueKey);
-QUORREL_EXPRESSION_ROUTINE(valueWithStringKey);
-QUORREL_EXPRESSION_ROUTINE(valueWithValueKey);
-QUORREL_EXPRESSION_ROUTINE(findString);
-QUORREL_EXPRESSION_ROUTINE(findValue);
-QUORREL_EXPRESSION_ROUTINE(containsString);
-QUORREL_EXPRESSION_ROUTINE(containsValue);
-QUORREL_EXPRESSION_ROUTINE(list);
-QUORREL_EXPRESSION_ROUTINE(quotedList);
-QUORREL_EXPRESSION_ROUTINE(keyList);
-QUORREL_EXPRESSION_ROUTINE(keyQuotedList);
-QUORREL_EXPRESSION_ROUTINE(pairList);
-QUORREL_EXPRESSION_ROUTINE(pairQuotedList);
-QUORREL_EXPRESSION_ROUTINE(max);
-QUORREL_EXPRESSION_ROUTINE(min);
-QUORREL_EXPRESSION_ROUTINE(sum);
-QUORREL_EXPRESSION_ROUTINE(avg);
-QUORREL_EXPRESSION_ROUTINE(dim);
-QUORREL_EXPRESSION_ROUTINE(boundary);
-QUORREL_EXPRESSION_ROUTINE(boundaryX);
-QUORREL_EXPRESSION_ROUTINE(boundaryY);
-QUORREL_EXPRESSION_ROUTINE(boundaryZ);
-QUORREL_EXPRESSION_ROUTINE(dimIndexOfIndex);
-QUORREL_EXPRESSION_ROUTINE(xOfIndex);
-QUORREL_EXPRESSION_ROUTINE(yOfIndex);
-QUORREL_EXPRESSION_ROUTINE(zOfIndex);
-QUORREL_EXPRESSION_ROUTINE(indexOfDimIndex);
-QUORREL_EXPRESSION_ROUTINE(indexOfXY);
-QUORREL_EXPRESSION_ROUTINE(numberOfRows);
-QUORREL_EXPRESSION_ROUTINE(rowList);
-QUORREL_EXPRESSION_ROUTINE(numberOfCols);
-QUORREL_EXPRESSION_ROUTINE(getLabel);
-QUORREL_EXPRESSION_ROUTINE(labelList);
-QUORREL_EXPRESSION_ROUTINE(getCol);
-QUORREL_EXPRESSION_ROUTINE(columnList);
-QUORREL_EXPRESSION_ROUTINE(getFromColumnRow);
-QUORREL_EXPRESSION_ROUTINE(getStringFromColumnRow);
-QUORREL_EXPRESSION_ROUTINE(getFromLabelRow);
-QUORREL_EXPRESSION_ROUTINE(getStringFromLabelRow);
-QUORREL_EXPRESSION_ROUTINE(delimiter);
-QUORREL_EXPRESSION_ROUTINE(colMax);
-QUORREL_EXPRESSION_ROUTINE(colMin);
-QUORREL_EXPRESSION_ROUTINE(colSum);
-QUORREL_EXPRESSION_ROUTINE(colAvg);
-QUORREL_EXPRESSION_ROUTINE(labMax);
-QUORREL_EXPRESSION_ROUTINE(labMin);
-QUORREL_EXPRESSION_ROUTINE(labSum);
-QUORREL_EXPRESSION_ROUTINE(labAvg);
+#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2) \
+  Signature<Result, ElementArray&, Param::param1, Param::param2>::Type routine;
+#include "host/table.inc"
 }  // namespace quorrel::host::expr

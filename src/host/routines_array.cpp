@@ -1,153 +1,124 @@
 // Routines of the element edits, settings and dimensions: each forwards to one
 // operation of the array or writes one setting.
-#include "host/routine_support.h"
 #include "host/routines.h"
 
 namespace quorrel::host::act {
 
-QUORREL_ACTION_ROUTINE(insertStringAt) {
-  return runAction(
-      runRecord, [&](ElementArray& a) { a.insertString(textParam(param1), numberParam(param2)); });
+void insertStringAt(Instance in, const char* text, int32_t index) {
+  in.array.insertString(text, index);
 }
-QUORREL_ACTION_ROUTINE(insertValueAt) {
-  return runAction(
-      runRecord, [&](ElementArray& a) { a.insertValue(numberParam(param1), numberParam(param2)); });
+void insertValueAt(Instance in, int32_t number, int32_t index) {
+  in.array.insertValue(number, index);
 }
-QUORREL_ACTION_ROUTINE(appendString) {
-  return runAction(runRecord, [&](ElementArray& a) { a.appendString(textParam(param1)); });
+void appendString(Instance in, const char* text) {
+  in.array.appendString(text);
 }
-QUORREL_ACTION_ROUTINE(appendValue) {
-  return runAction(runRecord, [&](ElementArray& a) { a.appendValue(numberParam(param1)); });
+void appendValue(Instance in, int32_t number) {
+  in.array.appendValue(number);
 }
-QUORREL_ACTION_ROUTINE(setStringAt) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { a.setString(textParam(param1), numberParam(param2)); });
+void setStringAt(Instance in, const char* text, int32_t index) {
+  in.array.setString(text, index);
 }
-QUORREL_ACTION_ROUTINE(setValueAt) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { a.setValue(numberParam(param1), numberParam(param2)); });
+void setValueAt(Instance in, int32_t number, int32_t index) {
+  in.array.setValue(number, index);
 }
-QUORREL_ACTION_ROUTINE(deleteAt) {
-  return runAction(runRecord, [&](ElementArray& a) { a.deleteAt(numberParam(param1)); });
+void deleteAt(Instance in, int32_t index) {
+  in.array.deleteAt(index);
 }
-QUORREL_ACTION_ROUTINE(deleteAll) {
-  return runAction(runRecord, [](ElementArray& a) { a.clear(); });
+void deleteAll(Instance in) {
+  in.array.clear();
 }
-QUORREL_ACTION_ROUTINE(setKeyStringAt) {
-  return runAction(
-      runRecord, [&](ElementArray& a) { a.setKeyString(textParam(param1), numberParam(param2)); });
+void setKeyStringAt(Instance in, const char* key, int32_t index) {
+  in.array.setKeyString(key, index);
 }
-QUORREL_ACTION_ROUTINE(setKeyValueAt) {
-  return runAction(
-      runRecord, [&](ElementArray& a) { a.setKeyValue(numberParam(param1), numberParam(param2)); });
+void setKeyValueAt(Instance in, int32_t key, int32_t index) {
+  in.array.setKeyValue(key, index);
 }
-QUORREL_ACTION_ROUTINE(setArrayDimension) {
-  return runAction(runRecord, [&](ElementArray& a) { a.setDimensions(numberParam(param1)); });
+void setArrayDimension(Instance in, int32_t dimension) {
+  in.array.setDimensions(dimension);
 }
-QUORREL_ACTION_ROUTINE(use2DArray) {
-  return runAction(runRecord, [](ElementArray& a) { a.setDimensions(2); });
+void use2D(Instance in) {
+  in.array.setDimensions(2);
 }
-QUORREL_ACTION_ROUTINE(use3DArray) {
-  return runAction(runRecord, [](ElementArray& a) { a.setDimensions(3); });
+void use3D(Instance in) {
+  in.array.setDimensions(3);
 }
-QUORREL_ACTION_ROUTINE(setDimensionBoundary) {
-  return runAction(
-      runRecord, [&](ElementArray& a) { a.setBoundary(numberParam(param1), numberParam(param2)); });
+void setDimensionBoundary(Instance in, int32_t dimension, int32_t boundary) {
+  in.array.setBoundary(dimension, boundary);
 }
-QUORREL_ACTION_ROUTINE(resizeDimensionBoundary) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    a.resizeBoundary(numberParam(param1), numberParam(param2));
-  });
+void resizeDimensionBoundary(Instance in, int32_t dimension, int32_t boundary) {
+  in.array.resizeBoundary(dimension, boundary);
 }
-QUORREL_ACTION_ROUTINE(caseInsensitive) {
-  return runAction(runRecord, [](ElementArray& a) { a.settings.caseMode = CaseInsensitive; });
+void caseInsensitive(Instance in) {
+  in.array.settings.caseMode = CaseInsensitive;
 }
-QUORREL_ACTION_ROUTINE(caseSensitive) {
-  return runAction(runRecord, [](ElementArray& a) { a.settings.caseMode = CaseSensitive; });
+void caseSensitive(Instance in) {
+  in.array.settings.caseMode = CaseSensitive;
 }
-QUORREL_ACTION_ROUTINE(literalSearch) {
-  return runAction(runRecord, [](ElementArray& a) { a.settings.searchMode = SearchLiteral; });
+void literalSearch(Instance in) {
+  in.array.settings.searchMode = SearchLiteral;
 }
-QUORREL_ACTION_ROUTINE(wildcardSearch) {
-  return runAction(runRecord, [](ElementArray& a) { a.settings.searchMode = SearchWildcard; });
+void wildcardSearch(Instance in) {
+  in.array.settings.searchMode = SearchWildcard;
 }
-QUORREL_ACTION_ROUTINE(setListDelimiter) {
-  return runAction(runRecord, [&](ElementArray& a) { a.setListDelimiter(textParam(param1)); });
+void setListDelimiter(Instance in, const char* delimiter) {
+  in.array.setListDelimiter(delimiter);
 }
 
 }  // namespace quorrel::host::act
 
 namespace quorrel::host::expr {
 
-QUORREL_EXPRESSION_ROUTINE(size) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return a.size(); });
+Result size(ElementArray& a) {
+  return a.size();
 }
-QUORREL_EXPRESSION_ROUTINE(capacity) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return a.capacity(); });
+Result capacity(ElementArray& a) {
+  return a.capacity();
 }
-QUORREL_EXPRESSION_ROUTINE(getString) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray& a, int32_t index) {
-    return Borrowed{a.getString(index)};
-  });
+Result getText(ElementArray& a, int32_t index) {
+  return Borrowed{a.getString(index)};
 }
-QUORREL_EXPRESSION_ROUTINE(getValue) {
-  return runExpression<Int>(runRecord, parameterToken,
-                            [](ElementArray& a, int32_t index) { return a.getValue(index); });
+Result get(ElementArray& a, int32_t index) {
+  return a.getValue(index);
 }
-QUORREL_EXPRESSION_ROUTINE(keyString) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray& a, int32_t index) {
-    return Borrowed{a.getKeyString(index)};
-  });
+Result keyText(ElementArray& a, int32_t index) {
+  return Borrowed{a.getKeyString(index)};
 }
-QUORREL_EXPRESSION_ROUTINE(keyValue) {
-  return runExpression<Int>(runRecord, parameterToken,
-                            [](ElementArray& a, int32_t index) { return a.getKeyValue(index); });
+Result key(ElementArray& a, int32_t index) {
+  return a.getKeyValue(index);
 }
-QUORREL_EXPRESSION_ROUTINE(dim) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return a.dimensions(); });
+Result dim(ElementArray& a) {
+  return a.dimensions();
 }
-QUORREL_EXPRESSION_ROUTINE(boundary) {
-  return runExpression<Int>(runRecord, parameterToken,
-                            [](ElementArray& a, int32_t d) { return a.boundary(d); });
+Result boundary(ElementArray& a, int32_t d) {
+  return a.boundary(d);
 }
-QUORREL_EXPRESSION_ROUTINE(boundaryX) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return a.boundary(1); });
+Result boundaryX(ElementArray& a) {
+  return a.boundary(1);
 }
-QUORREL_EXPRESSION_ROUTINE(boundaryY) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return a.boundary(2); });
+Result boundaryY(ElementArray& a) {
+  return a.boundary(2);
 }
-QUORREL_EXPRESSION_ROUTINE(boundaryZ) {
-  return runExpression<>(runRecord, parameterToken, [](ElementArray& a) { return a.boundary(3); });
+Result boundaryZ(ElementArray& a) {
+  return a.boundary(3);
 }
-QUORREL_EXPRESSION_ROUTINE(dimIndexOfIndex) {
-  return runExpression<Int, Int>(
-      runRecord, parameterToken,
-      [](ElementArray& a, int32_t d, int32_t index) { return a.dimIndexOfIndex(d, index); });
+Result dimIndexOfIndexText(ElementArray& a, int32_t d, int32_t index) {
+  return a.dimIndexOfIndex(d, index);
 }
-QUORREL_EXPRESSION_ROUTINE(xOfIndex) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray& a, int32_t index) {
-    return a.dimIndexOfIndex(1, index);
-  });
+Result XOfIndex(ElementArray& a, int32_t index) {
+  return a.dimIndexOfIndex(1, index);
 }
-QUORREL_EXPRESSION_ROUTINE(yOfIndex) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray& a, int32_t index) {
-    return a.dimIndexOfIndex(2, index);
-  });
+Result YOfIndex(ElementArray& a, int32_t index) {
+  return a.dimIndexOfIndex(2, index);
 }
-QUORREL_EXPRESSION_ROUTINE(zOfIndex) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray& a, int32_t index) {
-    return a.dimIndexOfIndex(3, index);
-  });
+Result ZOfIndex(ElementArray& a, int32_t index) {
+  return a.dimIndexOfIndex(3, index);
 }
-QUORREL_EXPRESSION_ROUTINE(indexOfDimIndex) {
-  return runExpression<Text>(runRecord, parameterToken, [](ElementArray& a, const char* list) {
-    return a.indexOfDimIndex(list);
-  });
+Result indexOfDimIndex(ElementArray& a, const char* list) {
+  return a.indexOfDimIndex(list);
 }
-QUORREL_EXPRESSION_ROUTINE(indexOfXY) {
-  return runExpression<Int, Int>(
-      runRecord, parameterToken,
-      [](ElementArray& a, int32_t x, int32_t y) { return a.indexOfXY(x, y); });
+Result indexOfXY(ElementArray& a, int32_t x, int32_t y) {
+  return a.indexOfXY(x, y);
 }
 
 }  // namespace quorrel::host::expr

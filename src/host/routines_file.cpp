@@ -2,7 +2,6 @@
 // file contents taken into elements.
 #include <optional>
 
-#include "host/routine_support.h"
 #include "host/routines.h"
 #include "io/csv_file.h"
 #include "io/element_file.h"
@@ -29,92 +28,61 @@ FileStatus withFileContents(const char* path, Use&& use) {
 namespace quorrel::host::act {
 
 // Whole-array saves write a new file (mode 0); loads replace (0) or append (1).
-QUORREL_ACTION_ROUTINE(saveToFile) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return saveNativeFile(a, textParam(param1), FileModeTruncate);
-  });
+FileStatus saveToFile(Instance in, const char* path) {
+  return saveNativeFile(in.array, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(loadFromFile) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return loadNativeFile(a, textParam(param1), LoadReplace);
-  });
+FileStatus loadFromFile(Instance in, const char* path) {
+  return loadNativeFile(in.array, path, LoadReplace);
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromFile) {
-  return runFileAction(
-      runRecord, [&](ElementArray& a) { return loadNativeFile(a, textParam(param1), LoadAppend); });
+FileStatus appendElementsFromFile(Instance in, const char* path) {
+  return loadNativeFile(in.array, path, LoadAppend);
 }
-QUORREL_ACTION_ROUTINE(saveAsHostArray) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return saveHostArrayFile(a, textParam(param1), FileModeTruncate);
-  });
+FileStatus saveToHostArray(Instance in, const char* path) {
+  return saveHostArrayFile(in.array, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(loadFromHostArray) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return loadHostArrayFile(a, textParam(param1), LoadReplace);
-  });
+FileStatus loadFromHostArray(Instance in, const char* path) {
+  return loadHostArrayFile(in.array, path, LoadReplace);
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromHostArray) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return loadHostArrayFile(a, textParam(param1), LoadAppend);
-  });
+FileStatus appendElementsFromHostArray(Instance in, const char* path) {
+  return loadHostArrayFile(in.array, path, LoadAppend);
 }
 
-QUORREL_ACTION_ROUTINE(saveToCsvFile) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return saveCsvFile(a, textParam(param1), FileModeTruncate);
-  });
+FileStatus saveToCsv(Instance in, const char* path) {
+  return saveCsvFile(in.array, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(loadFromCsvFile) {
-  return runFileAction(
-      runRecord, [&](ElementArray& a) { return loadCsvFile(a, textParam(param1), LoadReplace); });
+FileStatus loadFromCsv(Instance in, const char* path) {
+  return loadCsvFile(in.array, path, LoadReplace);
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromCsvFile) {
-  return runFileAction(
-      runRecord, [&](ElementArray& a) { return loadCsvFile(a, textParam(param1), LoadAppend); });
+FileStatus appendElementsFromCsv(Instance in, const char* path) {
+  return loadCsvFile(in.array, path, LoadAppend);
 }
-QUORREL_ACTION_ROUTINE(saveToIniFile) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return saveIniFile(a, textParam(param1), FileModeTruncate);
-  });
+FileStatus saveToIni(Instance in, const char* path) {
+  return saveIniFile(in.array, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(loadFromIniFile) {
-  return runFileAction(
-      runRecord, [&](ElementArray& a) { return loadIniFile(a, textParam(param1), LoadReplace); });
+FileStatus loadFromIni(Instance in, const char* path) {
+  return loadIniFile(in.array, path, LoadReplace);
 }
-QUORREL_ACTION_ROUTINE(appendElementsFromIniFile) {
-  return runFileAction(
-      runRecord, [&](ElementArray& a) { return loadIniFile(a, textParam(param1), LoadAppend); });
+FileStatus appendElementsFromIni(Instance in, const char* path) {
+  return loadIniFile(in.array, path, LoadAppend);
 }
 
 // Element files: index first, path second; a new file (0) or appended to (1).
-QUORREL_ACTION_ROUTINE(saveElementToFile) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return quorrel::saveElementToFile(a, numberParam(param1), textParam(param2), FileModeTruncate);
-  });
+FileStatus saveElementToFile(Instance in, int32_t index, const char* path) {
+  return quorrel::saveElementToFile(in.array, index, path, FileModeTruncate);
 }
-QUORREL_ACTION_ROUTINE(appendElementToFile) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return quorrel::saveElementToFile(a, numberParam(param1), textParam(param2), FileModeAppend);
-  });
+FileStatus appendElementToFile(Instance in, int32_t index, const char* path) {
+  return quorrel::saveElementToFile(in.array, index, path, FileModeAppend);
 }
 
 // File contents become File elements.
-QUORREL_ACTION_ROUTINE(setFileAt) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return withFileContents(textParam(param1),
-                            [&](ByteBlock block) { a.setFile(block, numberParam(param2)); });
-  });
+FileStatus setFileAt(Instance in, const char* path, int32_t index) {
+  return withFileContents(path, [&](ByteBlock block) { in.array.setFile(block, index); });
 }
-QUORREL_ACTION_ROUTINE(insertFileAt) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return withFileContents(textParam(param1),
-                            [&](ByteBlock block) { a.insertFile(block, numberParam(param2)); });
-  });
+FileStatus insertFileAt(Instance in, const char* path, int32_t index) {
+  return withFileContents(path, [&](ByteBlock block) { in.array.insertFile(block, index); });
 }
-QUORREL_ACTION_ROUTINE(appendFile) {
-  return runFileAction(runRecord, [&](ElementArray& a) {
-    return withFileContents(textParam(param1), [&](ByteBlock block) { a.appendFile(block); });
-  });
+FileStatus appendFile(Instance in, const char* path) {
+  return withFileContents(path, [&](ByteBlock block) { in.array.appendFile(block); });
 }
 
 }  // namespace quorrel::host::act

@@ -1,6 +1,5 @@
 // Routines of the recordset: rows, columns and labels, selections, row sorts,
 // column aggregates, the between column and cell reads.
-#include "host/routine_support.h"
 #include "host/routines.h"
 #include "recordset/aggregates.h"
 #include "recordset/row_sort.h"
@@ -27,295 +26,202 @@ int32_t cellIndexOf(const ElementArray& a, int32_t row, int32_t column) {
 namespace quorrel::host::act {
 
 // --- Between selections: the column lives in the run record ------------------------
-QUORREL_ACTION_ROUTINE(pickColumnForBetween) {
-  return runAction(runRecord,
-                   [&](ElementArray&) { setBetweenColumn(runRecord, numberParam(param1)); });
+void pickColumnForBetween(Instance in, int32_t column) {
+  setBetweenColumn(in.runRecord, column);
 }
-QUORREL_ACTION_ROUTINE(pickLabelForBetween) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    setBetweenColumn(runRecord, columnOfLabel(a, textParam(param1)));
-  });
+void pickLabelForBetween(Instance in, const char* label) {
+  setBetweenColumn(in.runRecord, columnOfLabel(in.array, label));
 }
-QUORREL_ACTION_ROUTINE(selectRowsBetweenValues) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectBetweenValues(a, betweenColumnOf(runRecord), numberParam(param1), numberParam(param2));
-  });
+void selectBetweenValues(Instance in, int32_t low, int32_t high) {
+  quorrel::selectBetweenValues(in.array, betweenColumnOf(in.runRecord), low, high);
 }
-QUORREL_ACTION_ROUTINE(selectRowsBetweenStrings) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectBetweenStrings(a, betweenColumnOf(runRecord), textParam(param1), textParam(param2));
-  });
+void selectBetweenStrings(Instance in, const char* low, const char* high) {
+  quorrel::selectBetweenStrings(in.array, betweenColumnOf(in.runRecord), low, high);
 }
 
 // --- Rows and labels -----------------------------------------------------------------
-QUORREL_ACTION_ROUTINE(insertRowFromList) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    quorrel::insertRowFromList(a, textParam(param1), numberParam(param2));
-  });
+void insertRowFromList(Instance in, const char* list, int32_t row) {
+  quorrel::insertRowFromList(in.array, list, row);
 }
-QUORREL_ACTION_ROUTINE(appendRowFromList) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { quorrel::appendRowFromList(a, textParam(param1)); });
+void appendRowFromList(Instance in, const char* list) {
+  quorrel::appendRowFromList(in.array, list);
 }
-QUORREL_ACTION_ROUTINE(replaceRowWithList) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    quorrel::replaceRowWithList(a, textParam(param1), numberParam(param2));
-  });
+void replaceRowWithList(Instance in, const char* list, int32_t row) {
+  quorrel::replaceRowWithList(in.array, list, row);
 }
-QUORREL_ACTION_ROUTINE(deleteRow) {
-  return runAction(runRecord, [&](ElementArray& a) { quorrel::deleteRow(a, numberParam(param1)); });
+void deleteRow(Instance in, int32_t row) {
+  quorrel::deleteRow(in.array, row);
 }
-QUORREL_ACTION_ROUTINE(setLabel) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    quorrel::setLabel(a, textParam(param1), numberParam(param2));
-  });
+void setLabel(Instance in, const char* label, int32_t column) {
+  quorrel::setLabel(in.array, label, column);
 }
 
 // --- Row sorts -----------------------------------------------------------------------
-QUORREL_ACTION_ROUTINE(sortRowsByColumnValueAscending) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { sortRows(a, numberParam(param1), SortByValue, false); });
+void sortRowsByColumnValueAscending(Instance in, int32_t column) {
+  sortRows(in.array, column, SortByValue, false);
 }
-QUORREL_ACTION_ROUTINE(sortRowsByColumnValueDescending) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { sortRows(a, numberParam(param1), SortByValue, true); });
+void sortRowsByColumnValueDescending(Instance in, int32_t column) {
+  sortRows(in.array, column, SortByValue, true);
 }
-QUORREL_ACTION_ROUTINE(sortRowsByColumnStringAscending) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { sortRows(a, numberParam(param1), SortByText, false); });
+void sortRowsByColumnStringAscending(Instance in, int32_t column) {
+  sortRows(in.array, column, SortByText, false);
 }
-QUORREL_ACTION_ROUTINE(sortRowsByColumnStringDescending) {
-  return runAction(runRecord,
-                   [&](ElementArray& a) { sortRows(a, numberParam(param1), SortByText, true); });
+void sortRowsByColumnStringDescending(Instance in, int32_t column) {
+  sortRows(in.array, column, SortByText, true);
 }
-QUORREL_ACTION_ROUTINE(sortRowsByLabelValueAscending) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    sortRowsByLabel(a, textParam(param1), SortByValue, false);
-  });
+void sortRowsByLabelValueAscending(Instance in, const char* label) {
+  sortRowsByLabel(in.array, label, SortByValue, false);
 }
-QUORREL_ACTION_ROUTINE(sortRowsByLabelValueDescending) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    sortRowsByLabel(a, textParam(param1), SortByValue, true);
-  });
+void sortRowsByLabelValueDescending(Instance in, const char* label) {
+  sortRowsByLabel(in.array, label, SortByValue, true);
 }
-QUORREL_ACTION_ROUTINE(sortRowsByLabelStringAscending) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    sortRowsByLabel(a, textParam(param1), SortByText, false);
-  });
+void sortRowsByLabelStringAscending(Instance in, const char* label) {
+  sortRowsByLabel(in.array, label, SortByText, false);
 }
-QUORREL_ACTION_ROUTINE(sortRowsByLabelStringDescending) {
-  return runAction(
-      runRecord, [&](ElementArray& a) { sortRowsByLabel(a, textParam(param1), SortByText, true); });
+void sortRowsByLabelStringDescending(Instance in, const char* label) {
+  sortRowsByLabel(in.array, label, SortByText, true);
 }
 
 // --- Selection modes and whole-selection edits ---------------------------------------
-QUORREL_ACTION_ROUTINE(andMode) {
-  return runAction(runRecord, [](ElementArray& a) { a.settings.selectionMode = SelectAnd; });
+void selectionModeAnd(Instance in) {
+  in.array.settings.selectionMode = SelectAnd;
 }
-QUORREL_ACTION_ROUTINE(orMode) {
-  return runAction(runRecord, [](ElementArray& a) { a.settings.selectionMode = SelectOr; });
+void selectionModeOr(Instance in) {
+  in.array.settings.selectionMode = SelectOr;
 }
-QUORREL_ACTION_ROUTINE(selectAllRows) {
-  return runAction(runRecord, [](ElementArray& a) { quorrel::selectAllRows(a); });
+void selectAllRows(Instance in) {
+  quorrel::selectAllRows(in.array);
 }
-QUORREL_ACTION_ROUTINE(invertSelection) {
-  return runAction(runRecord, [](ElementArray& a) { quorrel::invertSelection(a); });
+void invertSelection(Instance in) {
+  quorrel::invertSelection(in.array);
 }
-QUORREL_ACTION_ROUTINE(startNewWhere) {
-  return runAction(runRecord, [](ElementArray& a) { quorrel::startNewWhere(a); });
+void startNewWhere(Instance in) {
+  quorrel::startNewWhere(in.array);
 }
 
 // --- Where by column -----------------------------------------------------------------
-QUORREL_ACTION_ROUTINE(selectColumnMatching) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereMatching(a, numberParam(param1), textParam(param2));
-  });
+void selectWhereMatchingByColumn(Instance in, int32_t column, const char* pattern) {
+  selectWhereMatching(in.array, column, pattern);
 }
-QUORREL_ACTION_ROUTINE(selectColumnContaining) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereContaining(a, numberParam(param1), textParam(param2));
-  });
+void selectWhereContainingByColumn(Instance in, int32_t column, const char* text) {
+  selectWhereContaining(in.array, column, text);
 }
-QUORREL_ACTION_ROUTINE(selectColumnEqual) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereEqual(a, numberParam(param1), numberParam(param2));
-  });
+void selectWhereEqualByColumn(Instance in, int32_t column, int32_t number) {
+  selectWhereEqual(in.array, column, number);
 }
-QUORREL_ACTION_ROUTINE(selectColumnNotEqual) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereNotEqual(a, numberParam(param1), numberParam(param2));
-  });
+void selectWhereNotEqualByColumn(Instance in, int32_t column, int32_t number) {
+  selectWhereNotEqual(in.array, column, number);
 }
-QUORREL_ACTION_ROUTINE(selectColumnGreater) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereGreater(a, numberParam(param1), numberParam(param2));
-  });
+void selectWhereGreaterByColumn(Instance in, int32_t column, int32_t number) {
+  selectWhereGreater(in.array, column, number);
 }
-QUORREL_ACTION_ROUTINE(selectColumnGreaterOrEqual) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereGreaterOrEqual(a, numberParam(param1), numberParam(param2));
-  });
+void selectWhereGreaterOrEqualByColumn(Instance in, int32_t column, int32_t number) {
+  selectWhereGreaterOrEqual(in.array, column, number);
 }
-QUORREL_ACTION_ROUTINE(selectColumnLess) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereLess(a, numberParam(param1), numberParam(param2));
-  });
+void selectWhereLessByColumn(Instance in, int32_t column, int32_t number) {
+  selectWhereLess(in.array, column, number);
 }
-QUORREL_ACTION_ROUTINE(selectColumnLessOrEqual) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereLessOrEqual(a, numberParam(param1), numberParam(param2));
-  });
+void selectWhereLessOrEqualByColumn(Instance in, int32_t column, int32_t number) {
+  selectWhereLessOrEqual(in.array, column, number);
 }
 
 // --- Where by label: the label's column, passed on as found (-1 when missing) -------
-QUORREL_ACTION_ROUTINE(selectLabelMatching) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereMatching(a, columnOfLabel(a, textParam(param1)), textParam(param2));
-  });
+void selectWhereMatchingByLabel(Instance in, const char* label, const char* pattern) {
+  selectWhereMatching(in.array, columnOfLabel(in.array, label), pattern);
 }
-QUORREL_ACTION_ROUTINE(selectLabelContaining) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereContaining(a, columnOfLabel(a, textParam(param1)), textParam(param2));
-  });
+void selectWhereContainingByLabel(Instance in, const char* label, const char* text) {
+  selectWhereContaining(in.array, columnOfLabel(in.array, label), text);
 }
-QUORREL_ACTION_ROUTINE(selectLabelEqual) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereEqual(a, columnOfLabel(a, textParam(param1)), numberParam(param2));
-  });
+void selectWhereEqualByLabel(Instance in, const char* label, int32_t number) {
+  selectWhereEqual(in.array, columnOfLabel(in.array, label), number);
 }
-QUORREL_ACTION_ROUTINE(selectLabelNotEqual) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereNotEqual(a, columnOfLabel(a, textParam(param1)), numberParam(param2));
-  });
+void selectWhereNotEqualByLabel(Instance in, const char* label, int32_t number) {
+  selectWhereNotEqual(in.array, columnOfLabel(in.array, label), number);
 }
-QUORREL_ACTION_ROUTINE(selectLabelGreater) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereGreater(a, columnOfLabel(a, textParam(param1)), numberParam(param2));
-  });
+void selectWhereGreaterByLabel(Instance in, const char* label, int32_t number) {
+  selectWhereGreater(in.array, columnOfLabel(in.array, label), number);
 }
-QUORREL_ACTION_ROUTINE(selectLabelGreaterOrEqual) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereGreaterOrEqual(a, columnOfLabel(a, textParam(param1)), numberParam(param2));
-  });
+void selectWhereGreaterOrEqualByLabel(Instance in, const char* label, int32_t number) {
+  selectWhereGreaterOrEqual(in.array, columnOfLabel(in.array, label), number);
 }
-QUORREL_ACTION_ROUTINE(selectLabelLess) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereLess(a, columnOfLabel(a, textParam(param1)), numberParam(param2));
-  });
+void selectWhereLessByLabel(Instance in, const char* label, int32_t number) {
+  selectWhereLess(in.array, columnOfLabel(in.array, label), number);
 }
-QUORREL_ACTION_ROUTINE(selectLabelLessOrEqual) {
-  return runAction(runRecord, [&](ElementArray& a) {
-    selectWhereLessOrEqual(a, columnOfLabel(a, textParam(param1)), numberParam(param2));
-  });
+void selectWhereLessOrEqualByLabel(Instance in, const char* label, int32_t number) {
+  selectWhereLessOrEqual(in.array, columnOfLabel(in.array, label), number);
 }
 
 }  // namespace quorrel::host::act
 
 namespace quorrel::host::expr {
 
-QUORREL_EXPRESSION_ROUTINE(numberOfRows) {
-  return runExpression<>(runRecord, parameterToken,
-                         [](ElementArray& a) { return quorrel::numberOfRows(a); });
+Result numberOfRows(ElementArray& a) {
+  return quorrel::numberOfRows(a);
 }
-QUORREL_EXPRESSION_ROUTINE(numberOfCols) {
-  return runExpression<>(runRecord, parameterToken,
-                         [](ElementArray& a) { return quorrel::numberOfCols(a); });
+Result numberOfCols(ElementArray& a) {
+  return quorrel::numberOfCols(a);
 }
-QUORREL_EXPRESSION_ROUTINE(rowList) {
-  return runExpression<Int>(runRecord, parameterToken,
-                            [](ElementArray& a, int32_t row) { return quorrel::rowList(a, row); });
+Result rowListText(ElementArray& a, int32_t row) {
+  return quorrel::rowList(a, row);
 }
-QUORREL_EXPRESSION_ROUTINE(columnList) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray& a, int32_t column) {
-    return quorrel::columnList(a, column);
-  });
+Result columnListText(ElementArray& a, int32_t column) {
+  return quorrel::columnList(a, column);
 }
-QUORREL_EXPRESSION_ROUTINE(labelList) {
-  return runExpression<>(runRecord, parameterToken,
-                         [](ElementArray& a) { return quorrel::labelList(a); });
+Result labelListText(ElementArray& a) {
+  return quorrel::labelList(a);
 }
-QUORREL_EXPRESSION_ROUTINE(getLabel) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray& a, int32_t column) {
-    return Borrowed{quorrel::getLabel(a, column)};
-  });
+Result getLabelText(ElementArray& a, int32_t column) {
+  return Borrowed{quorrel::getLabel(a, column)};
 }
-QUORREL_EXPRESSION_ROUTINE(getCol) {
-  return runExpression<Text>(runRecord, parameterToken, [](ElementArray& a, const char* label) {
-    return columnOfLabel(a, label);
-  });
+Result getCol(ElementArray& a, const char* label) {
+  return columnOfLabel(a, label);
 }
-QUORREL_EXPRESSION_ROUTINE(delimiter) {
-  return runExpression<>(runRecord, parameterToken,
-                         [](ElementArray& a) { return Borrowed{listDelimiter(a)}; });
+Result delimiterText(ElementArray& a) {
+  return Borrowed{listDelimiter(a)};
 }
 
 // --- Cell reads ----------------------------------------------------------------------
-QUORREL_EXPRESSION_ROUTINE(getFromColumnRow) {
-  return runExpression<Int, Int>(runRecord, parameterToken,
-                                 [](ElementArray& a, int32_t column, int32_t row) {
-                                   return a.getValue(cellIndexOf(a, row, column));
-                                 });
+Result getFromColumnRow(ElementArray& a, int32_t column, int32_t row) {
+  return a.getValue(cellIndexOf(a, row, column));
 }
-QUORREL_EXPRESSION_ROUTINE(getStringFromColumnRow) {
-  return runExpression<Int, Int>(runRecord, parameterToken,
-                                 [](ElementArray& a, int32_t column, int32_t row) {
-                                   return Borrowed{a.getString(cellIndexOf(a, row, column))};
-                                 });
+Result getFromColumnRowText(ElementArray& a, int32_t column, int32_t row) {
+  return Borrowed{a.getString(cellIndexOf(a, row, column))};
 }
 // An unknown label reads nothing, rather than the cell before the row.
-QUORREL_EXPRESSION_ROUTINE(getFromLabelRow) {
-  return runExpression<Text, Int>(runRecord, parameterToken,
-                                  [](ElementArray& a, const char* label, int32_t row) {
-                                    const int32_t column = columnOfLabel(a, label);
-                                    if (column < 0) return 0;
-                                    return a.getValue(cellIndexOf(a, row, column));
-                                  });
+Result getFromLabelRow(ElementArray& a, const char* label, int32_t row) {
+  const int32_t column = columnOfLabel(a, label);
+  if (column < 0) return 0;
+  return a.getValue(cellIndexOf(a, row, column));
 }
-QUORREL_EXPRESSION_ROUTINE(getStringFromLabelRow) {
-  return runExpression<Text, Int>(
-      runRecord, parameterToken, [](ElementArray& a, const char* label, int32_t row) {
-        const int32_t column = columnOfLabel(a, label);
-        return Borrowed{column < 0 ? nullptr : a.getString(cellIndexOf(a, row, column))};
-      });
+Result getFromLabelRowText(ElementArray& a, const char* label, int32_t row) {
+  const int32_t column = columnOfLabel(a, label);
+  return Borrowed{column < 0 ? nullptr : a.getString(cellIndexOf(a, row, column))};
 }
 
 // --- Column aggregates ---------------------------------------------------------------
-QUORREL_EXPRESSION_ROUTINE(colMax) {
-  return runExpression<Int>(runRecord, parameterToken,
-                            [](ElementArray& a, int32_t column) { return columnMax(a, column); });
+Result colMax(ElementArray& a, int32_t column) {
+  return columnMax(a, column);
 }
-QUORREL_EXPRESSION_ROUTINE(colMin) {
-  return runExpression<Int>(runRecord, parameterToken,
-                            [](ElementArray& a, int32_t column) { return columnMin(a, column); });
+Result colMin(ElementArray& a, int32_t column) {
+  return columnMin(a, column);
 }
-QUORREL_EXPRESSION_ROUTINE(colSum) {
-  return runExpression<Int>(runRecord, parameterToken,
-                            [](ElementArray& a, int32_t column) { return columnSum(a, column); });
+Result colSum(ElementArray& a, int32_t column) {
+  return columnSum(a, column);
 }
-QUORREL_EXPRESSION_ROUTINE(colAvg) {
-  return runExpression<Int>(runRecord, parameterToken, [](ElementArray& a, int32_t column) {
-    return columnAverage(a, column);
-  });
+Result colAvg(ElementArray& a, int32_t column) {
+  return columnAverage(a, column);
 }
-QUORREL_EXPRESSION_ROUTINE(labMax) {
-  return runExpression<Text>(runRecord, parameterToken, [](ElementArray& a, const char* label) {
-    return columnMax(a, columnOfLabel(a, label));
-  });
+Result labMax(ElementArray& a, const char* label) {
+  return columnMax(a, columnOfLabel(a, label));
 }
-QUORREL_EXPRESSION_ROUTINE(labMin) {
-  return runExpression<Text>(runRecord, parameterToken, [](ElementArray& a, const char* label) {
-    return columnMin(a, columnOfLabel(a, label));
-  });
+Result labMin(ElementArray& a, const char* label) {
+  return columnMin(a, columnOfLabel(a, label));
 }
-QUORREL_EXPRESSION_ROUTINE(labSum) {
-  return runExpression<Text>(runRecord, parameterToken, [](ElementArray& a, const char* label) {
-    return columnSum(a, columnOfLabel(a, label));
-  });
+Result labSum(ElementArray& a, const char* label) {
+  return columnSum(a, columnOfLabel(a, label));
 }
-QUORREL_EXPRESSION_ROUTINE(labAvg) {
-  return runExpression<Text>(runRecord, parameterToken, [](ElementArray& a, const char* label) {
-    return columnAverage(a, columnOfLabel(a, label));
-  });
+Result labAvg(ElementArray& a, const char* label) {
+  return columnAverage(a, columnOfLabel(a, label));
 }
 
 }  // namespace quorrel::host::expr

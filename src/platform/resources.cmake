@@ -6,6 +6,20 @@
 #    and the module exports those services for host programs.
 set(QUORREL_RESOURCE_SCRIPT ${CMAKE_SOURCE_DIR}/resources/quorrel.rc)
 
+# The script's menus and strings must offer exactly the rows of src/host/table.inc.
+set(quorrel_table_stamp ${CMAKE_BINARY_DIR}/generated/resources_match_table.stamp)
+add_custom_command(
+  OUTPUT ${quorrel_table_stamp}
+  COMMAND ${CMAKE_COMMAND} -DSCRIPT=${QUORREL_RESOURCE_SCRIPT}
+          -DTABLE=${CMAKE_SOURCE_DIR}/src/host/table.inc -DSTAMP=${quorrel_table_stamp}
+          -P ${CMAKE_SOURCE_DIR}/resources/check_table.cmake
+  DEPENDS ${QUORREL_RESOURCE_SCRIPT} ${CMAKE_SOURCE_DIR}/src/host/table.inc
+          ${CMAKE_SOURCE_DIR}/resources/check_table.cmake
+  COMMENT "Checking quorrel.rc against the table of actions and expressions"
+  VERBATIM)
+add_custom_target(quorrel_resources_match_table DEPENDS ${quorrel_table_stamp})
+add_dependencies(quorrel_module quorrel_resources_match_table)
+
 if(WIN32)
   return()  # cmake/WindowsDll.cmake hands the script to the resource compiler
 endif()

@@ -9,88 +9,28 @@ extern const char* const kDescriptionsText;
 
 namespace {
 
-constexpr FileUse R = FileUse::Read, W = FileUse::Write, X = FileUse::Extend;
+// The first text parameter of a file action is its path.
+constexpr int pathParamOf(std::string_view param1) {
+  return param1 == "Text" ? 0 : 1;
+}
 
 const ActionEntry kActions[abi::kActionCount] = {
-    {"saveToFile", W},
-    {"saveToHostArray", W},
-    {"saveToCsv", W},
-    {"loadFromFile", R},
-    {"loadFromHostArray", R},
-    {"loadFromCsv", R},
-    {"insertStringAt"},
-    {"insertValueAt"},
-    {"appendString"},
-    {"appendValue"},
-    {"appendElementsFromFile", R},
-    {"appendElementsFromHostArray", R},
-    {"appendElementsFromCsv", R},
-    {"setStringAt"},
-    {"setValueAt"},
-    {"pickColumnForBetween"},
-    {"deleteAt"},
-    {"deleteAll"},
-    {"saveElementToFile", W, 1},
-    {"appendElementToFile", X, 1},
-    {"setKeyStringAt"},
-    {"setKeyValueAt"},
-    {"sortStringsAscending"},
-    {"sortStringsDescending"},
-    {"sortValuesAscending"},
-    {"sortValuesDescending"},
-    {"selectBetweenValues"},
-    {"setArrayDimension"},
-    {"use2D"},
-    {"use3D"},
-    {"setDimensionBoundary"},
-    {"resizeDimensionBoundary"},
-    {"insertRowFromList"},
-    {"selectWhereGreaterOrEqualByLabel"},
-    {"appendRowFromList"},
-    {"selectWhereLessByLabel"},
-    {"replaceRowWithList"},
-    {"selectWhereLessOrEqualByLabel"},
-    {"pickLabelForBetween"},
-    {"deleteRow"},
-    {"sortRowsByColumnValueAscending"},
-    {"sortRowsByColumnValueDescending"},
-    {"sortRowsByColumnStringAscending"},
-    {"sortRowsByColumnStringDescending"},
-    {"sortRowsByLabelValueAscending"},
-    {"sortRowsByLabelValueDescending"},
-    {"sortRowsByLabelStringAscending"},
-    {"sortRowsByLabelStringDescending"},
-    {"setLabel"},
-    {"selectBetweenStrings"},
-    {"caseInsensitive"},
-    {"caseSensitive"},
-    {"setFileAt", R},
-    {"insertFileAt", R},
-    {"appendFile", R},
-    {"literalSearch"},
-    {"wildcardSearch"},
-    {"setListDelimiter"},
-    {"saveToIni", W},
-    {"loadFromIni", R},
-    {"appendElementsFromIni", R},
-    {"selectionModeAnd"},
-    {"selectionModeOr"},
-    {"selectAllRows"},
-    {"invertSelection"},
-    {"selectWhereMatchingByColumn"},
-    {"selectWhereContainingByColumn"},
-    {"selectWhereEqualByColumn"},
-    {"selectWhereNotEqualByColumn"},
-    {"selectWhereGreaterByColumn"},
-    {"selectWhereGreaterOrEqualByColumn"},
-    {"selectWhereLessByColumn"},
-    {"selectWhereLessOrEqualByColumn"},
-    {"selectWhereMatchingByLabel"},
-    {"selectWhereContainingByLabel"},
-    {"selectWhereEqualByLabel"},
-    {"selectWhereNotEqualByLabel"},
-    {"selectWhereGreaterByLabel"},
-    {"startNewWhere"},
+#define ACTION(code, name, param1, param2, file, meaning1, meaning2) \
+  {#name, FileUse::file, pathParamOf(#param1)},
+#include "host/table.inc"
+};
+
+// What each parameter is, by code; empty past the last one.
+struct Meanings {
+  const char* param[2];
+};
+const Meanings kActionMeanings[abi::kActionCount] = {
+#define ACTION(code, name, param1, param2, file, meaning1, meaning2) {{meaning1, meaning2}},
+#include "host/table.inc"
+};
+const Meanings kExpressionMeanings[abi::kExpressionCount] = {
+#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2) {{meaning1, meaning2}},
+#include "host/table.inc"
 };
 
 // The text after a "name:" prefix, blanks before it skipped.
@@ -121,17 +61,20 @@ std::optional<int32_t> actionCodeOfName(std::string_view name) {
 }
 
 std::optional<Description> describe(bool action, int32_t code) {
+  if (code < 0 || code >= (action ? abi::kActionCount : abi::kExpressionCount)) return std::nullopt;
   const std::string header = (action ? "== A" : "== E") + std::to_string(code);
   std::string_view text = kDescriptionsText;
   while (!text.empty() && nextLine(text) != header) {
   }
   if (text.empty()) return std::nullopt;
   Description description;
+  const Meanings& meanings = action ? kActionMeanings[code] : kExpressionMeanings[code];
+  for (const char* meaning : meanings.param) {
+    if (*meaning != '\0') description.params.emplace_back(meaning);
+  }
   while (!text.empty() && text.substr(0, 3) != "== ") {
     const std::string_view line = nextLine(text);
-    if (line.substr(0, 6) == "param:") {
-      description.params.push_back(afterPrefix(line, 6));
-    } else if (line.substr(0, 4) == "bad:") {
+    if (line.substr(0, 4) == "bad:") {
       description.bad = afterPrefix(line, 4);
     } else if (!line.empty()) {
       if (!description.prose.empty()) description.prose += '\n';

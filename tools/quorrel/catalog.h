@@ -1,6 +1,6 @@
-// What a person needs to call an action or expression by name: the readable action
-// names (built from each action's menu path, so the by-column and by-label variants
-// stay apart), the file each file action opens, and the help page's prose.
+// What a person needs to call an action or expression by name: the action names, the
+// file each file action opens and what each parameter is (all from host/table.inc),
+// and the help page's prose.
 #pragma once
 
 #include <cstdint>
