@@ -1,31 +1,31 @@
 # Column and label aggregates over the visible rows.
 new x=2 autoselect=1
-A 34 "a,4"
-A 34 "b,abc"
-A 34 "c,-6"
-A 48 "k" 0
-A 48 "v" 1
-E 52 1
-E 53 1
-E 54 1
-E 55 1
-E 56 "v"
-E 57 "V"
-E 58 "v"
-E 59 "v"
-A 34 "d,30"
-A 78
-A 65 0 "a"
-A 65 0 "d"
-E 52 1
-E 53 1
-E 54 1
-E 55 1
-E 56 "v"
-E 57 "v"
-E 58 "v"
-E 59 "v"
-A 78
-E 54 1
-E 52 1
-E 59 "v"
+A appendRowFromList "a,4"
+A appendRowFromList "b,abc"
+A appendRowFromList "c,-6"
+A setLabel "k" 0
+A setLabel "v" 1
+E colMax( 1
+E colMin( 1
+E colSum( 1
+E colAvg( 1
+E labMax( "v"
+E labMin( "V"
+E labSum( "v"
+E labAvg( "v"
+A appendRowFromList "d,30"
+A startNewWhere
+A selectWhereMatchingByColumn 0 "a"
+A selectWhereMatchingByColumn 0 "d"
+E colMax( 1
+E colMin( 1
+E colSum( 1
+E colAvg( 1
+E labMax( "v"
+E labMin( "v"
+E labSum( "v"
+E labAvg( "v"
+A startNewWhere
+E colSum( 1
+E colMax( 1
+E labAvg( "v"

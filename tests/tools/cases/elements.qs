@@ -1,143 +1,143 @@
 # Element edits, keys and reads through the routine tables.
-E 0
-E 1
-E 2 0
-A 8 "apple"
-A 9 42
-A 9 0
-A 7 -7 1
-A 6 "first" 0
-E 0
-E 2 0
-E 2 2
-E 3 2
+E size(
+E capacity(
+E get$( 0
+A appendString "apple"
+A appendValue 42
+A appendValue 0
+A insertValueAt -7 1
+A insertStringAt "first" 0
+E size(
+E get$( 0
+E get$( 2
+E get( 2
 # The value 0 is stored as an empty element: empty text, value 0.
-E 2 4
-E 3 4
-E 3 1
-A 13 "12abc" 4
-E 3 4
+E get$( 4
+E get( 4
+E get( 1
+A setStringAt "12abc" 4
+E get( 4
 # Setting past the end grows the array with empty elements.
-A 14 99 7
-E 0
-E 2 6
-E 3 7
-A 16 1
-E 0
-E 2 1
-A 16 7
-A 16 -1
-A 6 "x" -1
-E 0
-A 20 "k-first" 0
-A 21 5 2
-A 21 0 1
-A 20 "far" 7
-E 4 0
-E 5 0
-E 4 2
-E 5 2
+A setValueAt 99 7
+E size(
+E get$( 6
+E get( 7
+A deleteAt 1
+E size(
+E get$( 1
+A deleteAt 7
+A deleteAt -1
+A insertStringAt "x" -1
+E size(
+A setKeyStringAt "k-first" 0
+A setKeyValueAt 5 2
+A setKeyValueAt 0 1
+A setKeyStringAt "far" 7
+E key$( 0
+E key( 0
+E key$( 2
+E key( 2
 # A key set to 0 exists and is empty; an element without a key gives no text.
-E 4 1
-E 4 3
-E 0
-A 8 "tab\tq\"\\\x01\xff"
-E 2 7
-A 17
-E 0
-E 1
+E key$( 1
+E key$( 3
+E size(
+A appendString "tab\tq\"\\\x01\xff"
+E get$( 7
+A deleteAll
+E size(
+E capacity(
 # Capacity grows by half when the size passes half of it.
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-A 9 1
-E 1
-A 9 1
-E 1
-E 0
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+A appendValue 1
+E capacity(
+A appendValue 1
+E capacity(
+E size(
 # Texts read as numbers as atol reads them in the C locale: blanks, one sign, then
 # digits up to the first other character, saturating at the int32 limits; 0xA0 is
 # not a blank.
 new dims=1
-A 8 "0042"
-E 3 0
-A 8 "  9 apples"
-E 3 1
-A 8 "-"
-E 3 2
-A 8 " -7"
-E 3 3
-A 8 "12abc"
-E 3 4
-A 8 "abc"
-E 3 5
-A 8 "+5"
-E 3 6
-A 8 "\t\n\x0b\x0c\r8"
-E 3 7
-A 8 "+-3"
-E 3 8
-A 8 "- 3"
-E 3 9
-A 8 "3 4"
-E 3 10
-A 8 "\xa05"
-E 3 11
-A 8 "2147483647"
-E 3 12
-A 8 "2147483648"
-E 3 13
-A 8 "99999999999999999999999"
-E 3 14
-A 8 "-2147483648"
-E 3 15
-A 8 "-2147483649"
-E 3 16
-A 8 "-99999999999999999999999"
-E 3 17
-A 8 "000000000000000000000000012"
-E 3 18
+A appendString "0042"
+E get( 0
+A appendString "  9 apples"
+E get( 1
+A appendString "-"
+E get( 2
+A appendString " -7"
+E get( 3
+A appendString "12abc"
+E get( 4
+A appendString "abc"
+E get( 5
+A appendString "+5"
+E get( 6
+A appendString "\t\n\x0b\x0c\r8"
+E get( 7
+A appendString "+-3"
+E get( 8
+A appendString "- 3"
+E get( 9
+A appendString "3 4"
+E get( 10
+A appendString "\xa05"
+E get( 11
+A appendString "2147483647"
+E get( 12
+A appendString "2147483648"
+E get( 13
+A appendString "99999999999999999999999"
+E get( 14
+A appendString "-2147483648"
+E get( 15
+A appendString "-2147483649"
+E get( 16
+A appendString "-99999999999999999999999"
+E get( 17
+A appendString "000000000000000000000000012"
+E get( 18
 # Reads outside give nothing; a set past the end fills with empty elements, and so does
 # a set of 0; negative and unreachable indexes change nothing.
 new dims=1
-E 2 0
-E 4 0
-A 13 "a" 5
-E 16 "|"
-E 2 2
-E 3 -1
-A 14 0 7
-A 14 0 5
-A 13 "b" -1
-A 13 "b" 2147483647
-A 6 "b" 2147483647
-E 16 "|"
-E 0
+E get$( 0
+E key$( 0
+A setStringAt "a" 5
+E list$( "|"
+E get$( 2
+E get( -1
+A setValueAt 0 7
+A setValueAt 0 5
+A setStringAt "b" -1
+A setStringAt "b" 2147483647
+A insertStringAt "b" 2147483647
+E list$( "|"
+E size(
 # Inserts past the end fill too; deletes outside do nothing.
 new dims=1
-A 8 "a"
-A 7 7 2
-A 6 "x" 6
-A 6 "n" -1
-A 16 -1
-A 16 7
-E 16 "|"
+A appendString "a"
+A insertValueAt 7 2
+A insertStringAt "x" 6
+A insertStringAt "n" -1
+A deleteAt -1
+A deleteAt 7
+E list$( "|"
 # Clear keeps the settings; elements set again start keyless.
-A 27 2
-A 30 1 4
-A 57 ";:"
-A 21 3 1
-A 17
-E 27 1
-E 51
-A 13 "x" 1
-E 4 1
-E 5 1
+A setArrayDimension 2
+A setDimensionBoundary 1 4
+A setListDelimiter ";:"
+A setKeyValueAt 3 1
+A deleteAll
+E boundary( 1
+E delimiter$(
+A setStringAt "x" 1
+E key$( 1
+E key( 1

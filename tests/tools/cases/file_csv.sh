@@ -6,23 +6,23 @@ echo "== csv"
 printf 'a\n\nb,c,d\r\ne,f' >rows.csv
 run <<'QS'
 new x=2
-A 8 "name"
-A 8 "age"
-A 9 7
-A 2 "t.csv"
+A appendString "name"
+A appendString "age"
+A appendValue 7
+A saveToCsv "t.csv"
 new dims=1
-A 5 "t.csv"
-E 26
-E 28
-E 0
-E 2 2
-E 2 3
-A 5 "rows.csv"
-E 28
-E 0
-E 16 "|"
-A 12 "t.csv"
-E 28
-E 0
+A loadFromCsv "t.csv"
+E dim(
+E boundaryX(
+E size(
+E get$( 2
+E get$( 3
+A loadFromCsv "rows.csv"
+E boundaryX(
+E size(
+E list$( "|"
+A appendElementsFromCsv "t.csv"
+E boundaryX(
+E size(
 QS
 dump t.csv

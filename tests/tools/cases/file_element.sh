@@ -6,19 +6,19 @@ echo "== element files"
 : >empty.bin
 run <<'QS'
 new dims=1
-A 8 "abc"
-A 18 0 "e.bin"
-A 19 0 "e.bin"
-A 54 "e.bin"
-A 18 1 "copy.bin"
-A 53 "e.bin" 0
-E 0
-E 2 0
-E 14 "c" 0
-A 52 "empty.bin" 2
-E 16 ","
-A 18 2 "none.bin"
-A 18 3 "nope.bin"
+A appendString "abc"
+A saveElementToFile 0 "e.bin"
+A appendElementToFile 0 "e.bin"
+A appendFile "e.bin"
+A saveElementToFile 1 "copy.bin"
+A insertFileAt "e.bin" 0
+E size(
+E get$( 0
+E containsStr( "c" 0
+A setFileAt "empty.bin" 2
+E list$( ","
+A saveElementToFile 2 "none.bin"
+A saveElementToFile 3 "nope.bin"
 QS
 dump e.bin
 cmp e.bin copy.bin && echo "copy.bin equals e.bin"

@@ -6,20 +6,20 @@ echo "== ini"
 printf 'junk=1\r\n[S]\r\n// c\r\n  key = v \r\nflag\r\nx\r\nx=\r\n[Other] z\r\na=b=c\r\n' >in.ini
 run <<'QS'
 new dims=1
-A 8 "a"
-A 20 "k1" 0
-A 9 5
-A 58 "t.ini"
-A 59 "t.ini"
-E 0
-E 2 1
-E 4 0
-E 4 1
-A 59 "in.ini"
-E 0
-E 20 ":" "|"
-E 4 1
-A 60 "t.ini"
-E 0
+A appendString "a"
+A setKeyStringAt "k1" 0
+A appendValue 5
+A saveToIni "t.ini"
+A loadFromIni "t.ini"
+E size(
+E get$( 1
+E key$( 0
+E key$( 1
+A loadFromIni "in.ini"
+E size(
+E pairList$( ":" "|"
+E key$( 1
+A appendElementsFromIni "t.ini"
+E size(
 QS
 dump t.ini

@@ -5,22 +5,22 @@ run() { cat >s.qs; "$QUORREL" run s.qs; echo "status $?"; }
 echo "== native"
 run <<'QS'
 new x=3
-A 8 "ab"
-A 9 7
-A 20 "k" 1
-A 0 "ex.arr"
+A appendString "ab"
+A appendValue 7
+A setKeyStringAt "k" 1
+A saveToFile "ex.arr"
 new dims=1
-A 3 "ex.arr"
-E 26
-E 28
-E 0
-E 2 0
-E 3 1
-E 4 1
-E 4 0
-A 10 "ex.arr"
-E 0
-E 2 2
-E 4 3
+A loadFromFile "ex.arr"
+E dim(
+E boundaryX(
+E size(
+E get$( 0
+E get( 1
+E key$( 1
+E key$( 0
+A appendElementsFromFile "ex.arr"
+E size(
+E get$( 2
+E key$( 3
 QS
 dump ex.arr

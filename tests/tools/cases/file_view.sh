@@ -11,21 +11,21 @@ q() { "$QUORREL" "$@"; echo "status $?"; }
 } >make.qs
 cat >>make.qs <<'QS'
 new dims=1
-A 8 "alpha"
-A 9 -3
-A 9 0
-A 8 " padded "
-A 8 "tab\there"
-A 20 "k1" 0
-A 21 9 1
-A 0 "list.arr"
+A appendString "alpha"
+A appendValue -3
+A appendValue 0
+A appendString " padded "
+A appendString "tab\there"
+A setKeyStringAt "k1" 0
+A setKeyValueAt 9 1
+A saveToFile "list.arr"
 new x=3
-A 8 "ann"
-A 8 "120"
-A 9 3
-A 8 "bob"
-A 8 "95"
-A 0 "part.arr"
+A appendString "ann"
+A appendString "120"
+A appendValue 3
+A appendString "bob"
+A appendString "95"
+A saveToFile "part.arr"
 QS
 q run make.qs
 q inspect list.arr

@@ -1,6 +1,6 @@
 # Expressions called by the names the editor shows.
 new x=3 autoselect=1
-A 34 "a,b,7"
+A appendRowFromList "a,b,7"
 E size(
 E rowList$( 0
 E getFromColumnRow( 2 0

@@ -10,7 +10,7 @@ cat >named.qs <<'QS'
 new x=2 autoselect=1
 A setLabel "qty" 1
 A appendRowFromList "ann,120"
-A 34 "bob,109"
+A appendRowFromList "bob,109"
 E numberOfRows(
   E labSum( "qty"
 A saveToCsv "no-such-folder/t.csv"

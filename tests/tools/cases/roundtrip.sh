@@ -4,17 +4,17 @@
 q() { "$QUORREL" "$@"; echo "status $?"; }
 cat >make.qs <<'QS'
 new x=3
-A 8 "ann"
-A 8 "120"
-A 9 3
-A 8 "bob"
-A 8 "95"
-A 9 2
-A 48 "name" 0
-A 48 "score" 1
-A 48 "level" 2
-A 20 "top" 0
-A 0 "scores.arr"
+A appendString "ann"
+A appendString "120"
+A appendValue 3
+A appendString "bob"
+A appendString "95"
+A appendValue 2
+A setLabel "name" 0
+A setLabel "score" 1
+A setLabel "level" 2
+A setKeyStringAt "top" 0
+A saveToFile "scores.arr"
 QS
 q run make.qs
 q inspect scores.arr

@@ -1,86 +1,86 @@
 # Row sorts by column and by label; keys travel with their cells.
 new x=2 autoselect=1
-A 34 "b,2"
-A 34 "a,3"
-A 34 "c,1"
-A 20 "key-a" 2
-A 42 0
-E 46 1
-E 4 0
-A 40 1
-E 46 0
-A 41 1
-E 46 0
-A 43 0
-E 46 0
-A 48 "letter" 0
-A 48 "num" 1
-A 45 "num"
-E 46 0
-A 47 "LETTER"
-E 46 0
-A 46 "letter"
-E 46 0
-A 44 "num"
-E 46 0
-A 44 "missing"
-A 42 2
-E 46 0
+A appendRowFromList "b,2"
+A appendRowFromList "a,3"
+A appendRowFromList "c,1"
+A setKeyStringAt "key-a" 2
+A sortRowsByColumnStringAscending 0
+E columnList$( 1
+E key$( 0
+A sortRowsByColumnValueAscending 1
+E columnList$( 0
+A sortRowsByColumnValueDescending 1
+E columnList$( 0
+A sortRowsByColumnStringDescending 0
+E columnList$( 0
+A setLabel "letter" 0
+A setLabel "num" 1
+A sortRowsByLabelValueDescending "num"
+E columnList$( 0
+A sortRowsByLabelStringDescending "LETTER"
+E columnList$( 0
+A sortRowsByLabelStringAscending "letter"
+E columnList$( 0
+A sortRowsByLabelValueAscending "num"
+E columnList$( 0
+A sortRowsByLabelValueAscending "missing"
+A sortRowsByColumnStringAscending 2
+E columnList$( 0
 # Text order of values: 10 before 9; value order: 9 before 10.
 new x=1 autoselect=1
-A 34 "10"
-A 34 "9"
-A 42 0
-E 46 0
-A 40 0
-E 46 0
+A appendRowFromList "10"
+A appendRowFromList "9"
+A sortRowsByColumnStringAscending 0
+E columnList$( 0
+A sortRowsByColumnValueAscending 0
+E columnList$( 0
 # Ties end in the order the first-row-pivot partition steps give them (worked by hand).
 new x=2 autoselect=1
-A 34 "2,A"
-A 34 "1,B"
-A 34 "2,C"
-A 34 "1,D"
-A 40 0
-E 46 1
+A appendRowFromList "2,A"
+A appendRowFromList "1,B"
+A appendRowFromList "2,C"
+A appendRowFromList "1,D"
+A sortRowsByColumnValueAscending 0
+E columnList$( 1
 new x=1 autoselect=1
-A 34 "b"
-A 34 "A"
-A 34 "a"
-A 42 0
-E 46 0
-A 51
-A 42 0
-E 46 0
+A appendRowFromList "b"
+A appendRowFromList "A"
+A appendRowFromList "a"
+A sortRowsByColumnStringAscending 0
+E columnList$( 0
+A caseSensitive
+A sortRowsByColumnStringAscending 0
+E columnList$( 0
 # Three equal keys already in order: the run is reversed end to end.
 new x=2 autoselect=1
-A 34 "5,p"
-A 34 "5,q"
-A 34 "5,r"
-A 34 "6,s"
-A 40 0
-E 46 1
+A appendRowFromList "5,p"
+A appendRowFromList "5,q"
+A appendRowFromList "5,r"
+A appendRowFromList "6,s"
+A sortRowsByColumnValueAscending 0
+E columnList$( 1
 # With two rows visible, table rows 0 and 1 are sorted, whichever rows are selected,
 # and the states stay where they were.
 new x=1 autoselect=1
-A 34 "4"
-A 34 "3"
-A 34 "2"
-A 34 "1"
-A 78
-A 67 0 2
-A 67 0 1
-A 40 0
-E 16 "|"
-E 46 0
+A appendRowFromList "4"
+A appendRowFromList "3"
+A appendRowFromList "2"
+A appendRowFromList "1"
+A startNewWhere
+A selectWhereEqualByColumn 0 2
+A selectWhereEqualByColumn 0 1
+A sortRowsByColumnValueAscending 0
+E list$( "|"
+E columnList$( 0
 # Columns outside the table, and a one-dimensional array, change nothing.
 new x=2 autoselect=1
-A 34 "b,2"
-A 34 "a,1"
-A 42 2
-A 42 -1
-E 16 "|"
+A appendRowFromList "b,2"
+A appendRowFromList "a,1"
+A sortRowsByColumnStringAscending 2
+A sortRowsByColumnStringAscending -1
+E list$( "|"
 new dims=1
-A 9 2
-A 9 1
-A 40 0
-E 16 "|"
+A appendValue 2
+A appendValue 1
+A sortRowsByColumnValueAscending 0
+E list$( "|"

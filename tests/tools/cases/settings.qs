@@ -1,64 +1,64 @@
 # The setup record fields of new, and the instance made before any new.
-E 26
-E 28
+E dim(
+E boundaryX(
 new dims=3 x=4 y=5
-E 26
-E 28
-E 29
+E dim(
+E boundaryX(
+E boundaryY(
 new dims=7
-E 26
+E dim(
 new dims=2 x=0
-E 28
+E boundaryX(
 new x=-5
-E 28
+E boundaryX(
 new case=7
-A 8 "Abc"
-E 12 "abc" 0
+A appendString "Abc"
+E findStr( "abc" 0
 new case=0
-A 8 "Abc"
-E 12 "abc" 0
+A appendString "Abc"
+E findStr( "abc" 0
 new wildcard=1
-A 8 "abc"
-E 12 "a*" 0
+A appendString "abc"
+E findStr( "a*" 0
 new autoselect=2 x=2
-A 34 "a,b"
-E 40
+A appendRowFromList "a,b"
+E numberOfRows(
 new autoselect=1 x=2
-A 34 "a,b"
-E 40
+A appendRowFromList "a,b"
+E numberOfRows(
 new delimiter=";"
-E 51
+E delimiter$(
 new delimiter=""
-E 51
+E delimiter$(
 new delimiter="ab"
-E 38 "3a2"
+E indexOfDimIndex( "3a2"
 # Counts other than 2 and 3 make a one-dimensional array, whatever the boundaries say.
 new dims=0 y=6
-E 26
-E 28
-E 29
+E dim(
+E boundaryX(
+E boundaryY(
 new dims=4
-E 26
+E dim(
 new dims=-1
-E 26
+E dim(
 new dims=1
-E 26
+E dim(
 # The last dimension has no boundary.
 new x=6 y=9
-E 28
-E 29
+E boundaryX(
+E boundaryY(
 new dims=3 x=4 y=5
-E 27 2
+E boundary( 2
 new dims=3 x=-2 y=0
-E 28
-E 29
+E boundaryX(
+E boundaryY(
 # Any nonzero mode turns it on.
 new wildcard=-3
-A 8 "Abc"
-E 12 "a*" 0
+A appendString "Abc"
+E findStr( "a*" 0
 new
-A 8 "Abc"
-E 12 "a*" 0
+A appendString "Abc"
+E findStr( "a*" 0
 new case=7
-A 8 "Abc"
-E 12 "Abc" 0
+A appendString "Abc"
+E findStr( "Abc" 0
