@@ -38,10 +38,13 @@ set_target_properties(quorrel_module PROPERTIES
 target_sources(quorrel_module PRIVATE ${quorrel_def})
 target_link_options(quorrel_module PRIVATE "LINKER:--kill-at")
 
-# The resource script (menus, string tables, the setup dialog, bitmaps, data), with
-# the pictures it names as dependencies.
-set(quorrel_rc ${CMAKE_SOURCE_DIR}/resources/quorrel.rc)
+# The resource script (menus, string tables, the setup dialog, bitmaps, data) written
+# from resources/quorrel.rc and the table (cmake/ModuleResources.cmake); the resource
+# compiler finds the pictures it names in resources/.
+set(quorrel_rc ${CMAKE_BINARY_DIR}/generated/quorrel.rc)
 target_sources(quorrel_module PRIVATE ${quorrel_rc})
+add_dependencies(quorrel_module quorrel_resource_script)
+target_include_directories(quorrel_module PRIVATE ${CMAKE_SOURCE_DIR}/resources)
 file(GLOB quorrel_rc_inputs CONFIGURE_DEPENDS ${CMAKE_SOURCE_DIR}/resources/*.bmp)
 set_property(SOURCE ${quorrel_rc} TARGET_DIRECTORY quorrel_module APPEND PROPERTY
   OBJECT_DEPENDS ${quorrel_rc_inputs})

@@ -1,37 +1,29 @@
-// Builds the help page from the data the extension itself uses: the menu trees and
-// strings as the editor receives them (printed by `quorrel menu` and `quorrel strings`),
-// the parameters of each row of host/table.inc, and the prose of descriptions.txt. It
-// refuses to build a page that misses a code or describes one that does not exist, so
-// the page can never drift from the module.
+// Builds the help page from what the extension itself gives: the menu trees and display
+// strings as the editor receives them from the module (through the host simulator), the
+// parameters of each row of host/table.inc and the prose of descriptions.txt (both
+// through the quorrel command's catalog). It refuses to build a page that misses a row
+// or describes one that does not exist, so the page can never drift from the module.
 #include <cstdint>
-#include <cstdio>
 #include <fstream>
-#include <initializer_list>
 #include <iostream>
 #include <map>
 #include <memory>
-#include <optional>
 #include <sstream>
 #include <string>
 #include <vector>
 
+#include "hostsim/host_simulator.h"
+#include "quorrel/catalog.h"
+
 namespace {
 
-struct Description {
-  std::vector<std::string> prose;
-  std::string bad;
-};
+using quorrel::tool::Description;
 
 struct MenuNode {
   int depth = 0;
   enum Kind { Command, Submenu, Separator } kind = Command;
   int id = 0;
   std::string text;
-};
-
-struct CodeStrings {
-  std::string display;  // display string or expression name
-  std::string title;
 };
 
 [[noreturn]] void fail(const std::string& message) {
@@ -47,146 +39,25 @@ std::string readFile(const std::string& path) {
   return out.str();
 }
 
-std::vector<std::string> lines(const std::string& text) {
-  std::vector<std::string> result;
-  std::istringstream in(text);
-  for (std::string line; std::getline(in, line);) {
-    if (!line.empty() && line.back() == '\r') line.pop_back();
-    result.push_back(line);
-  }
-  return result;
-}
-
-// Reads one quoted string of the quorrel command's output, undoing its escapes.
-std::optional<std::string> parseQuoted(const std::string& line, std::size_t& pos) {
-  if (pos >= line.size() || line[pos] != '"') return std::nullopt;
-  std::string out;
-  for (++pos; pos < line.size(); ++pos) {
-    char c = line[pos];
-    if (c == '"') {
-      ++pos;
-      return out;
-    }
-    if (c != '\\' || pos + 1 >= line.size()) {
-      out += c;
-      continue;
-    }
-    char e = line[++pos];
-    if (e == 'n')
-      out += '\n';
-    else if (e == 'r')
-      out += '\r';
-    else if (e == 't')
-      out += '\t';
-    else if (e == 'x' && pos + 2 < line.size()) {
-      out += static_cast<char>(std::stoi(line.substr(pos + 1, 2), nullptr, 16));
-      pos += 2;
+// The module's menu tree as a list of nodes in menu order, each with its depth.
+void flatten(const std::vector<quorrel::hostsim::MenuItem>& items, int depth,
+             std::vector<MenuNode>& nodes) {
+  for (const auto& item : items) {
+    if (item.popup) {
+      nodes.push_back({depth, MenuNode::Submenu, 0, item.text});
+      flatten(item.items, depth + 1, nodes);
     } else {
-      out += e;
+      nodes.push_back({depth, item.id == 0 ? MenuNode::Separator : MenuNode::Command,
+                       static_cast<int>(item.id), item.text});
     }
   }
-  return std::nullopt;
 }
 
-std::vector<MenuNode> parseMenu(const std::string& path) {
-  std::vector<MenuNode> nodes;
-  for (const std::string& line : lines(readFile(path))) {
-    if (line.empty()) continue;
-    std::size_t indent = line.find_first_not_of(' ');
-    MenuNode node;
-    node.depth = static_cast<int>(indent / 2);
-    std::size_t pos = indent;
-    if (line[pos] == '-') {
-      node.kind = MenuNode::Separator;
-    } else if (line[pos] == '"') {
-      node.kind = MenuNode::Submenu;
-      auto text = parseQuoted(line, pos);
-      if (!text) fail("bad menu line in " + path + ": " + line);
-      node.text = *text;
-    } else {
-      node.kind = MenuNode::Command;
-      std::size_t space = line.find(' ', pos);
-      if (space == std::string::npos) fail("bad menu line in " + path + ": " + line);
-      node.id = std::stoi(line.substr(pos, space - pos));
-      pos = space + 1;
-      auto text = parseQuoted(line, pos);
-      if (!text) fail("bad menu line in " + path + ": " + line);
-      node.text = *text;
-    }
-    nodes.push_back(node);
-  }
-  return nodes;
+std::map<std::string, Description, std::less<>> readDescriptions(const std::string& path) {
+  quorrel::tool::Prose prose = quorrel::tool::readProse(readFile(path));
+  if (!prose.problems.empty()) fail(path + ":" + prose.problems.front());
+  return std::move(prose.blocks);
 }
-
-std::map<int, CodeStrings> parseStrings(const std::string& path) {
-  std::map<int, CodeStrings> result;
-  for (const std::string& line : lines(readFile(path))) {
-    if (line.empty()) continue;
-    std::size_t space = line.find(' ');
-    if (space == std::string::npos) fail("bad strings line in " + path + ": " + line);
-    int code = std::stoi(line.substr(0, space));
-    std::size_t pos = space + 1;
-    auto display = parseQuoted(line, pos);
-    ++pos;
-    auto title = parseQuoted(line, pos);
-    if (!display || !title) fail("bad strings line in " + path + ": " + line);
-    result[code] = {*display, *title};
-  }
-  return result;
-}
-
-// "== A6" / "== E12" blocks; see the head of descriptions.txt.
-std::map<std::string, Description> parseDescriptions(const std::string& path) {
-  std::map<std::string, Description> result;
-  Description* current = nullptr;
-  int number = 0;
-  for (const std::string& line : lines(readFile(path))) {
-    ++number;
-    if (line.empty() || line[0] == '#') continue;
-    if (line.rfind("== ", 0) == 0) {
-      std::string key = line.substr(3);
-      if (result.count(key)) fail(path + ":" + std::to_string(number) + ": " + key + " twice");
-      current = &result[key];
-    } else if (current == nullptr) {
-      fail(path + ":" + std::to_string(number) + ": text before the first block");
-    } else if (line.rfind("param:", 0) == 0) {
-      fail(path + ":" + std::to_string(number) + ": parameters are described in host/table.inc");
-    } else if (line.rfind("bad: ", 0) == 0) {
-      current->bad = line.substr(5);
-    } else {
-      current->prose.push_back(line);
-    }
-  }
-  return result;
-}
-
-// A parameter as the page names it: its type, then what it is.
-struct Param {
-  const char* type;
-  const char* meaning;
-};
-using Params = std::vector<std::vector<Param>>;  // per code
-
-// The host's names of the types: an action takes numbers, an expression integers.
-std::vector<Param> params(const char* numberName, std::initializer_list<Param> declared) {
-  std::vector<Param> result;
-  for (Param p : declared) {
-    if (std::string(p.type) == "Number") result.push_back({numberName, p.meaning});
-    if (std::string(p.type) == "Text") result.push_back({"text", p.meaning});
-  }
-  return result;
-}
-
-const Params kActionParams = {
-#define ACTION(code, name, param1, param2, file, meaning1, meaning2) \
-  params("number", {{#param1, meaning1}, {#param2, meaning2}}),
-#include "host/table.inc"
-};
-const Params kExpressionParams = {
-#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2) \
-  params("integer", {{#param1, meaning1}, {#param2, meaning2}}),
-#include "host/table.inc"
-};
 
 std::string escape(const std::string& text) {
   std::string out;
@@ -223,9 +94,21 @@ struct Generated {
   std::string toc;
 };
 
-Generated render(const Kind& kind, const std::vector<MenuNode>& menu,
-                 const std::map<int, CodeStrings>& strings, const Params& params,
-                 const std::map<std::string, Description>& descriptions) {
+using Descriptions = std::map<std::string, Description, std::less<>>;
+
+// One line per paragraph.
+std::vector<std::string> paragraphs(const std::string& prose) {
+  std::vector<std::string> result;
+  std::istringstream in(prose);
+  for (std::string line; std::getline(in, line);) result.push_back(line);
+  return result;
+}
+
+Generated render(const Kind& kind, const quorrel::hostsim::Module& module,
+                 const Descriptions& descriptions) {
+  const bool action = kind.letter == 'A';
+  std::vector<MenuNode> menu;
+  flatten(module.menu(action ? "actions" : "expressions"), 0, menu);
   Generated out;
   std::vector<std::string> path;
   std::vector<bool> seen(static_cast<std::size_t>(kind.count), false);
@@ -251,28 +134,30 @@ Generated render(const Kind& kind, const std::vector<MenuNode>& menu,
       out.body += "<h4 class=\"menu\" id=\"" + id + "\">" + escape(group) + "</h4>\n";
       out.toc += "<li><a href=\"#" + id + "\">" + escape(group) + "</a></li>\n";
     }
-    std::string key = std::string(1, kind.letter) + std::to_string(code);
-    auto found = descriptions.find(key);
-    if (found == descriptions.end()) fail("no description for " + key);
+    const std::string name = quorrel::tool::rowName(action, code);
+    const auto found = descriptions.find(name);
+    if (found == descriptions.end()) fail("no description for " + name);
     const Description& d = found->second;
-    const std::vector<Param>& declared = params[static_cast<std::size_t>(code)];
-    auto s = strings.find(code);
-    if (s == strings.end()) fail("no display string for " + key);
+    const std::string display = action ? module.actionString(code) : module.expressionString(code);
+    if (display.empty()) fail("no display string for " + name);
     out.body +=
         "<div class=\"entry\" id=\"" + std::string(kind.anchor) + std::to_string(code) + "\">\n";
     out.body += "<h5>" + escape(node.text) + "</h5>\n";
     out.body += "<div class=\"meta\">" + std::string(kind.letter == 'A' ? "Action" : "Expression") +
                 " " + std::to_string(code) + " · menu: " + escape(group) + " › " +
                 escape(node.text) + " · " + (kind.letter == 'A' ? "display string " : "name ") +
-                "<code>" + escape(s->second.display) + "</code></div>\n";
+                "<code>" + escape(display) + "</code></div>\n";
+    const auto declared = quorrel::tool::parameters(action, code);
     if (!declared.empty()) {
       out.body += "<ol class=\"params\">\n";
-      for (const Param& p : declared) {
-        out.body += "<li><i>" + std::string(p.type) + "</i>: " + escape(p.meaning) + "</li>\n";
+      for (const auto& p : declared) {
+        // The host's names of the types: an action takes numbers, an expression integers.
+        const char* type = p.isText ? "text" : action ? "number" : "integer";
+        out.body += "<li><i>" + std::string(type) + "</i>: " + escape(p.meaning) + "</li>\n";
       }
       out.body += "</ol>\n";
     }
-    for (const std::string& p : d.prose) out.body += "<p>" + escape(p) + "</p>\n";
+    for (const std::string& p : paragraphs(d.prose)) out.body += "<p>" + escape(p) + "</p>\n";
     if (!d.bad.empty()) out.body += "<p class=\"bad\">Bad input: " + escape(d.bad) + "</p>\n";
     out.body += "</div>\n";
   }
@@ -283,23 +168,6 @@ Generated render(const Kind& kind, const std::vector<MenuNode>& menu,
     }
   }
   return out;
-}
-
-void checkNoStrayDescriptions(const std::map<std::string, Description>& descriptions, int actions,
-                              int expressions) {
-  for (const auto& [key, unused] : descriptions) {
-    char letter = key.empty() ? '?' : key[0];
-    int limit = letter == 'A' ? actions : letter == 'E' ? expressions : -1;
-    int code = -1;
-    try {
-      std::size_t used = 0;
-      code = std::stoi(key.substr(1), &used);
-      if (used != key.size() - 1) code = -1;
-    } catch (...) {
-      code = -1;
-    }
-    if (limit < 0 || code < 0 || code >= limit) fail("description " + key + " names no code");
-  }
 }
 
 void replace(std::string& text, const std::string& placeholder, const std::string& value) {
@@ -331,29 +199,28 @@ void checkLinks(const std::string& page) {
 int main(int argc, char** argv) {
   std::map<std::string, std::string> args;
   for (int i = 1; i + 1 < argc; i += 2) args[argv[i]] = argv[i + 1];
-  for (const char* required :
-       {"--descriptions", "--template", "--out", "--menu-actions", "--menu-expressions",
-        "--strings-actions", "--strings-expressions"}) {
+  for (const char* required : {"--module", "--descriptions", "--template", "--out"}) {
     if (!args.count(required)) fail(std::string("missing ") + required);
   }
-  const int kActions = static_cast<int>(kActionParams.size());
-  const int kExpressions = static_cast<int>(kExpressionParams.size());
-  auto descriptions = parseDescriptions(args["--descriptions"]);
-  checkNoStrayDescriptions(descriptions, kActions, kExpressions);
-  Generated actions = render({'A', "a", 25000, kActions}, parseMenu(args["--menu-actions"]),
-                             parseStrings(args["--strings-actions"]), kActionParams, descriptions);
-  Generated expressions =
-      render({'E', "e", 27000, kExpressions}, parseMenu(args["--menu-expressions"]),
-             parseStrings(args["--strings-expressions"]), kExpressionParams, descriptions);
-  std::string page = readFile(args["--template"]);
-  replace(page, "@@VERSION@@", args.count("--version") ? args["--version"] : "");
-  replace(page, "@@TOC_ACTIONS@@", actions.toc);
-  replace(page, "@@TOC_EXPRESSIONS@@", expressions.toc);
-  replace(page, "@@ACTIONS@@", actions.body);
-  replace(page, "@@EXPRESSIONS@@", expressions.body);
-  checkLinks(page);
-  std::ofstream out(args["--out"], std::ios::binary);
-  out << page;
-  if (!out) fail("cannot write " + args["--out"]);
+  try {
+    const auto module = quorrel::hostsim::Module::open(args["--module"]);
+    const Descriptions descriptions = readDescriptions(args["--descriptions"]);
+    const Generated actions =
+        render({'A', "a", 25000, quorrel::abi::kActionCount}, *module, descriptions);
+    const Generated expressions =
+        render({'E', "e", 27000, quorrel::abi::kExpressionCount}, *module, descriptions);
+    std::string page = readFile(args["--template"]);
+    replace(page, "@@VERSION@@", args.count("--version") ? args["--version"] : "");
+    replace(page, "@@TOC_ACTIONS@@", actions.toc);
+    replace(page, "@@TOC_EXPRESSIONS@@", expressions.toc);
+    replace(page, "@@ACTIONS@@", actions.body);
+    replace(page, "@@EXPRESSIONS@@", expressions.body);
+    checkLinks(page);
+    std::ofstream out(args["--out"], std::ios::binary);
+    out << page;
+    if (!out) fail("cannot write " + args["--out"]);
+  } catch (const std::exception& error) {
+    fail(error.what());
+  }
   return 0;
 }

@@ -23,7 +23,7 @@ endforeach()
 if(NOT WIN32 AND NOT APPLE)
   set(quorrel_version_script ${CMAKE_CURRENT_BINARY_DIR}/quorrel.map)
   set(quorrel_map_text "{\n  global:\n")
-  # Plus the portable platform services, when resources.cmake lists them.
+  # Plus the portable platform services, when cmake/ModuleResources.cmake lists them.
   foreach(name IN LISTS QUORREL_ENTRY_POINT_NAMES QUORREL_PLATFORM_EXPORTS)
     string(APPEND quorrel_map_text "    ${name};\n")
   endforeach()

@@ -7,13 +7,13 @@
 #include "host/routine_support.h"
 
 namespace quorrel::host::act {
-#define ACTION(code, name, param1, param2, file, meaning1, meaning2) \
+#define ACTION(code, name, param1, param2, file, menuText, display, meaning1, meaning2) \
   Signature<ActionAnswer<FileUse::file>, Instance, Param::param1, Param::param2>::Type name;
 #include "host/table.inc"
 }  // namespace quorrel::host::act
 
 namespace quorrel::host::expr {
-#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2) \
+#define EXPRESSION(code, name, routine, param1, param2, menuText, meaning1, meaning2) \
   Signature<Result, ElementArray&, Param::param1, Param::param2>::Type routine;
 #include "host/table.inc"
 }  // namespace quorrel::host::expr

@@ -28,15 +28,15 @@ struct Row {
 };
 
 constexpr Row<abi::ActionRoutine> kActionRows[] = {
-#define ACTION(code, name, param1, param2, file, meaning1, meaning2)     \
-  {code, actionParamType(Param::param1), actionParamType(Param::param2), \
+#define ACTION(code, name, param1, param2, file, menuText, display, meaning1, meaning2) \
+  {code, actionParamType(Param::param1), actionParamType(Param::param2),                \
    &callAction<&act::name, Param::param1, Param::param2>},
 #include "host/table.inc"
 };
 
 constexpr Row<abi::ExpressionRoutine> kExpressionRows[] = {
-#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2)      \
-  {code, expressionParamType(Param::param1), expressionParamType(Param::param2), \
+#define EXPRESSION(code, name, routine, param1, param2, menuText, meaning1, meaning2) \
+  {code, expressionParamType(Param::param1), expressionParamType(Param::param2),      \
    &callExpression<&expr::routine, Param::param1, Param::param2>},
 #include "host/table.inc"
 };
@@ -46,10 +46,10 @@ constexpr Row<abi::ExpressionRoutine> kExpressionRows[] = {
 constexpr bool described(Param param, const char* meaning) {
   return (param == Param::None) == (meaning[0] == '\0');
 }
-#define ACTION(code, name, param1, param2, file, meaning1, meaning2)                      \
+#define ACTION(code, name, param1, param2, file, menuText, display, meaning1, meaning2)   \
   static_assert(described(Param::param1, meaning1) && described(Param::param2, meaning2), \
                 "action " #code ": a parameter without its meaning, or the other way round");
-#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2)               \
+#define EXPRESSION(code, name, routine, param1, param2, menuText, meaning1, meaning2)     \
   static_assert(described(Param::param1, meaning1) && described(Param::param2, meaning2), \
                 "expression " #code ": a parameter without its meaning, or the other way round");
 #include "host/table.inc"

@@ -1,6 +1,6 @@
 // The module's resources as constant tables, for the builds that have no Windows
-// resource loader. The tables are generated from resources/quorrel.rc at build time
-// (src/platform/rcgen); nothing here is written by hand.
+// resource loader. The tables are generated from the resource script at build time
+// (tools/rcgen); nothing here is written by hand.
 #pragma once
 
 #include <cstddef>

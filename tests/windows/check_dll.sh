@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # Reads the built Windows DLL back with binutils and checks it against its sources:
-#   check_dll.sh DLL ENTRY_POINTS_TXT RESOURCE_SCRIPT OBJDUMP WINDRES
+#   check_dll.sh DLL ENTRY_POINTS_TXT RESOURCE_SCRIPT RESOURCE_DIR OBJDUMP WINDRES
+# (RESOURCE_DIR holds the pictures the script names)
 # - a 32-bit x86 DLL (PE32) named quorrel.dll;
 # - exports: exactly the entry points of entry_points.txt, each by its plain name at its
 #   ordinal, none by ordinal alone, names in byte order (GetProcAddress bisects them);
@@ -8,7 +9,7 @@
 # - resources: what windres reads out of the DLL is what it reads out of the script.
 # Exits 77 (skipped) when binutils for mingw-w64 are not installed.
 set -uo pipefail
-dll=$1 entry_points=$2 script=$3 objdump=$4 windres=$5
+dll=$1 entry_points=$2 script=$3 resource_dir=$4 objdump=$5 windres=$6
 for tool in "$objdump" "$windres"; do
   if ! command -v "$tool" >/dev/null; then
     echo "skipped: $tool is not installed (binutils-mingw-w64-i686)"
@@ -68,7 +69,7 @@ normalise() {
     -e 's/\b10 \/\* RT_RCDATA \*\//RCDATA/'
 }
 "$windres" -i "$dll" -O rc | normalise >"$work/dll.rc" || fail=1
-(cd "$(dirname "$script")" && "$windres" -i "$(basename "$script")" -O rc) | normalise \
+"$windres" -I "$resource_dir" -i "$script" -O rc | normalise \
   >"$work/script.rc" || fail=1
 check "resources equal the script's" diff -u "$work/script.rc" "$work/dll.rc"
 check "resources read back" test "$(wc -l <"$work/dll.rc")" -gt 500

@@ -15,36 +15,61 @@ constexpr int pathParamOf(std::string_view param1) {
 }
 
 const ActionEntry kActions[abi::kActionCount] = {
-#define ACTION(code, name, param1, param2, file, meaning1, meaning2) \
+#define ACTION(code, name, param1, param2, file, menuText, display, meaning1, meaning2) \
   {#name, FileUse::file, pathParamOf(#param1)},
 #include "host/table.inc"
 };
 
-// What each parameter is, by code; empty past the last one.
-struct Meanings {
-  const char* param[2];
-};
-const Meanings kActionMeanings[abi::kActionCount] = {
-#define ACTION(code, name, param1, param2, file, meaning1, meaning2) {{meaning1, meaning2}},
-#include "host/table.inc"
-};
-const Meanings kExpressionMeanings[abi::kExpressionCount] = {
-#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2) {{meaning1, meaning2}},
+const char* const kExpressionNames[abi::kExpressionCount] = {
+#define EXPRESSION(code, name, routine, param1, param2, menuText, meaning1, meaning2) name,
 #include "host/table.inc"
 };
 
-// The text after a "name:" prefix, blanks before it skipped.
-std::string afterPrefix(std::string_view line, size_t prefix) {
-  line.remove_prefix(prefix);
-  const size_t start = line.find_first_not_of(' ');
-  return std::string(start == std::string_view::npos ? std::string_view{} : line.substr(start));
+// Each row's two parameter slots; a slot of type None is not a parameter.
+struct Slots {
+  const char* type[2];
+  const char* meaning[2];
+};
+const Slots kActionSlots[abi::kActionCount] = {
+#define ACTION(code, name, param1, param2, file, menuText, display, meaning1, meaning2) \
+  {{#param1, #param2}, {meaning1, meaning2}},
+#include "host/table.inc"
+};
+const Slots kExpressionSlots[abi::kExpressionCount] = {
+#define EXPRESSION(code, name, routine, param1, param2, menuText, meaning1, meaning2) \
+  {{#param1, #param2}, {meaning1, meaning2}},
+#include "host/table.inc"
+};
+
+bool validCode(bool action, int32_t code) {
+  return code >= 0 && code < (action ? abi::kActionCount : abi::kExpressionCount);
 }
 
 std::string_view nextLine(std::string_view& text) {
   const size_t end = text.find('\n');
-  const std::string_view line = text.substr(0, end);
+  std::string_view line = text.substr(0, end);
   text = end == std::string_view::npos ? std::string_view{} : text.substr(end + 1);
+  if (!line.empty() && line.back() == '\r') line.remove_suffix(1);
   return line;
+}
+
+// Whether `name` is a row's name, of either kind.
+bool isRowName(std::string_view name) {
+  for (bool action : {true, false}) {
+    for (int32_t code = 0; validCode(action, code); ++code) {
+      if (name == rowName(action, code)) return true;
+    }
+  }
+  return false;
+}
+
+void addLine(Description& block, std::string_view line) {
+  if (line.substr(0, 5) == "bad: ") {
+    block.bad = line.substr(5);
+  } else {
+    if (!block.prose.empty()) block.prose += '\n';
+    block.prose += line;
+  }
 }
 
 }  // namespace
@@ -60,26 +85,60 @@ std::optional<int32_t> actionCodeOfName(std::string_view name) {
   return std::nullopt;
 }
 
-std::optional<Description> describe(bool action, int32_t code) {
-  if (code < 0 || code >= (action ? abi::kActionCount : abi::kExpressionCount)) return std::nullopt;
-  const std::string header = (action ? "== A" : "== E") + std::to_string(code);
-  std::string_view text = kDescriptionsText;
-  while (!text.empty() && nextLine(text) != header) {
-  }
-  if (text.empty()) return std::nullopt;
-  Description description;
-  const Meanings& meanings = action ? kActionMeanings[code] : kExpressionMeanings[code];
-  for (const char* meaning : meanings.param) {
-    if (*meaning != '\0') description.params.emplace_back(meaning);
-  }
-  while (!text.empty() && text.substr(0, 3) != "== ") {
-    const std::string_view line = nextLine(text);
-    if (line.substr(0, 4) == "bad:") {
-      description.bad = afterPrefix(line, 4);
-    } else if (!line.empty()) {
-      if (!description.prose.empty()) description.prose += '\n';
-      description.prose += line;
+const char* rowName(bool action, int32_t code) {
+  return action ? kActions[code].name : kExpressionNames[code];
+}
+
+std::vector<Parameter> parameters(bool action, int32_t code) {
+  const Slots& slots = action ? kActionSlots[code] : kExpressionSlots[code];
+  std::vector<Parameter> declared;
+  for (int i = 0; i < 2; ++i) {
+    if (std::string_view(slots.type[i]) != "None") {
+      declared.push_back({std::string_view(slots.type[i]) == "Text", slots.meaning[i]});
     }
+  }
+  return declared;
+}
+
+Prose readProse(std::string_view text) {
+  Prose prose;
+  Description* block = nullptr;
+  for (int number = 1; !text.empty(); ++number) {
+    const std::string_view line = nextLine(text);
+    const std::string where = std::to_string(number) + ": ";
+    if (line.empty() || line.front() == '#') continue;
+    if (line.substr(0, 3) == "== ") {
+      const std::string_view name = line.substr(3);
+      if (!isRowName(name)) prose.problems.push_back(where + std::string(name) + " names no row");
+      const auto [at, added] = prose.blocks.try_emplace(std::string(name));
+      if (!added) prose.problems.push_back(where + std::string(name) + " twice");
+      block = &at->second;
+    } else if (block == nullptr) {
+      prose.problems.push_back(where + "text before the first block");
+    } else if (line.substr(0, 6) == "param:") {
+      prose.problems.push_back(where + "parameters are described in host/table.inc");
+    } else {
+      addLine(*block, line);
+    }
+  }
+  for (bool action : {true, false}) {
+    for (int32_t code = 0; validCode(action, code); ++code) {
+      if (!prose.blocks.count(rowName(action, code))) {
+        prose.problems.push_back(std::string("no description for ") + rowName(action, code));
+      }
+    }
+  }
+  return prose;
+}
+
+std::optional<Description> describe(bool action, int32_t code) {
+  if (!validCode(action, code)) return std::nullopt;
+  static const Prose prose = readProse(kDescriptionsText);
+  const auto found = prose.blocks.find(rowName(action, code));
+  if (found == prose.blocks.end()) return std::nullopt;
+  Description description = found->second;
+  for (const Parameter& parameter : parameters(action, code)) {
+    description.params.emplace_back(parameter.meaning);
   }
   return description;
 }

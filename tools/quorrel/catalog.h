@@ -1,9 +1,11 @@
-// What a person needs to call an action or expression by name: the action names, the
-// file each file action opens and what each parameter is (all from host/table.inc),
-// and the help page's prose.
+// What a person needs to call an action or expression by name: the names, the file each
+// file action opens and each parameter's type and meaning (all from host/table.inc),
+// and the help page's prose (help/descriptions.txt), read here for the quorrel command
+// and the help page generator alike.
 #pragma once
 
 #include <cstdint>
+#include <map>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -22,6 +24,15 @@ struct ActionEntry {
 
 const ActionEntry& actionEntry(int32_t code);
 std::optional<int32_t> actionCodeOfName(std::string_view name);
+// The row's name: an action's (appendString) or an expression's (get$().
+const char* rowName(bool action, int32_t code);
+
+// A declared parameter: a number (an integer, to an expression) or a text.
+struct Parameter {
+  bool isText;
+  const char* meaning;
+};
+std::vector<Parameter> parameters(bool action, int32_t code);
 
 // The help page's words on one action or expression.
 struct Description {
@@ -30,5 +41,13 @@ struct Description {
   std::string bad;                  // what bad input does; may be empty
 };
 std::optional<Description> describe(bool action, int32_t code);
+
+// The prose of a descriptions text: one block per row, under "== NAME". `problems`
+// names, with line numbers, what keeps the text from describing exactly the table.
+struct Prose {
+  std::map<std::string, Description, std::less<>> blocks;
+  std::vector<std::string> problems;
+};
+Prose readProse(std::string_view text);
 
 }  // namespace quorrel::tool
