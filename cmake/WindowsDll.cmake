@@ -11,7 +11,6 @@ set(quorrel_entry_points ${CMAKE_SOURCE_DIR}/src/host/entry_points.txt)
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${quorrel_entry_points})
 file(STRINGS ${quorrel_entry_points} quorrel_def_lines REGEX "^[A-Za-z]")
 set(quorrel_def_text "LIBRARY quorrel.dll\nEXPORTS\n")
-set(quorrel_ordinals_text "")
 foreach(line IN LISTS quorrel_def_lines)
   if(NOT line MATCHES "^([A-Za-z]+)[ \t]+([0-9]+)[ \t]+([0-9]+)")
     message(FATAL_ERROR "entry_points.txt: cannot read line '${line}'")
@@ -21,15 +20,9 @@ foreach(line IN LISTS quorrel_def_lines)
   else()
     string(APPEND quorrel_def_text "  ${CMAKE_MATCH_1} @${CMAKE_MATCH_2}\n")
   endif()
-  string(APPEND quorrel_ordinals_text "QUORREL_ENTRY_POINT(${CMAKE_MATCH_1}, ${CMAKE_MATCH_2})\n")
 endforeach()
 set(quorrel_def ${CMAKE_BINARY_DIR}/quorrel.def)
 file(CONFIGURE OUTPUT ${quorrel_def} CONTENT "${quorrel_def_text}" @ONLY)
-# The same list for Windows hosts (quorrel.exe, the dialog test), which find every entry
-# point by its ordinal.
-set(QUORREL_GENERATED_INCLUDE_DIR ${CMAKE_BINARY_DIR}/generated)
-file(CONFIGURE OUTPUT ${QUORREL_GENERATED_INCLUDE_DIR}/entry_point_ordinals.inc
-  CONTENT "${quorrel_ordinals_text}" @ONLY)
 
 set_target_properties(quorrel_module PROPERTIES
   PREFIX ""

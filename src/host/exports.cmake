@@ -20,6 +20,15 @@ foreach(line IN LISTS quorrel_entry_lines)
   list(APPEND QUORREL_ENTRY_POINT_SIDES ${CMAKE_MATCH_4})
 endforeach()
 
+# The same list for host programs (the host simulator, the Windows dialog test): a
+# Windows host finds every entry point by its ordinal.
+set(quorrel_ordinals_text "")
+foreach(name ordinal IN ZIP_LISTS QUORREL_ENTRY_POINT_NAMES QUORREL_ENTRY_POINT_ORDINALS)
+  string(APPEND quorrel_ordinals_text "QUORREL_ENTRY_POINT(${name}, ${ordinal})\n")
+endforeach()
+file(CONFIGURE OUTPUT ${CMAKE_BINARY_DIR}/generated/entry_point_ordinals.inc
+  CONTENT "${quorrel_ordinals_text}" @ONLY)
+
 if(NOT WIN32 AND NOT APPLE)
   set(quorrel_version_script ${CMAKE_CURRENT_BINARY_DIR}/quorrel.map)
   set(quorrel_map_text "{\n  global:\n")

@@ -1,19 +1,13 @@
 #include "hostsim/host_simulator.h"
 
-#ifdef _WIN32
-#include <fcntl.h>
-#include <io.h>
-
-#include "platform/windows_services.h"
-#else
-#include <dlfcn.h>
-#endif
-
 #include <algorithm>
 #include <cstdio>
 #include <cstring>
 #include <filesystem>
 #include <string>
+#include <type_traits>
+
+#include "platform/windows_services.h"
 
 namespace quorrel::hostsim {
 namespace {
@@ -21,53 +15,40 @@ namespace {
 using abi::readField;
 using abi::writeField;
 
-#if defined(_WIN32) && defined(__i386__)
-// The host calls every routine as stdcall: the routine removes its own arguments. One
-// built with another convention leaves the stack pointer where the host does not expect
-// it, which a game would not survive, while a call made by C++ here would hide it (the
-// caller soon restores its frame). So the call is made by hand: three words pushed, the
-// routine called, and the bytes it left on the stack handed back.
-extern "C" uint32_t quorrelCallStdcall(const void* routine, uint32_t first, uint32_t second,
-                                       uint32_t third, uint32_t* bytesLeft);
-asm(R"(
-  .text
-  .globl _quorrelCallStdcall
-_quorrelCallStdcall:
-  pushl %ebp
-  movl %esp, %ebp
-  pushl %esi
-  movl %esp, %esi
-  pushl 20(%ebp)
-  pushl 16(%ebp)
-  pushl 12(%ebp)
-  call *8(%ebp)
-  movl %esi, %ecx
-  subl %esp, %ecx
-  movl 24(%ebp), %edx
-  movl %ecx, (%edx)
-  movl %esi, %esp
-  popl %esi
-  popl %ebp
-  ret
-)");
-
-// Calls ROUTINE (KIND CODE) with its arguments, ARGUMENT_BYTES of the three words, as the
-// host does.
-template <typename Routine>
-uint32_t callAsHost(const char* kind, int32_t code, Routine routine, uint32_t argumentBytes,
-                    uint32_t first, uint32_t second, uint32_t third) {
-  uint32_t bytesLeft = 0;
-  const uint32_t answer =
-      quorrelCallStdcall(reinterpret_cast<const void*>(routine), first, second, third, &bytesLeft);
-  if (bytesLeft != 12 - argumentBytes) {
-    throw ContractError(kind + (" " + std::to_string(code)) + " removed " +
-                        std::to_string(12 - bytesLeft) + " of its " +
-                        std::to_string(argumentBytes) +
-                        " argument bytes from the stack (not stdcall)");
+template <typename T>
+uint32_t asWord(T value) {
+  if constexpr (std::is_pointer_v<T>) {
+    return static_cast<uint32_t>(reinterpret_cast<uintptr_t>(value));
+  } else {
+    return static_cast<uint32_t>(value);
   }
-  return answer;
 }
-#endif
+
+// Calls ROUTINE (KIND CODE) with ARGS as the host does. Where the host calls routines
+// stdcall, the call is made by hand and a routine that does not remove exactly its own
+// arguments is a breach: a game would not survive the stack pointer it leaves, while a
+// plain C++ call would hide it (the caller soon restores its frame).
+template <typename Routine, typename... Args>
+auto callAsHost(const char* kind, int32_t code, Routine routine, Args... args) {
+  using Answer = decltype(routine(args...));
+  if constexpr (platform::kRoutinesAreStdcall) {
+    const uint32_t words[3] = {asWord(args)...};
+    const uint32_t argumentBytes = 4 * sizeof...(Args);
+    uint32_t bytesLeft = 0;
+    const uint32_t answer = platform::callStdcall(reinterpret_cast<const void*>(routine), words[0],
+                                                  words[1], words[2], &bytesLeft);
+    if (bytesLeft != 12 - argumentBytes) {
+      throw ContractError(kind + (" " + std::to_string(code)) + " removed " +
+                          std::to_string(12 - bytesLeft) + " of its " +
+                          std::to_string(argumentBytes) +
+                          " argument bytes from the stack (not stdcall)");
+    }
+    return static_cast<Answer>(answer);
+  } else {
+    (void)kind, (void)code;
+    return routine(args...);
+  }
+}
 
 template <typename Fn>
 Fn optional(const Module& module, const char* name) {
@@ -94,101 +75,55 @@ std::string loadText(abi::GetStringFn get, int32_t code) {
 }  // namespace
 
 // ---------------------------------------------------------------------------------
-// Loading: the only platform-specific part of the command.
-Module::Module(std::string path, void* handle) : path_(std::move(path)), handle_(handle) {}
+// Loading
+Module::Module(std::string path, platform::Library library)
+    : path_(std::move(path)), library_(std::move(library)) {}
 
-#ifdef _WIN32
+Module::~Module() = default;
 
 namespace {
-// Every entry point with its ordinal, from entry_points.txt (WindowsDll.cmake).
+// Every entry point with its ordinal, from entry_points.txt.
 struct EntryOrdinal {
   const char* name;
-  WORD ordinal;
+  uint16_t ordinal;
 };
 constexpr EntryOrdinal kEntryOrdinals[] = {
 #define QUORREL_ENTRY_POINT(name, ordinal) {#name, ordinal},
 #include "entry_point_ordinals.inc"
 #undef QUORREL_ENTRY_POINT
 };
-
-void* procedure(void* handle, LPCSTR name) {
-  return reinterpret_cast<void*>(GetProcAddress(static_cast<HMODULE>(handle), name));
-}
 }  // namespace
 
-Module::~Module() {
-  FreeLibrary(static_cast<HMODULE>(handle_));
-}
-
 std::unique_ptr<Module> Module::open(const std::string& path) {
-  // A bare file name would make LoadLibrary search the system folders instead.
-  const std::string usable = path.find_first_of("/\\") == std::string::npos ? "./" + path : path;
-  std::string native = usable;
-  std::replace(native.begin(), native.end(), '/', '\\');
-  HMODULE handle = LoadLibraryA(native.c_str());
-  if (!handle) {
-    const DWORD code = GetLastError();
-    // The same words as the dynamic loader's on Linux, so that a script's output does
-    // not depend on the platform.
-    const std::string why =
-        code == ERROR_MOD_NOT_FOUND || code == ERROR_FILE_NOT_FOUND || code == ERROR_PATH_NOT_FOUND
-            ? "cannot open shared object file: No such file or directory"
-            : "Windows error " + std::to_string(code);
-    throw ModuleError("cannot load module: " + usable + ": " + why);
+  std::optional<platform::Library> library;
+  try {
+    library = platform::Library::open(path);
+  } catch (const std::runtime_error& error) {
+    throw ModuleError(std::string("cannot load module: ") + error.what());
   }
-  std::unique_ptr<Module> module(new Module(path, handle));
-  // A host finds the entry points by ordinal; the names must lead to the same code.
   for (const auto& entry : kEntryOrdinals) {
-    void* byOrdinal = procedure(handle, MAKEINTRESOURCEA(entry.ordinal));
-    if (!byOrdinal || byOrdinal != procedure(handle, entry.name)) {
-      throw ModuleError("cannot load module: " + usable + ": " + entry.name +
+    if (library->symbol(entry.name) && !library->entryPoint(entry.name, entry.ordinal)) {
+      throw ModuleError("cannot load module: " + path + ": " + entry.name +
                         " is not exported at ordinal " + std::to_string(entry.ordinal));
     }
   }
-  return module;
+  return std::unique_ptr<Module>(new Module(path, std::move(*library)));
+}
+
+std::unique_ptr<Module> Module::linked() {
+  try {
+    return std::unique_ptr<Module>(new Module("(linked in)", platform::Library::self()));
+  } catch (const std::runtime_error& error) {
+    throw ModuleError(std::string("cannot read this program's symbols: ") + error.what());
+  }
 }
 
 void* Module::symbol(const char* name) const {
   for (const auto& entry : kEntryOrdinals) {
-    if (std::strcmp(entry.name, name) == 0) {
-      return procedure(handle_, MAKEINTRESOURCEA(entry.ordinal));
-    }
+    if (std::strcmp(entry.name, name) == 0) return library_.entryPoint(name, entry.ordinal);
   }
-  return nullptr;
+  return library_.symbol(name);
 }
-
-void useBinaryStandardStreams() {
-  // Output is byte for byte what the Linux build writes: no CRLF translation.
-  for (FILE* stream : {stdin, stdout, stderr}) _setmode(_fileno(stream), _O_BINARY);
-}
-
-#else
-
-Module::~Module() {
-  dlclose(handle_);
-}
-
-std::unique_ptr<Module> Module::open(const std::string& path) {
-  // A bare file name would make dlopen search the library path instead of using it.
-  const std::string usable = path.find('/') == std::string::npos ? "./" + path : path;
-  void* handle = dlopen(usable.c_str(), RTLD_NOW | RTLD_LOCAL);
-  if (!handle) throw ModuleError(std::string("cannot load module: ") + dlerror());
-  return std::unique_ptr<Module>(new Module(path, handle));
-}
-
-std::unique_ptr<Module> Module::linked() {
-  void* self = dlopen(nullptr, RTLD_NOW);
-  if (!self) throw ModuleError(std::string("cannot read this program's symbols: ") + dlerror());
-  return std::unique_ptr<Module>(new Module("(linked in)", self));
-}
-
-void* Module::symbol(const char* name) const {
-  return dlsym(handle_, name);
-}
-
-void useBinaryStandardStreams() {}
-
-#endif
 
 Signature Module::actionSignature(int32_t code) const {
   return signatureOf(entry<abi::GetInfoEntryFn>("GetActionInfos")(nullptr, code));
@@ -230,12 +165,12 @@ std::string Module::expressionTitle(int32_t code) const {
 // are the system's own).
 namespace menus {
 using Menu = void*;
-using ItemCountFn = int (*)(Menu);
-using ItemIdFn = unsigned (*)(Menu, int);
-using ItemTextFn = int (*)(Menu, unsigned, char*, int, unsigned);
-using SubMenuFn = Menu (*)(Menu, int);
-using StateFn = unsigned (*)(Menu, unsigned, unsigned);
-using DestroyFn = int (*)(Menu);
+using ItemCountFn = int(WINAPI*)(Menu);
+using ItemIdFn = unsigned(WINAPI*)(Menu, int);
+using ItemTextFn = int(WINAPI*)(Menu, unsigned, char*, int, unsigned);
+using SubMenuFn = Menu(WINAPI*)(Menu, int);
+using StateFn = unsigned(WINAPI*)(Menu, unsigned, unsigned);
+using DestroyFn = int(WINAPI*)(Menu);
 constexpr unsigned kByPosition = 0x400;
 
 struct Services {
@@ -273,35 +208,23 @@ std::vector<MenuItem> Module::menu(std::string_view which) const {
                                               : "GetConditionMenu";
   void* menu = entry<abi::GetMenuFn>(name)(0, 0, 0);
   if (!menu) return {};
-#ifdef _WIN32
-  // The system's menu services, on the menu the module built with them.
-  const menus::Services services{
-      [](menus::Menu m) { return GetMenuItemCount(static_cast<HMENU>(m)); },
-      [](menus::Menu m, int position) {
-        return static_cast<unsigned>(GetMenuItemID(static_cast<HMENU>(m), position));
-      },
-      [](menus::Menu m, unsigned item, char* text, int size, unsigned flags) {
-        return GetMenuStringA(static_cast<HMENU>(m), item, text, size, flags);
-      },
-      [](menus::Menu m, int position) -> menus::Menu {
-        return GetSubMenu(static_cast<HMENU>(m), position);
-      },
-      [](menus::Menu m, unsigned item, unsigned flags) {
-        return static_cast<unsigned>(GetMenuState(static_cast<HMENU>(m), item, flags));
-      }};
-  std::vector<MenuItem> items = menus::walk(services, menu);
-  DestroyMenu(static_cast<HMENU>(menu));  // the host owns the menu it was handed
-  return items;
-#else
-  const menus::Services services{
-      entry<menus::ItemCountFn>("GetMenuItemCount"), entry<menus::ItemIdFn>("GetMenuItemID"),
-      entry<menus::ItemTextFn>("GetMenuStringA"), entry<menus::SubMenuFn>("GetSubMenu"),
-      entry<menus::StateFn>("GetMenuState")};
+  // The system's menu services where it has them (the module built the menu with
+  // them), else the ones the module exports.
+  const std::optional<platform::Library> system = platform::Library::systemMenus();
+  const auto service = [&](const char* serviceName) {
+    void* address = system ? system->symbol(serviceName) : symbol(serviceName);
+    if (!address) throw ModuleError(path_ + ": no menu service " + serviceName);
+    return address;
+  };
+  const menus::Services services{reinterpret_cast<menus::ItemCountFn>(service("GetMenuItemCount")),
+                                 reinterpret_cast<menus::ItemIdFn>(service("GetMenuItemID")),
+                                 reinterpret_cast<menus::ItemTextFn>(service("GetMenuStringA")),
+                                 reinterpret_cast<menus::SubMenuFn>(service("GetSubMenu")),
+                                 reinterpret_cast<menus::StateFn>(service("GetMenuState"))};
   std::vector<MenuItem> items = menus::walk(services, menu);
   // The host owns the menu it was handed.
-  if (const auto destroy = optional<menus::DestroyFn>(*this, "DestroyMenu")) destroy(menu);
+  reinterpret_cast<menus::DestroyFn>(service("DestroyMenu"))(menu);
   return items;
-#endif
 }
 
 const RoutineTables& Module::routines() const {
@@ -437,13 +360,7 @@ int16_t Instance::callAction(int32_t code, const std::vector<Argument>& args) {
   const Argument& first = args.size() > 0 ? args[0] : none;
   const Argument& second = args.size() > 1 ? args[1] : none;
   const abi::ActionRoutine routine = module_.routines().actions[code];
-#if defined(_WIN32) && defined(__i386__)
-  const auto answer = static_cast<int16_t>(callAsHost("action", code, routine, 12,
-                                                      reinterpret_cast<uint32_t>(record()),
-                                                      first.word(), second.word()));
-#else
-  const int16_t answer = routine(record(), first.word(), second.word());
-#endif
+  const int16_t answer = callAsHost("action", code, routine, record(), first.word(), second.word());
   checkRecordEnd();
   return answer;
 }
@@ -456,12 +373,7 @@ abi::HostWord Instance::callExpressionRaw(int32_t code, std::vector<Argument> ar
   allocations.clear();
   results_.clear();
   const abi::ExpressionRoutine routine = module_.routines().expressions[code];
-#if defined(_WIN32) && defined(__i386__)
-  const abi::HostWord answer =
-      callAsHost("expression", code, routine, 8, reinterpret_cast<uint32_t>(record()), token, 0);
-#else
-  const abi::HostWord answer = routine(record(), token);
-#endif
+  const abi::HostWord answer = callAsHost("expression", code, routine, record(), token);
   checkRecordEnd();
   return answer;
 }
@@ -527,26 +439,14 @@ void Instance::checkExpression(int32_t code, abi::HostWord answer, uint16_t flag
 // ---------------------------------------------------------------------------------
 std::string defaultModulePath() {
   namespace fs = std::filesystem;
+  const fs::path dir = fs::path(platform::programPath()).parent_path();
+  const char* const name = platform::kModuleFileName;
   std::error_code error;
-#ifdef _WIN32
-  char self[MAX_PATH] = {};
-  const DWORD length = GetModuleFileNameA(nullptr, self, sizeof self);
-  if (length == 0 || length >= sizeof self) return "quorrel.dll";
-  const fs::path dir = fs::path(self).parent_path();
-  for (const fs::path& candidate : {dir / "quorrel.dll", dir / "../quorrel.dll"}) {
-    if (fs::exists(candidate, error)) return candidate.lexically_normal().string();
-  }
-  return (dir / "quorrel.dll").string();
-#else
-  const fs::path self = fs::read_symlink("/proc/self/exe", error);
-  if (error) return "libquorrel.so";
-  const fs::path dir = self.parent_path();
   for (const fs::path& candidate :
-       {dir / "libquorrel.so", dir / "../src/host/libquorrel.so", dir / "../lib/libquorrel.so"}) {
+       {dir / name, dir / ".." / name, dir / "../lib" / name, dir / "../src/host" / name}) {
     if (fs::exists(candidate, error)) return candidate.lexically_normal().string();
   }
-  return (dir / "../src/host/libquorrel.so").lexically_normal().string();
-#endif
+  return (dir / name).lexically_normal().string();
 }
 
 }  // namespace quorrel::hostsim

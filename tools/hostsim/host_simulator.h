@@ -16,6 +16,7 @@
 #include <vector>
 
 #include "hostsim/records.h"
+#include "platform/library.h"
 
 namespace quorrel::hostsim {
 
@@ -62,18 +63,14 @@ class Module {
  public:
   // Opens the library; throws ModuleError when it or a run-side entry point is missing.
   static std::unique_ptr<Module> open(const std::string& path);
-#ifndef _WIN32
   // The module linked into this program, whose entry points it exports (the fuzzers
   // link it in so that coverage and the sanitizers see all of it).
   static std::unique_ptr<Module> linked();
-#endif
   ~Module();
   Module(const Module&) = delete;
   Module& operator=(const Module&) = delete;
 
-  const std::string& path() const {
-    return path_;
-  }
+  const std::string& path() const { return path_; }
   Signature actionSignature(int32_t code) const;
   Signature expressionSignature(int32_t code) const;
 
@@ -104,9 +101,9 @@ class Module {
   const RoutineTables& routines() const;
 
  private:
-  Module(std::string path, void* handle);
+  Module(std::string path, platform::Library library);
   std::string path_;
-  void* handle_;
+  platform::Library library_;
   mutable std::optional<RoutineTables> routines_;
 };
 
@@ -207,6 +204,6 @@ std::string defaultModulePath();
 
 // Standard input, output and error carry bytes as they are (Windows would translate
 // line ends otherwise).
-void useBinaryStandardStreams();
+using platform::useBinaryStandardStreams;
 
 }  // namespace quorrel::hostsim

@@ -1,0 +1,107 @@
+#ifndef WIN32_LEAN_AND_MEAN
+#define WIN32_LEAN_AND_MEAN
+#endif
+#include <fcntl.h>
+#include <io.h>
+#include <windows.h>
+
+#include <algorithm>
+#include <cstdio>
+#include <utility>
+
+#include "platform/library.h"
+
+namespace quorrel::platform {
+
+const char* const kModuleFileName = "quorrel.dll";
+
+Library Library::open(const std::string& path) {
+  // A bare file name would make LoadLibrary search the system folders instead.
+  const std::string usable = path.find_first_of("/\\") == std::string::npos ? "./" + path : path;
+  std::string native = usable;
+  std::replace(native.begin(), native.end(), '/', '\\');
+  HMODULE handle = LoadLibraryA(native.c_str());
+  if (!handle) {
+    const DWORD code = GetLastError();
+    // The dynamic loader's words on Linux, so that output does not depend on the system.
+    throw std::runtime_error(
+        code == ERROR_MOD_NOT_FOUND || code == ERROR_FILE_NOT_FOUND || code == ERROR_PATH_NOT_FOUND
+            ? usable + ": cannot open shared object file: No such file or directory"
+            : usable + ": Windows error " + std::to_string(code));
+  }
+  return Library(handle);
+}
+
+Library Library::self() {
+  throw std::runtime_error("a program cannot open itself as a library here");
+}
+
+std::optional<Library> Library::systemMenus() {
+  return Library::open("user32.dll");
+}
+
+Library::Library(Library&& other) noexcept : handle_(std::exchange(other.handle_, nullptr)) {}
+
+Library& Library::operator=(Library&& other) noexcept {
+  std::swap(handle_, other.handle_);
+  return *this;
+}
+
+Library::~Library() {
+  if (handle_) FreeLibrary(static_cast<HMODULE>(handle_));
+}
+
+void* Library::symbol(const char* name) const {
+  return reinterpret_cast<void*>(GetProcAddress(static_cast<HMODULE>(handle_), name));
+}
+
+void* Library::entryPoint(const char* name, uint16_t ordinal) const {
+  void* byOrdinal = reinterpret_cast<void*>(
+      GetProcAddress(static_cast<HMODULE>(handle_), MAKEINTRESOURCEA(ordinal)));
+  return byOrdinal == symbol(name) ? byOrdinal : nullptr;
+}
+
+std::string programPath() {
+  char self[MAX_PATH] = {};
+  const DWORD length = GetModuleFileNameA(nullptr, self, sizeof self);
+  return length == 0 || length >= sizeof self ? std::string() : std::string(self, length);
+}
+
+void useBinaryStandardStreams() {
+  for (FILE* stream : {stdin, stdout, stderr}) _setmode(_fileno(stream), _O_BINARY);
+}
+
+}  // namespace quorrel::platform
+
+#if defined(__i386__)
+// cdecl, so that its own arguments are the caller's to remove; the routine's three words
+// are pushed here and whatever it leaves is measured against the saved stack pointer.
+extern "C" uint32_t quorrelCallStdcall(const void* routine, uint32_t first, uint32_t second,
+                                       uint32_t third, uint32_t* bytesLeft);
+asm(R"(
+  .text
+  .globl _quorrelCallStdcall
+_quorrelCallStdcall:
+  pushl %ebp
+  movl %esp, %ebp
+  pushl %esi
+  movl %esp, %esi
+  pushl 20(%ebp)
+  pushl 16(%ebp)
+  pushl 12(%ebp)
+  call *8(%ebp)
+  movl %esi, %ecx
+  subl %esp, %ecx
+  movl 24(%ebp), %edx
+  movl %ecx, (%edx)
+  movl %esi, %esp
+  popl %esi
+  popl %ebp
+  ret
+)");
+
+uint32_t quorrel::platform::callStdcall(const void* routine, uint32_t first, uint32_t second,
+                                        uint32_t third, uint32_t* bytesLeft) {
+  return quorrelCallStdcall(routine, first, second, third, bytesLeft);
+}
+#endif
