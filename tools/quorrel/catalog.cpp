@@ -1,5 +1,9 @@
 #include "catalog.h"
 
+#include <algorithm>
+#include <cctype>
+#include <numeric>
+
 #include "host/abi.h"
 
 namespace quorrel::tool {
@@ -33,6 +37,42 @@ const Meanings kExpressionMeanings[abi::kExpressionCount] = {
 #include "host/table.inc"
 };
 
+const char* const kExpressionNames[abi::kExpressionCount] = {
+#define EXPRESSION(code, name, routine, param1, param2, meaning1, meaning2) name,
+#include "host/table.inc"
+};
+
+// The meaning the table gives a parameter that the routine ignores.
+constexpr std::string_view kUnused = "not used";
+
+// A typed name reduced for comparison: lower case, without a trailing "()" or "(".
+std::string comparable(std::string_view name) {
+  if (name.ends_with("()")) name.remove_suffix(2);
+  if (name.ends_with('(')) name.remove_suffix(1);
+  std::string out(name);
+  for (char& c : out) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+  return out;
+}
+
+size_t editDistance(std::string_view a, std::string_view b) {
+  std::vector<size_t> row(b.size() + 1);
+  std::iota(row.begin(), row.end(), size_t{0});
+  for (size_t i = 1; i <= a.size(); ++i) {
+    size_t diagonal = row[0];
+    row[0] = i;
+    for (size_t j = 1; j <= b.size(); ++j) {
+      const size_t above = row[j];
+      row[j] = std::min({row[j] + 1, row[j - 1] + 1, diagonal + (a[i - 1] != b[j - 1])});
+      diagonal = above;
+    }
+  }
+  return row[b.size()];
+}
+
+int32_t countOf(bool action) {
+  return action ? abi::kActionCount : abi::kExpressionCount;
+}
+
 // The text after a "name:" prefix, blanks before it skipped.
 std::string afterPrefix(std::string_view line, size_t prefix) {
   line.remove_prefix(prefix);
@@ -58,6 +98,50 @@ std::optional<int32_t> actionCodeOfName(std::string_view name) {
     if (name == kActions[code].name) return code;
   }
   return std::nullopt;
+}
+
+std::string_view nameOf(bool action, int32_t code) {
+  return action ? kActions[code].name : kExpressionNames[code];
+}
+
+std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed) {
+  const std::string wanted = comparable(typed);
+  if (wanted.empty()) return std::nullopt;
+  for (int32_t code = 0; code < countOf(action); ++code) {
+    if (nameOf(action, code) == typed) return code;
+  }
+  for (int32_t code = 0; code < countOf(action); ++code) {
+    if (comparable(nameOf(action, code)) == wanted) return code;
+  }
+  return std::nullopt;
+}
+
+std::vector<std::string> nearestNames(std::string_view typed) {
+  const std::string wanted = comparable(typed);
+  // A slip: about one key in three wrong, at least one.
+  const size_t limit = std::max<size_t>(1, (wanted.size() + 1) / 3);
+  std::vector<std::pair<size_t, std::string>> near;
+  for (const bool action : {true, false}) {
+    for (int32_t code = 0; code < countOf(action); ++code) {
+      const std::string_view name = nameOf(action, code);
+      const size_t distance = editDistance(wanted, comparable(name));
+      if (distance <= limit) near.emplace_back(distance, name);
+    }
+  }
+  std::stable_sort(near.begin(), near.end(),
+                   [](const auto& a, const auto& b) { return a.first < b.first; });
+  std::vector<std::string> names;
+  for (size_t i = 0; i < near.size() && i < 3; ++i) names.push_back(near[i].second);
+  return names;
+}
+
+std::string_view parameterMeaning(bool action, int32_t code, int param) {
+  const Meanings& meanings = action ? kActionMeanings[code] : kExpressionMeanings[code];
+  return meanings.param[param];
+}
+
+bool parameterUnused(bool action, int32_t code, int param) {
+  return parameterMeaning(action, code, param) == kUnused;
 }
 
 std::optional<Description> describe(bool action, int32_t code) {

@@ -47,6 +47,12 @@ ignored. FILE - reads the script from standard input.
   E NAME|CODE [ARG [ARG]]  call expression CODE (0..59) or a name such as rowList$(
                            and print its result: -12 or "a,b,7"
 
+A name may be typed in any case, with or without its "(", and its arguments may
+follow in parentheses, separated by commas: E labSum("qty"), E size,
+E getFromColumnRow(1, 2), A setLabel("qty", 1). An argument that the routine does
+not use (the second of findStr( ) may be left out. An unknown name is reported with
+the nearest real ones.
+
 'quorrel list' shows every name with its parameters; 'quorrel list NAME' says
 what one does. Arguments are integers or quoted strings with the escapes
 \\ \" \n \r \t \xHH. An error prints FILE:LINE: error: WHAT and exits with status 2.
@@ -102,11 +108,14 @@ output. Exits with status 1 when IN cannot be read or OUT cannot be written.
 
 A warning on standard error names each kind of content the target format loses.
 )"},
-    {"list", R"(Usage: quorrel list [actions|expressions|NAME|CODE]
+    {"list", R"(Usage: quorrel list [actions|expressions|NAME|CODE|WORD]
 
 Without an operand, lists every action (A) and expression (E): code, name,
-parameters with their types, and menu path. With a name (setLabel, labSum(),
-A12 or E12, or a bare code for both kinds) describes it in the help page's words.
+parameters with their types, and menu path. With a name in any case (setLabel,
+labsum, labSum(), A12 or E12, or a bare code for both kinds) describes it in the
+help page's words. Any other word lists every entry whose name, menu path,
+parameters or description contains it, in any case: quorrel list sort. Exits
+with status 2 when nothing matches, naming the nearest names.
 )"},
     {"menu", R"(Usage: quorrel menu actions|expressions|conditions
 

@@ -202,44 +202,106 @@ std::string quoteText(std::string_view bytes) {
   return out;
 }
 
+namespace {
+
+Argument parseArgument(std::string_view token) {
+  Argument arg;
+  arg.isText = isQuotedToken(token);
+  if (arg.isText) {
+    arg.text = parseQuoted(token);
+  } else {
+    arg.number = parseInteger(token);
+  }
+  return arg;
+}
+
+std::string_view trimmed(std::string_view text) {
+  const size_t start = text.find_first_not_of(" \t\r");
+  if (start == std::string_view::npos) return {};
+  return text.substr(start, text.find_last_not_of(" \t\r") - start + 1);
+}
+
+// The length of `text` when its last character closes it, a ")" outside any string;
+// otherwise npos.
+size_t closedCallLength(std::string_view text) {
+  size_t i = 0;
+  while (i < text.size() && !(text[i] == ')' && i + 1 == text.size())) {
+    i = text[i] == '"' ? skipQuoted(text, i) : i + 1;
+  }
+  return i < text.size() ? i : std::string_view::npos;
+}
+
+// "1, 2" or "\"x\"": arguments between commas outside strings, each one token.
+std::vector<Argument> parseArgumentList(std::string_view list) {
+  std::vector<Argument> args;
+  if (trimmed(list).empty()) return args;
+  for (size_t start = 0, i = 0;; ++i) {
+    if (i < list.size() && list[i] == '"') i = skipQuoted(list, i) - 1;
+    if (i < list.size() && list[i] != ',') continue;
+    const std::string_view piece = trimmed(list.substr(start, i - start));
+    const std::vector<std::string> tokens = splitTokens(piece);
+    if (tokens.size() != 1) {
+      throw ScriptError(
+          "argument " + std::to_string(args.size() + 1) +
+          (tokens.empty() ? " is missing" : " is more than one word: " + quoteText(piece)));
+    }
+    args.push_back(parseArgument(tokens[0]));
+    if (i >= list.size()) return args;
+    start = i + 1;
+  }
+}
+
+// After the name: blank-separated arguments, or a list in parentheses, as in
+// labSum("qty") or getFromColumnRow(1, 2).
+std::vector<Argument> parseArguments(std::string_view rest) {
+  if (!rest.empty() && rest.front() == '(') {
+    rest.remove_prefix(1);
+    const std::string_view call = trimmed(rest);
+    const size_t close = closedCallLength(call);
+    if (close != std::string_view::npos) return parseArgumentList(call.substr(0, close));
+  }
+  std::vector<Argument> args;
+  for (const std::string& token : splitTokens(rest)) args.push_back(parseArgument(token));
+  return args;
+}
+
+void setCodeOrName(Command& command, std::string_view word, bool isAction) {
+  if (looksLikeInteger(word) || (isAction && !looksLikeName(word))) {
+    command.code = parseInteger(word);
+    const int32_t count = isAction ? abi::kActionCount : abi::kExpressionCount;
+    if (command.code < 0 || command.code >= count) {
+      throw ScriptError((isAction ? "action code " : "expression code ") + std::string(word) +
+                        " is out of range 0.." + std::to_string(count - 1));
+    }
+  } else {
+    command.name = word;
+  }
+}
+
+}  // namespace
+
 Command parseLine(std::string_view line) {
   const size_t first = line.find_first_not_of(" \t\r");
   if (first == std::string_view::npos || line[first] == '#') return {};
-  std::vector<std::string> tokens = splitTokens(line);
   Command command;
-  const std::string& verb = tokens.front();
+  line.remove_prefix(first);
+  const std::string_view verb = line.substr(0, line.find_first_of(" \t\r"));
+  std::string_view rest = line.substr(verb.size());
   if (verb == "new") {
     command.kind = CommandKind::New;
-    for (size_t i = 1; i < tokens.size(); ++i) applyNewField(command.setup, tokens[i]);
+    for (const std::string& token : splitTokens(rest)) applyNewField(command.setup, token);
     return command;
   }
   if (verb != "A" && verb != "E") throw ScriptError("unknown command " + quoteText(verb));
   const bool isAction = verb == "A";
   command.kind = isAction ? CommandKind::Action : CommandKind::Expression;
-  if (tokens.size() < 2) {
+  rest = rest.substr(std::min(rest.size(), rest.find_first_not_of(" \t\r")));
+  const std::string_view word = rest.substr(0, rest.find_first_of(" \t\r("));
+  if (word.empty()) {
     throw ScriptError(isAction ? "A needs an action code" : "E needs an expression code or name");
   }
-  const std::string& code = tokens[1];
-  if (looksLikeInteger(code) || (isAction && !looksLikeName(code))) {
-    command.code = parseInteger(code);
-    const int32_t count = isAction ? abi::kActionCount : abi::kExpressionCount;
-    if (command.code < 0 || command.code >= count) {
-      throw ScriptError((isAction ? "action code " : "expression code ") + code +
-                        " is out of range 0.." + std::to_string(count - 1));
-    }
-  } else {
-    command.name = code;
-  }
-  for (size_t i = 2; i < tokens.size(); ++i) {
-    Argument arg;
-    arg.isText = isQuotedToken(tokens[i]);
-    if (arg.isText) {
-      arg.text = parseQuoted(tokens[i]);
-    } else {
-      arg.number = parseInteger(tokens[i]);
-    }
-    command.args.push_back(std::move(arg));
-  }
+  setCodeOrName(command, word, isAction);
+  command.args = parseArguments(rest.substr(word.size()));
   return command;
 }
 

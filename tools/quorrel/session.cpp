@@ -30,6 +30,39 @@ void checkArguments(const Signature& signature, const std::vector<Argument>& arg
   }
 }
 
+// "; did you mean: size(, sum(" for a name that is close to real ones.
+std::string suggestion(std::string_view typed) {
+  const std::vector<std::string> near = nearestNames(typed);
+  if (near.empty()) return "";
+  std::string text = "; did you mean:";
+  for (size_t i = 0; i < near.size(); ++i) text += (i == 0 ? " " : ", ") + near[i];
+  return text;
+}
+
+int32_t codeOfName(bool action, const std::string& typed) {
+  if (const auto code = codeOfTypedName(action, typed)) return *code;
+  if (const auto other = codeOfTypedName(!action, typed)) {
+    throw ScriptError(std::string(nameOf(!action, *other)) + " is " +
+                      (action ? "an expression: E " : "an action: A ") +
+                      std::string(nameOf(!action, *other)));
+  }
+  throw ScriptError((action ? "unknown action " : "unknown expression ") + quoteText(typed) +
+                    suggestion(typed) + " (quorrel list " + (action ? "actions" : "expressions") +
+                    " shows every name)");
+}
+
+// Parameters the routine ignores may be left out at the end; they are passed as 0.
+std::vector<Argument> withUnusedFilled(bool action, int32_t code, const Signature& signature,
+                                       std::vector<Argument> args, uint16_t textType) {
+  for (int i = static_cast<int>(args.size()); i < signature.paramCount; ++i) {
+    if (!parameterUnused(action, code, i)) break;
+    Argument zero;
+    zero.isText = signature.paramTypes[i] == textType;
+    args.push_back(zero);
+  }
+  return args;
+}
+
 }  // namespace
 
 Instance& Session::instance() {
@@ -74,33 +107,23 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
       replaceInstance(command.setup);
       return;
     case CommandKind::Action: {
-      int32_t code = command.code;
-      if (!command.name.empty()) {
-        const auto named = actionCodeOfName(command.name);
-        if (!named) {
-          throw ScriptError("unknown action " + quoteText(command.name) +
-                            " (quorrel list actions shows every name)");
-        }
-        code = *named;
-      }
-      const std::string what = "action " + std::to_string(code);
-      checkArguments(module_.get().actionSignature(code), command.args, what,
-                     abi::kActionParamText);
-      instance().callAction(code, command.args);
-      if (options_.warnFiles) warnAboutFile(code, command.args, where);
+      const int32_t code = command.name.empty() ? command.code : codeOfName(true, command.name);
+      const Signature signature = module_.get().actionSignature(code);
+      const std::vector<Argument> args =
+          withUnusedFilled(true, code, signature, command.args, abi::kActionParamText);
+      checkArguments(signature, args, "action " + std::to_string(code), abi::kActionParamText);
+      instance().callAction(code, args);
+      if (options_.warnFiles) warnAboutFile(code, args, where);
       return;
     }
     case CommandKind::Expression: {
-      int32_t code = command.code;
-      if (!command.name.empty()) {
-        const auto named = module_.get().expressionCodeOfName(command.name);
-        if (!named) throw ScriptError("unknown expression " + quoteText(command.name));
-        code = *named;
-      }
-      const std::string what = "expression " + std::to_string(code);
-      checkArguments(module_.get().expressionSignature(code), command.args, what,
+      const int32_t code = command.name.empty() ? command.code : codeOfName(false, command.name);
+      const Signature signature = module_.get().expressionSignature(code);
+      const std::vector<Argument> args =
+          withUnusedFilled(false, code, signature, command.args, abi::kExpressionParamText);
+      checkArguments(signature, args, "expression " + std::to_string(code),
                      abi::kExpressionParamText);
-      const ExpressionResult result = instance().callExpression(code, command.args);
+      const ExpressionResult result = instance().callExpression(code, args);
       if (options_.echo) {
         std::string_view text = where.text;
         text.remove_prefix(std::min(text.size(), text.find_first_not_of(" \t")));
