@@ -8,6 +8,8 @@
 #            exit status 0 (the session prints the statuses it wants to check).
 # $QUORREL_EXAMPLES names the examples folder.
 set -u
+# Texts print as UTF-8 and --echo draws its arrow whatever locale the tests run in.
+export LC_ALL=C.UTF-8
 quorrel=$1 case=$2 work=$3 examples=${4:-}
 dir=$(dirname "$case")
 name=$(basename "$case")

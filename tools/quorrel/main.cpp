@@ -137,6 +137,7 @@ struct Options {
   quorrel::tool::RunOptions run;
   bool noWarnFiles = false;
   bool help = false, version = false;
+  bool ascii = false;
   std::vector<std::pair<std::string, std::string>> owned;  // option, the command it needs
   std::vector<std::string> words;                          // the command and its operands
   std::string mistake;  // the first misuse found, reported once all is read
@@ -147,6 +148,16 @@ int32_t countOf(const std::string& option, const std::string& value) {
     throw UsageError(option + " needs a count, not '" + value + "'");
   }
   return std::stoi(value);
+}
+
+size_t widthOf(int32_t count) {
+  const size_t width = static_cast<size_t>(count);
+  if (width != 0 && width < quorrel::tool::kMinimumCutWidth) {
+    throw UsageError("--width needs 0 (never cut) or at least " +
+                     std::to_string(quorrel::tool::kMinimumCutWidth) +
+                     ": a cut cell keeps a character and ends in ...");
+  }
+  return width;
 }
 
 Options parseOptions(int argc, char** argv) {
@@ -165,6 +176,8 @@ Options parseOptions(int argc, char** argv) {
       options.help = true;
     } else if (arg == "--version") {
       options.version = true;
+    } else if (arg == "--ascii") {
+      options.ascii = true;
     } else if (name == "--module") {
       options.module = value();
     } else if (name == "--to") {
@@ -182,7 +195,7 @@ Options parseOptions(int argc, char** argv) {
         try {
           const int32_t count = countOf(name, text);
           if (name == "--rows") options.view.rows = count;
-          if (name == "--width") options.view.width = static_cast<size_t>(count);
+          if (name == "--width") options.view.width = widthOf(count);
         } catch (const UsageError& error) {
           options.mistake = error.what();
         }
@@ -288,6 +301,8 @@ int main(int argc, char** argv) {
     Options options = parseOptions(argc, argv);
     if (!options.words.empty()) command = options.words[0];
     if (!options.mistake.empty()) throw UsageError(options.mistake);
+    quorrel::tool::setTextForm(options.ascii ? quorrel::tool::TextForm::Escaped
+                                             : quorrel::tool::textFormOfEnvironment());
     if (options.version) {
       std::cout << "quorrel " QUORREL_VERSION "\n";
       return 0;

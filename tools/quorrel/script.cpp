@@ -2,6 +2,7 @@
 
 #include <cctype>
 #include <charconv>
+#include <cstdlib>
 
 namespace quorrel::tool {
 namespace {
@@ -105,7 +106,69 @@ bool looksLikeName(std::string_view token) {
   return letters >= 3;
 }
 
+TextForm gTextForm = TextForm::Escaped;
+
+bool isContinuation(unsigned char byte) {
+  return (byte & 0xC0) == 0x80;
+}
+
+// The length of the valid UTF-8 sequence at the start of `bytes` that prints as a
+// character (not a C1 control), or 0.
+size_t printableUtf8Length(std::string_view bytes) {
+  const auto lead = static_cast<unsigned char>(bytes[0]);
+  const size_t length = lead >= 0xF0 ? 4 : lead >= 0xE0 ? 3 : lead >= 0xC2 ? 2 : 0;
+  if (length == 0 || lead > 0xF4 || bytes.size() < length) return 0;
+  uint32_t code = lead & (0x7F >> length);
+  for (size_t i = 1; i < length; ++i) {
+    const auto byte = static_cast<unsigned char>(bytes[i]);
+    if (!isContinuation(byte)) return 0;
+    code = code << 6 | (byte & 0x3F);
+  }
+  static constexpr uint32_t kShortest[] = {0, 0, 0x80, 0x800, 0x10000};
+  const bool valid = code >= kShortest[length] && code <= 0x10FFFF &&
+                     !(code >= 0xD800 && code <= 0xDFFF) && !(code >= 0x80 && code <= 0x9F);
+  return valid ? length : 0;
+}
+
+bool namesUtf8(std::string_view locale) {
+  std::string lower(locale);
+  for (char& c : lower) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+  return lower.find("utf-8") != std::string::npos || lower.find("utf8") != std::string::npos;
+}
+
 }  // namespace
+
+TextForm textFormOfEnvironment() {
+  for (const char* variable : {"LC_ALL", "LC_CTYPE", "LANG"}) {
+    const char* value = std::getenv(variable);
+    if (value && *value) return namesUtf8(value) ? TextForm::Utf8 : TextForm::Escaped;
+  }
+  return TextForm::Escaped;
+}
+
+void setTextForm(TextForm form) {
+  gTextForm = form;
+}
+
+TextForm textForm() {
+  return gTextForm;
+}
+
+size_t printedWidth(std::string_view printed) {
+  size_t width = 0;
+  for (char c : printed) width += !isContinuation(static_cast<unsigned char>(c));
+  return width;
+}
+
+std::string cutToWidth(std::string_view printed, size_t width) {
+  if (width < kMinimumCutWidth || printedWidth(printed) <= width) return std::string(printed);
+  // Keep width - 3 characters: stop at the first byte of the one after them.
+  size_t end = 0;
+  for (size_t kept = 0; end < printed.size(); ++end) {
+    if (!isContinuation(static_cast<unsigned char>(printed[end])) && kept++ == width - 3) break;
+  }
+  return std::string(printed.substr(0, end)) + "...";
+}
 
 std::vector<std::string> splitTokens(std::string_view line) {
   std::vector<std::string> tokens;
@@ -170,8 +233,16 @@ std::string parseQuoted(std::string_view token) {
 std::string quoteText(std::string_view bytes) {
   static constexpr char kHex[] = "0123456789abcdef";
   std::string out = "\"";
-  for (char c : bytes) {
+  for (size_t i = 0; i < bytes.size(); ++i) {
+    const char c = bytes[i];
     const auto byte = static_cast<unsigned char>(c);
+    if (byte >= 0x80 && gTextForm == TextForm::Utf8) {
+      if (const size_t length = printableUtf8Length(bytes.substr(i))) {
+        out += bytes.substr(i, length);
+        i += length - 1;
+        continue;
+      }
+    }
     switch (c) {
       case '"':
         out += "\\\"";

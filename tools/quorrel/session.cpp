@@ -63,6 +63,18 @@ std::vector<Argument> withUnusedFilled(bool action, int32_t code, const Signatur
   return args;
 }
 
+// Editors on Windows like to begin a UTF-8 file with a byte-order mark; it is not a
+// command. A UTF-16 script cannot be read as lines of bytes at all.
+void skipByteOrderMark(std::string& line, const std::string& name, std::ostream& err) {
+  constexpr std::string_view kUtf8Mark = "\xEF\xBB\xBF";
+  if (line.starts_with(kUtf8Mark)) {
+    line.erase(0, kUtf8Mark.size());
+    err << name << ": note: the script begins with a UTF-8 byte-order mark, read past\n";
+  } else if (line.starts_with("\xFF\xFE") || line.starts_with("\xFE\xFF")) {
+    throw ScriptError("the script is UTF-16 text; save it as UTF-8");
+  }
+}
+
 }  // namespace
 
 Instance& Session::instance() {
@@ -128,7 +140,8 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
         std::string_view text = where.text;
         text.remove_prefix(std::min(text.size(), text.find_first_not_of(" \t")));
         text = text.substr(0, text.find_last_not_of(" \t\r") + 1);
-        out << where.line << ": " << text << "  \xe2\x86\x92  ";
+        out << where.line << ": " << text
+            << (textForm() == TextForm::Utf8 ? "  \xe2\x86\x92  " : "  ->  ");
       }
       out << (result.isText ? quoteText(result.text) : std::to_string(result.number)) << '\n';
       return;
@@ -142,6 +155,7 @@ int runScript(const ModuleLoader& module, std::istream& in, const std::string& n
   std::string line;
   for (int lineNumber = 1; std::getline(in, line); ++lineNumber) {
     try {
+      if (lineNumber == 1) skipByteOrderMark(line, name, err);
       session.execute(parseLine(line), out, {name, lineNumber, line});
     } catch (const ScriptError& error) {
       out.flush();
