@@ -3,7 +3,8 @@
 # with the golden files beside it.
 #   NAME.qs: `quorrel run --echo NAME.qs`, which prints each E line beside its result;
 #            stdout against NAME.out, stderr against NAME.err (no NAME.err: nothing
-#            on stderr, exit status 0; else exit status 2).
+#            on stderr, exit status 0; else exit status 2 if it reports an error, 0
+#            if it only warns).
 #   NAME.sh: run with $QUORREL set; stdout and stderr together against NAME.out,
 #            exit status 0 (the session prints the statuses it wants to check).
 # $QUORREL_EXAMPLES names the examples folder.
@@ -33,7 +34,7 @@ if [[ $name == *.qs ]]; then
   expected_status=0
   err_golden=/dev/null
   if [[ -f $dir/$stem.err ]]; then
-    expected_status=2
+    grep -q ': error: ' "$dir/$stem.err" && expected_status=2
     err_golden=$dir/$stem.err
   fi
   compare "$dir/$stem.out" stdout.txt stdout

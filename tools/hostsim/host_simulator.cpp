@@ -525,28 +525,34 @@ void Instance::checkExpression(int32_t code, abi::HostWord answer, uint16_t flag
 }
 
 // ---------------------------------------------------------------------------------
-std::string defaultModulePath() {
+std::vector<std::string> defaultModulePlaces() {
   namespace fs = std::filesystem;
   std::error_code error;
 #ifdef _WIN32
   char self[MAX_PATH] = {};
   const DWORD length = GetModuleFileNameA(nullptr, self, sizeof self);
-  if (length == 0 || length >= sizeof self) return "quorrel.dll";
+  if (length == 0 || length >= sizeof self) return {"quorrel.dll"};
   const fs::path dir = fs::path(self).parent_path();
-  for (const fs::path& candidate : {dir / "quorrel.dll", dir / "../quorrel.dll"}) {
-    if (fs::exists(candidate, error)) return candidate.lexically_normal().string();
-  }
-  return (dir / "quorrel.dll").string();
+  const fs::path places[] = {dir / "quorrel.dll", dir / "../quorrel.dll"};
 #else
   const fs::path self = fs::read_symlink("/proc/self/exe", error);
-  if (error) return "libquorrel.so";
+  if (error) return {"libquorrel.so"};
   const fs::path dir = self.parent_path();
-  for (const fs::path& candidate :
-       {dir / "libquorrel.so", dir / "../src/host/libquorrel.so", dir / "../lib/libquorrel.so"}) {
-    if (fs::exists(candidate, error)) return candidate.lexically_normal().string();
-  }
-  return (dir / "../src/host/libquorrel.so").lexically_normal().string();
+  const fs::path places[] = {dir / "libquorrel.so", dir / "../src/host/libquorrel.so",
+                             dir / "../lib/libquorrel.so"};
 #endif
+  std::vector<std::string> paths;
+  for (const fs::path& place : places) paths.push_back(place.lexically_normal().string());
+  return paths;
+}
+
+std::string defaultModulePath() {
+  std::error_code error;
+  const std::vector<std::string> places = defaultModulePlaces();
+  for (const std::string& place : places) {
+    if (std::filesystem::exists(place, error)) return place;
+  }
+  return places.front();
 }
 
 }  // namespace quorrel::hostsim

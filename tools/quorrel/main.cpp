@@ -1,6 +1,9 @@
 // quorrel: a host for the Quorrel extension module on the command line.
+#include <cerrno>
 #include <cstdint>
+#include <cstdio>
 #include <cstring>
+#include <filesystem>
 #include <iostream>
 #include <map>
 #include <string>
@@ -123,6 +126,10 @@ Prints the menu tree the editor receives, two spaces of indentation per level:
 a command as ID "Text", a submenu as "Text", a separator as -. A command or
 submenu whose state differs from the plain one shows it after the text, for
 example [grayed checked].
+
+The object has no conditions, so its conditions menu is empty: menu conditions
+prints nothing on standard output, says so on standard error and exits with
+status 0.
 )"},
     {"strings", R"(Usage: quorrel strings actions|expressions
 
@@ -209,6 +216,9 @@ Options parseOptions(int argc, char** argv) {
       belongs("run");
     } else if (arg == "--warn-files") {
       belongs("run");
+    } else if (arg == "--strict") {
+      options.run.strict = true;
+      belongs("run");
     } else if (arg == "--no-warn-files") {
       options.noWarnFiles = true;
       belongs("run");
@@ -292,13 +302,42 @@ int dispatch(Options options) {
   return quorrel::tool::stringsCommand(module, words[1]);
 }
 
+// What was printed must have reached standard output: a full disk is an error. A reader
+// that went away (EPIPE) is not worth a word.
+int checkedOutput(int status) {
+  errno = 0;
+  const bool written = std::cout.flush().good() && std::fflush(stdout) == 0;
+  if (written) return status;
+  if (errno != EPIPE) {
+    std::cerr << "quorrel: cannot write standard output"
+              << (errno != 0 ? std::string(": ") + std::strerror(errno) : std::string()) << '\n';
+  }
+  return status == 0 ? 1 : status;
+}
+
+// A command copied away from its module finds none of the usual places; say which they
+// were and how to name the module instead.
+std::string whereModulesWereSought(const std::string& moduleOption) {
+  if (!moduleOption.empty()) return "";
+  std::error_code error;
+  std::string places;
+  for (const std::string& place : quorrel::tool::defaultModulePlaces()) {
+    if (std::filesystem::exists(place, error)) return "";
+    places += "\n  " + place;
+  }
+  return "quorrel: no module in the places looked at:" + places +
+         "\nName the module with --module PATH.\n";
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
   quorrel::tool::useBinaryStandardStreams();
   std::string command;
+  std::string moduleOption;
   try {
     Options options = parseOptions(argc, argv);
+    moduleOption = options.module;
     if (!options.words.empty()) command = options.words[0];
     if (!options.mistake.empty()) throw UsageError(options.mistake);
     quorrel::tool::setTextForm(options.ascii ? quorrel::tool::TextForm::Escaped
@@ -313,7 +352,7 @@ int main(int argc, char** argv) {
       return 0;
     }
     if (options.words.empty()) throw UsageError("no command given");
-    return dispatch(std::move(options));
+    return checkedOutput(dispatch(std::move(options)));
   } catch (const UsageError& error) {
     std::cerr << "quorrel: " << error.what() << "\nTry 'quorrel "
               << (kCommandHelp.count(command) ? command + " " : "") << "--help'.\n";
@@ -322,7 +361,7 @@ int main(int argc, char** argv) {
     std::cerr << "quorrel: " << error.what() << '\n';
     return 1;
   } catch (const quorrel::tool::ModuleError& error) {
-    std::cerr << "quorrel: " << error.what() << '\n';
+    std::cerr << "quorrel: " << error.what() << '\n' << whereModulesWereSought(moduleOption);
     return 1;
   }
 }

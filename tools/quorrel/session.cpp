@@ -5,6 +5,7 @@
 #include <cstring>
 #include <filesystem>
 #include <fstream>
+#include <tuple>
 
 namespace quorrel::tool {
 namespace {
@@ -75,6 +76,32 @@ void skipByteOrderMark(std::string& line, const std::string& name, std::ostream&
   }
 }
 
+// What the module makes of a setup field the setup dialog never stores; empty when
+// the dialog could have stored it.
+std::vector<std::string> oddSetupFields(const SetupFields& setup) {
+  std::vector<std::string> odd;
+  if (setup.dims < 1 || setup.dims > 3) {
+    odd.push_back("dims=" + std::to_string(setup.dims) +
+                  ": the setup dialog stores 1, 2 or 3; the module makes the array "
+                  "one-dimensional");
+  }
+  for (const auto& [name, value] : {std::pair{"x", setup.x}, {"y", setup.y}}) {
+    if (value < 0) {
+      odd.push_back(std::string(name) + '=' + std::to_string(value) +
+                    ": the setup dialog stores no boundary below 0; the module leaves it 0");
+    }
+  }
+  for (const auto& [name, value, means] : {std::tuple{"case", setup.caseSensitive, "on"},
+                                           {"wildcard", setup.wildcard, "on"},
+                                           {"autoselect", setup.autoSelect, "off"}}) {
+    if (value != 0 && value != 1) {
+      odd.push_back(std::string(name) + '=' + std::to_string(value) +
+                    ": the setup dialog stores 0 or 1; the module takes it as " + means);
+    }
+  }
+  return odd;
+}
+
 }  // namespace
 
 Instance& Session::instance() {
@@ -98,11 +125,13 @@ constexpr const char* kFailedSteps[] = {"",
                                         "wrote nothing (no such element, or more cells "
                                         "than the format holds)"};
 
-void Session::warnAboutFile(int32_t code, const std::vector<Argument>& args, const Where& where) {
+void Session::checkFileAction(int32_t code, const std::vector<Argument>& args, const Where& where) {
   const ActionEntry& entry = actionEntry(code);
-  if (entry.file == FileUse::None || !warnings_) return;
+  if (entry.file == FileUse::None) return;
   const auto status = module_.get().fileStatus();
   if (!status || status->first == 0) return;
+  fileActionFailed_ = true;
+  if (!options_.warnFiles || !warnings_) return;
   const auto step = static_cast<size_t>(status->first);
   *warnings_ << where.file << ':' << where.line << ": warning: " << entry.name << ' '
              << quoteText(args[entry.pathParam].text) << ": "
@@ -116,6 +145,12 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
     case CommandKind::Empty:
       return;
     case CommandKind::New:
+      // A stored record may hold anything and the module absorbs it, which is worth
+      // running; the setup dialog would not have written such a value.
+      for (const std::string& odd : oddSetupFields(command.setup)) {
+        if (warnings_)
+          *warnings_ << where.file << ':' << where.line << ": warning: " << odd << '\n';
+      }
       replaceInstance(command.setup);
       return;
     case CommandKind::Action: {
@@ -125,7 +160,7 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
           withUnusedFilled(true, code, signature, command.args, abi::kActionParamText);
       checkArguments(signature, args, "action " + std::to_string(code), abi::kActionParamText);
       instance().callAction(code, args);
-      if (options_.warnFiles) warnAboutFile(code, args, where);
+      checkFileAction(code, args, where);
       return;
     }
     case CommandKind::Expression: {
@@ -162,8 +197,9 @@ int runScript(const ModuleLoader& module, std::istream& in, const std::string& n
       err << name << ':' << lineNumber << ": error: " << error.what() << '\n';
       return 2;
     }
+    if (!out) return 1;
   }
-  return 0;
+  return options.strict && session.fileActionFailed() ? 1 : 0;
 }
 
 }  // namespace quorrel::tool
