@@ -32,19 +32,26 @@ Commands:
 Options:
   --module PATH       the extension module to load (default: the one installed or
                       built beside quorrel)
+  --ascii             print every byte of a text that is not printable ASCII as
+                      \xHH; by default valid UTF-8 prints as itself when LC_ALL,
+                      LC_CTYPE or LANG (the first one set) names UTF-8
   -h, --help          show this help; 'quorrel COMMAND --help' for one command
   --version           print the version
 )";
 
 const std::map<std::string, const char*> kCommandHelp = {
     {"run", R"(Usage: quorrel run FILE
-       quorrel run [--echo] [--no-warn-files] FILE
+       quorrel run [--echo] [--no-warn-files] [--strict] FILE
 
 Runs a script: one command per line; blank lines and lines starting with # are
-ignored. FILE - reads the script from standard input.
+ignored. FILE - reads the script from standard input. A UTF-8 byte-order mark at
+the start is read past, with a note on standard error.
 
   new [FIELD=VALUE]...     replace the instance; fields dims, x, y, case, wildcard,
-                           autoselect (integers) and delimiter (a quoted string)
+                           autoselect (integers) and delimiter (a quoted string);
+                           a value the setup dialog never stores (dims=7, x=-5,
+                           case=2) is kept, with a warning of what the module
+                           makes of it
   A NAME|CODE [ARG [ARG]]  call an action by name (appendString) or code (0..78);
                            prints nothing
   E NAME|CODE [ARG [ARG]]  call expression CODE (0..59) or a name such as rowList$(
@@ -65,20 +72,24 @@ one stops the run with status 1.
 
 A file action that fails (a file that cannot be opened, read, written, flushed
 or put in place) is named in a warning on standard error, with the step that
-failed; output and exit status stay the same. A script that is a directory or
-cannot be read is an error with status 1.
+failed; output and exit status stay the same unless --strict. A script that is a
+directory or cannot be read, and output that cannot be written, are errors with
+status 1.
 
-  --echo           print each E line beside its result: 12: E size(  →  3
+  --echo           print each E line beside its result: 12: E size(  ->  3
+                   (the arrow is → under a UTF-8 locale)
   --no-warn-files  no warnings about failed file actions (--warn-files, the
                    default, is still taken)
+  --strict         exit with status 1 when a file action failed
 )"},
     {"shell", R"(Usage: quorrel shell
-       quorrel shell [--echo] [--no-warn-files]
+       quorrel shell [--echo] [--no-warn-files] [--strict]
 
 Reads script commands interactively, one per line, with line editing, history
 (~/.quorrel_history) and Tab completion of commands and names on a terminal.
 Errors are reported and the session goes on; when the input is not a terminal, the
-exit status is then 2. Beside the script commands:
+exit status is then 2 (else 1 with --strict after a failed file action). Beside
+the script commands:
 help, help NAME|CODE, list, show (the current array), quit or exit. Ctrl-C
 clears the line, Ctrl-D ends. File warnings are on; --no-warn-files turns them off.
 )"},
@@ -92,7 +103,8 @@ read.
 
   --rows N     show at most N table rows or list elements (default 20 and 40)
   --all        show every row, column and element
-  --width N    cut cells at N characters (default 24; 0 never cuts)
+  --width N    cut cells at N characters, N at least 4 (default 24; 0 never
+               cuts); a cut cell ends in ...
 )"},
     {"convert", R"(Usage: quorrel convert IN OUT [--to native|host|csv|ini]
        quorrel convert [--from KIND] [--to KIND] [--force] IN OUT
