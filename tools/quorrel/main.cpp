@@ -77,7 +77,7 @@ directory or cannot be read, and output that cannot be written, are errors with
 status 1.
 
   --echo           print each E line beside its result: 12: E size(  ->  3
-                   (the arrow is → under a UTF-8 locale)
+                   (a Unicode arrow under a UTF-8 locale)
   --no-warn-files  no warnings about failed file actions (--warn-files, the
                    default, is still taken)
   --strict         exit with status 1 when a file action failed
