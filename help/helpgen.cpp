@@ -104,6 +104,52 @@ std::vector<std::string> paragraphs(const std::string& prose) {
   return result;
 }
 
+// The contents as nested lists: each menu level is named once, its groups beneath it,
+// so that a narrow column does not repeat "Recordset (2D Array) › Rows (Records) ›".
+class Contents {
+ public:
+  // A group of entries under `path`, headed by the element with id `id`; a level
+  // opened here links to the first group beneath it.
+  void add(const std::vector<std::string>& path, const std::string& id) {
+    std::size_t common = 0;
+    while (common < open_.size() && common < path.size() && open_[common].text == path[common]) {
+      ++common;
+    }
+    // A group directly under a level whose subgroups came first needs no entry of its
+    // own: it follows them on the page, and the level's entry is already listed.
+    closeTo(common);
+    for (std::size_t i = open_.size(); i < path.size(); ++i) {
+      if (!open_.empty() && !open_.back().hasList) {
+        html_ += "\n<ul>\n";
+        open_.back().hasList = true;
+      }
+      html_ += "<li><a href=\"#" + id + "\">" + escape(path[i]) + "</a>";
+      open_.push_back({path[i], false});
+    }
+  }
+
+  std::string finish() {
+    closeTo(0);
+    return html_ + "</ul>\n";
+  }
+
+ private:
+  struct Level {
+    std::string text;
+    bool hasList;
+  };
+
+  void closeTo(std::size_t depth) {
+    while (open_.size() > depth) {
+      html_ += open_.back().hasList ? "</ul></li>\n" : "</li>\n";
+      open_.pop_back();
+    }
+  }
+
+  std::vector<Level> open_;
+  std::string html_ = "<ul>\n";
+};
+
 Generated render(const Kind& kind, const quorrel::hostsim::Module& module,
                  const Descriptions& descriptions) {
   const bool action = kind.letter == 'A';
@@ -114,7 +160,7 @@ Generated render(const Kind& kind, const quorrel::hostsim::Module& module,
   std::vector<bool> seen(static_cast<std::size_t>(kind.count), false);
   std::string currentGroup;
   int groupNumber = 0;
-  out.toc = "<ul>\n";
+  Contents contents;
   for (const MenuNode& node : menu) {
     path.resize(static_cast<std::size_t>(node.depth));
     if (node.kind == MenuNode::Separator) continue;
@@ -132,9 +178,9 @@ Generated render(const Kind& kind, const quorrel::hostsim::Module& module,
       currentGroup = group;
       std::string id = std::string(kind.anchor) + "-group-" + std::to_string(++groupNumber);
       out.body += "<h4 class=\"menu\" id=\"" + id + "\">" + escape(group) + "</h4>\n";
-      out.toc += "<li><a href=\"#" + id + "\">" + escape(group) + "</a></li>\n";
+      contents.add(path.empty() ? std::vector<std::string>{group} : path, id);
     }
-    const std::string name = quorrel::tool::rowName(action, code);
+    const std::string name(quorrel::tool::nameOf(action, code));
     const auto found = descriptions.find(name);
     if (found == descriptions.end()) fail("no description for " + name);
     const Description& d = found->second;
@@ -161,7 +207,7 @@ Generated render(const Kind& kind, const quorrel::hostsim::Module& module,
     if (!d.bad.empty()) out.body += "<p class=\"bad\">Bad input: " + escape(d.bad) + "</p>\n";
     out.body += "</div>\n";
   }
-  out.toc += "</ul>\n";
+  out.toc = contents.finish();
   for (int code = 0; code < kind.count; ++code) {
     if (!seen[static_cast<std::size_t>(code)]) {
       fail("code " + std::to_string(code) + " of kind " + kind.letter + " is in no menu");

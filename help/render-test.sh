@@ -34,4 +34,36 @@ if grep -h "CONSOLE" "$work/shot.err" "$work/dom.err"; then
 fi
 grep -q 'id="a78"' "$work/dom.html" && grep -q 'id="e59"' "$work/dom.html" || {
   echo "FAIL: the rendered page lacks the last action or expression"; exit 1; }
-echo "help page rendered: $work/help.png ($(stat -c %s "$work/help.png") bytes), no console messages"
+
+# The page must read at any window width from 400 px: nothing wider than the window,
+# whatever a code line or table holds. Headless windows are at least 500 px wide, so
+# the page is measured in frames of each width (file access lets the harness look in).
+widths="400 420 600 800 1280"
+cat >"$work/widths.html" <<HTML
+<!DOCTYPE html><body><script>
+const widths = [${widths// /, }], results = [];
+for (const width of widths) {
+  const frame = document.createElement("iframe");
+  frame.width = width; frame.height = 900; frame.src = "$url";
+  frame.onload = () => {
+    const page = frame.contentDocument.documentElement;
+    results.push(width + ":" + page.scrollWidth + "/" + page.clientWidth);
+    if (results.length === widths.length) document.body.setAttribute("data-widths", results.join(" "));
+  };
+  document.body.appendChild(frame);
+}
+</script></body>
+HTML
+timeout 90 "$browser" "${flags[@]}" --allow-file-access-from-files --virtual-time-budget=10000 \
+  --dump-dom "file://$(realpath "$work/widths.html")" >"$work/widths.out" 2>"$work/widths.err"
+measured=$(grep -o 'data-widths="[^"]*"' "$work/widths.out" | cut -d'"' -f2)
+[ -n "$measured" ] || { echo "FAIL: the page could not be measured in frames"; exit 1; }
+for measure in $measured; do  # WIDTH:PAGE/WINDOW, both without the scroll bar
+  page=${measure#*:}
+  if [ "${page%/*}" -gt "${page#*/}" ]; then
+    echo "FAIL: in a ${measure%%:*} px window the page is ${page%/*} px wide: $measured"
+    exit 1
+  fi
+done
+echo "help page rendered: $work/help.png ($(stat -c %s "$work/help.png") bytes), no console" \
+  "messages, no wider than windows of $widths px"

@@ -16,9 +16,9 @@ _quorrel() {
   esac
   local options
   case $command in
-    "") COMPREPLY=($(compgen -W "run shell inspect convert list menu strings --module --help --version" -- "$cur")); return ;;
-    run) options="--echo --no-warn-files --help" ;;
-    shell) options="--echo --no-warn-files --help" ;;
+    "") COMPREPLY=($(compgen -W "run shell inspect convert list menu strings --module --ascii --help --version" -- "$cur")); return ;;
+    run) options="--echo --no-warn-files --strict --help" ;;
+    shell) options="--echo --no-warn-files --strict --help" ;;
     inspect) options="--rows --all --width --help" ;;
     convert) options="--from --to --force --help" ;;
     list) COMPREPLY=($(compgen -W "actions expressions --help" -- "$cur")); return ;;

@@ -22,9 +22,30 @@ check 1 "quorrel: cannot read /dev/zero: it is not a regular file" convert /dev/
 printf 'A 8 "x"\nA 0 "/dev/null/x.arr"\nA 0 "/dev/full"\n' >t.qs
 check 0 't.qs:2: warning: saveToFile "/dev/null/x.arr": could not open it (Not a directory)
 t.qs:3: warning: saveToFile "/dev/full": could not write it (No space left on device)' run t.qs
+# Output that cannot be written is an error, whether found while running or at the end.
+check_full() {  # command...
+  local err
+  err=$("$quorrel" "$@" 2>&1 >/dev/full)
+  local got=$?
+  if [[ $got != 1 || $err != "quorrel: cannot write standard output"* ]]; then
+    echo "quorrel $* >/dev/full: status $got, stderr '$err'; expected 1 and a message"
+    fail=1
+  fi
+}
+check_full list
+printf 'E size(\n' >size.qs
+check_full run size.qs
+# A command copied away from its module says where it looked and how to name it.
+cp "$quorrel" ./copied
+err=$(./copied list 2>&1 >/dev/null)
+if [[ $? != 1 || $err != *"$PWD/libquorrel.so"*"--module PATH"* ]]; then
+  echo "a copied quorrel: '$err'"; fail=1
+fi
 if [[ $(id -u) != 0 ]]; then
   printf 'a,b\r\n' >locked.csv && chmod 000 locked.csv
   check 1 "quorrel: cannot read locked.csv: Permission denied" inspect locked.csv
+  printf 'E size(\n' >locked.qs && chmod 000 locked.qs
+  check 1 "quorrel: cannot read locked.qs: Permission denied" run locked.qs
 else
   echo "(as root every file is readable: the unreadable-file check is skipped)"
 fi

@@ -3,11 +3,14 @@
 # with the golden files beside it.
 #   NAME.qs: `quorrel run --echo NAME.qs`, which prints each E line beside its result;
 #            stdout against NAME.out, stderr against NAME.err (no NAME.err: nothing
-#            on stderr, exit status 0; else exit status 2).
+#            on stderr, exit status 0; else exit status 2 if it reports an error, 0
+#            if it only warns).
 #   NAME.sh: run with $QUORREL set; stdout and stderr together against NAME.out,
 #            exit status 0 (the session prints the statuses it wants to check).
 # $QUORREL_EXAMPLES names the examples folder.
 set -u
+# Texts print as UTF-8 and --echo draws its arrow whatever locale the tests run in.
+export LC_ALL=C.UTF-8
 quorrel=$1 case=$2 work=$3 examples=${4:-}
 dir=$(dirname "$case")
 name=$(basename "$case")
@@ -31,7 +34,7 @@ if [[ $name == *.qs ]]; then
   expected_status=0
   err_golden=/dev/null
   if [[ -f $dir/$stem.err ]]; then
-    expected_status=2
+    grep -q ': error: ' "$dir/$stem.err" && expected_status=2
     err_golden=$dir/$stem.err
   fi
   compare "$dir/$stem.out" stdout.txt stdout

@@ -19,5 +19,19 @@ TEST(ScriptLiterals, PrintedTextsEscapeEverythingButPrintableAscii) {
   EXPECT_EQ(parseQuoted(quoteText(all)), all);
 }
 
+TEST(ScriptLiterals, Utf8FormKeepsOnlyValidPrintableCharacters) {
+  setTextForm(TextForm::Utf8);
+  // é and € pass; a lone lead byte, an overlong "/", a surrogate half and the C1
+  // control U+0085 stay escaped byte by byte.
+  EXPECT_EQ(quoteText("\xc3\xa9\xe2\x82\xac \xc3 \xc0\xaf \xed\xa0\x80 \xc2\x85"),
+            R"("é€ \xc3 \xc0\xaf \xed\xa0\x80 \xc2\x85")");
+  setTextForm(TextForm::Escaped);
+  // Cuts count characters, so "Zoë Ña..." is nine.
+  EXPECT_EQ(cutToWidth("Zoë Ñandú", 10), "Zoë Ñandú");
+  EXPECT_EQ(cutToWidth("Zoë Ñandú!", 9), "Zoë Ña...");
+  EXPECT_EQ(cutToWidth("abcdef", 4), "a...");
+  EXPECT_EQ(cutToWidth("abcdef", 0), "abcdef");
+}
+
 }  // namespace
 }  // namespace quorrel::tool

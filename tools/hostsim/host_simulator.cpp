@@ -437,16 +437,25 @@ void Instance::checkExpression(int32_t code, abi::HostWord answer, uint16_t flag
 }
 
 // ---------------------------------------------------------------------------------
-std::string defaultModulePath() {
+std::vector<std::string> defaultModulePlaces() {
   namespace fs = std::filesystem;
   const fs::path dir = fs::path(platform::programPath()).parent_path();
   const char* const name = platform::kModuleFileName;
-  std::error_code error;
-  for (const fs::path& candidate :
-       {dir / name, dir / ".." / name, dir / "../lib" / name, dir / "../src/host" / name}) {
-    if (fs::exists(candidate, error)) return candidate.lexically_normal().string();
+  std::vector<std::string> paths;
+  for (const fs::path& place :
+       {dir / name, dir / ".." / name, dir / "../src/host" / name, dir / "../lib" / name}) {
+    paths.push_back(place.lexically_normal().string());
   }
-  return (dir / name).lexically_normal().string();
+  return paths;
+}
+
+std::string defaultModulePath() {
+  std::error_code error;
+  const std::vector<std::string> places = defaultModulePlaces();
+  for (const std::string& place : places) {
+    if (std::filesystem::exists(place, error)) return place;
+  }
+  return places.front();
 }
 
 }  // namespace quorrel::hostsim

@@ -199,7 +199,10 @@ class Instance {
   std::deque<std::vector<char>> results_;  // the buffers of the last expression
 };
 
-// The module beside the executable: the install layout, then the build tree.
+// Where the module is looked for, in order: beside the executable, in the build tree
+// and in the install layout.
+std::vector<std::string> defaultModulePlaces();
+// The first of those places that exists, else the first of them.
 std::string defaultModulePath();
 
 // Standard input, output and error carry bytes as they are (Windows would translate

@@ -1,5 +1,9 @@
 #include "catalog.h"
 
+#include <algorithm>
+#include <cctype>
+#include <numeric>
+
 #include "host/abi.h"
 
 namespace quorrel::tool {
@@ -41,6 +45,37 @@ const Slots kExpressionSlots[abi::kExpressionCount] = {
 #include "host/table.inc"
 };
 
+// The meaning the table gives a parameter that the routine ignores.
+constexpr std::string_view kUnused = "not used";
+
+// A typed name reduced for comparison: lower case, without a trailing "()" or "(".
+std::string comparable(std::string_view name) {
+  if (name.ends_with("()")) name.remove_suffix(2);
+  if (name.ends_with('(')) name.remove_suffix(1);
+  std::string out(name);
+  for (char& c : out) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+  return out;
+}
+
+size_t editDistance(std::string_view a, std::string_view b) {
+  std::vector<size_t> row(b.size() + 1);
+  std::iota(row.begin(), row.end(), size_t{0});
+  for (size_t i = 1; i <= a.size(); ++i) {
+    size_t diagonal = row[0];
+    row[0] = i;
+    for (size_t j = 1; j <= b.size(); ++j) {
+      const size_t above = row[j];
+      row[j] = std::min({row[j] + 1, row[j - 1] + 1, diagonal + (a[i - 1] != b[j - 1])});
+      diagonal = above;
+    }
+  }
+  return row[b.size()];
+}
+
+int32_t countOf(bool action) {
+  return action ? abi::kActionCount : abi::kExpressionCount;
+}
+
 bool validCode(bool action, int32_t code) {
   return code >= 0 && code < (action ? abi::kActionCount : abi::kExpressionCount);
 }
@@ -57,7 +92,7 @@ std::string_view nextLine(std::string_view& text) {
 bool isRowName(std::string_view name) {
   for (bool action : {true, false}) {
     for (int32_t code = 0; validCode(action, code); ++code) {
-      if (name == rowName(action, code)) return true;
+      if (name == nameOf(action, code)) return true;
     }
   }
   return false;
@@ -85,8 +120,47 @@ std::optional<int32_t> actionCodeOfName(std::string_view name) {
   return std::nullopt;
 }
 
-const char* rowName(bool action, int32_t code) {
+std::string_view nameOf(bool action, int32_t code) {
   return action ? kActions[code].name : kExpressionNames[code];
+}
+
+std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed) {
+  const std::string wanted = comparable(typed);
+  if (wanted.empty()) return std::nullopt;
+  for (int32_t code = 0; code < countOf(action); ++code) {
+    if (nameOf(action, code) == typed) return code;
+  }
+  for (int32_t code = 0; code < countOf(action); ++code) {
+    if (comparable(nameOf(action, code)) == wanted) return code;
+  }
+  return std::nullopt;
+}
+
+std::vector<std::string> nearestNames(std::string_view typed) {
+  const std::string wanted = comparable(typed);
+  // A slip: about one key in three wrong, at least one.
+  const size_t limit = std::max<size_t>(1, (wanted.size() + 1) / 3);
+  std::vector<std::pair<size_t, std::string>> near;
+  for (const bool action : {true, false}) {
+    for (int32_t code = 0; code < countOf(action); ++code) {
+      const std::string_view name = nameOf(action, code);
+      const size_t distance = editDistance(wanted, comparable(name));
+      if (distance <= limit) near.emplace_back(distance, name);
+    }
+  }
+  std::stable_sort(near.begin(), near.end(),
+                   [](const auto& a, const auto& b) { return a.first < b.first; });
+  std::vector<std::string> names;
+  for (size_t i = 0; i < near.size() && i < 3; ++i) names.push_back(near[i].second);
+  return names;
+}
+
+std::string_view parameterMeaning(bool action, int32_t code, int param) {
+  return (action ? kActionSlots[code] : kExpressionSlots[code]).meaning[param];
+}
+
+bool parameterUnused(bool action, int32_t code, int param) {
+  return parameterMeaning(action, code, param) == kUnused;
 }
 
 std::vector<Parameter> parameters(bool action, int32_t code) {
@@ -123,8 +197,8 @@ Prose readProse(std::string_view text) {
   }
   for (bool action : {true, false}) {
     for (int32_t code = 0; validCode(action, code); ++code) {
-      if (!prose.blocks.count(rowName(action, code))) {
-        prose.problems.push_back(std::string("no description for ") + rowName(action, code));
+      if (!prose.blocks.count(nameOf(action, code))) {
+        prose.problems.push_back("no description for " + std::string(nameOf(action, code)));
       }
     }
   }
@@ -134,7 +208,7 @@ Prose readProse(std::string_view text) {
 std::optional<Description> describe(bool action, int32_t code) {
   if (!validCode(action, code)) return std::nullopt;
   static const Prose prose = readProse(kDescriptionsText);
-  const auto found = prose.blocks.find(rowName(action, code));
+  const auto found = prose.blocks.find(nameOf(action, code));
   if (found == prose.blocks.end()) return std::nullopt;
   Description description = found->second;
   for (const Parameter& parameter : parameters(action, code)) {

@@ -24,8 +24,6 @@ struct ActionEntry {
 
 const ActionEntry& actionEntry(int32_t code);
 std::optional<int32_t> actionCodeOfName(std::string_view name);
-// The row's name: an action's (appendString) or an expression's (get$().
-const char* rowName(bool action, int32_t code);
 
 // A declared parameter: a number (an integer, to an expression) or a text.
 struct Parameter {
@@ -33,6 +31,22 @@ struct Parameter {
   const char* meaning;
 };
 std::vector<Parameter> parameters(bool action, int32_t code);
+
+// The table's name of an action (appendString) or an expression (size().
+std::string_view nameOf(bool action, int32_t code);
+
+// A name as people type it: in any case, with or without the expression's "(" or
+// a "()" after it. Exact names are found first.
+std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed);
+
+// The names of either kind nearest to `typed` by edit distance, nearest first; only
+// those near enough to be a slip of the keys, at most three.
+std::vector<std::string> nearestNames(std::string_view typed);
+
+// What parameter `param` (0 or 1) is, from the table; empty when there is none.
+std::string_view parameterMeaning(bool action, int32_t code, int param);
+// A parameter the routine ignores, which a call may leave out.
+bool parameterUnused(bool action, int32_t code, int param);
 
 // The help page's words on one action or expression.
 struct Description {

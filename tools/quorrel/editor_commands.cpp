@@ -40,7 +40,11 @@ void printMenu(const std::vector<MenuItem>& items, int depth) {
 }  // namespace
 
 int menuCommand(const Module& module, const std::string& which) {
-  printMenu(module.menu(which), 0);
+  const std::vector<MenuItem> menu = module.menu(which);
+  // Empty output alone would look like a failure to read the menu.
+  if (menu.empty())
+    std::cerr << "quorrel: the " << which << " menu is empty: the object has no " << which << '\n';
+  printMenu(menu, 0);
   return 0;
 }
 

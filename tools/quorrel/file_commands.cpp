@@ -138,22 +138,20 @@ std::string displayText(const std::string& value, size_t width) {
   const bool plain =
       !value.empty() && value.front() != ' ' && value.back() != ' ' && value.front() != '"' &&
       std::all_of(value.begin(), value.end(), [](char c) { return c >= 0x20 && c <= 0x7E; });
-  std::string shown = plain ? value : quoteText(value);
-  if (width >= 4 && shown.size() > width) shown = shown.substr(0, width - 3) + "...";
-  return shown;
+  return cutToWidth(plain ? value : quoteText(value), width);
 }
 
 void printRows(const std::vector<std::vector<std::string>>& rows, std::ostream& out) {
   std::vector<size_t> widths;
   for (const auto& row : rows) {
     widths.resize(std::max(widths.size(), row.size()), 0);
-    for (size_t c = 0; c < row.size(); ++c) widths[c] = std::max(widths[c], row[c].size());
+    for (size_t c = 0; c < row.size(); ++c) widths[c] = std::max(widths[c], printedWidth(row[c]));
   }
   for (const auto& row : rows) {
     std::string line = " ";
     for (size_t c = 0; c < row.size(); ++c) {
       line += ' ' + row[c];
-      if (c + 1 < row.size()) line += std::string(widths[c] - row[c].size(), ' ');
+      if (c + 1 < row.size()) line += std::string(widths[c] - printedWidth(row[c]), ' ');
     }
     line.erase(line.find_last_not_of(' ') + 1);
     out << line << '\n';

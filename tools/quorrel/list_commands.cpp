@@ -1,5 +1,6 @@
 // `quorrel list`: every action and expression with its code, name, parameters and menu
 // path, or the help page's description of one of them.
+#include <cctype>
 #include <iostream>
 #include <map>
 #include <sstream>
@@ -90,12 +91,9 @@ void wrap(std::string_view text, std::ostream& out) {
   if (column > 0) out << '\n';
 }
 
-std::optional<Entry> find(const Module& module, std::string_view what) {
-  if (const auto code = actionCodeOfName(what)) return Entry{true, *code};
-  if (const auto code = module.expressionCodeOfName(what)) return Entry{false, *code};
-  // An expression name may be given without its "(".
-  if (const auto code = module.expressionCodeOfName(std::string(what) + "(")) {
-    return Entry{false, *code};
+std::optional<Entry> find(std::string_view what) {
+  for (const bool action : {true, false}) {
+    if (const auto code = codeOfTypedName(action, what)) return Entry{action, *code};
   }
   if (what.size() > 1 && (what[0] == 'A' || what[0] == 'E') && looksLikeInteger(what.substr(1))) {
     const bool action = what[0] == 'A';
@@ -108,6 +106,43 @@ std::optional<Entry> find(const Module& module, std::string_view what) {
     }
   }
   return std::nullopt;
+}
+
+std::string lowerCase(std::string_view text) {
+  std::string out(text);
+  for (char& c : out) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+  return out;
+}
+
+// The catalogue line of an action or expression: "A48 setLabel(text: ..., number: ...)  [menu]".
+std::string catalogLine(const Module& module, Entry e,
+                        const std::map<int32_t, std::string>& paths) {
+  const auto path = paths.find(e.code);
+  return (e.action ? "A" : "E") + std::to_string(e.code) + ' ' + nameOf(module, e) +
+         parameters(module, e, describe(e.action, e.code)) + "  [" +
+         (path == paths.end() ? "no menu" : path->second) + "]";
+}
+
+// Every entry whose name, menu path, parameters or description holds `word`, in any
+// case; returns whether there was one.
+bool printMatches(const Module& module, std::string_view word, std::ostream& out) {
+  const std::string wanted = lowerCase(word);
+  bool found = false;
+  for (const bool action : {true, false}) {
+    const auto paths = menuPaths(module, action);
+    for (int32_t code = 0; code < (action ? abi::kActionCount : abi::kExpressionCount); ++code) {
+      const Entry e{action, code};
+      const std::string line = catalogLine(module, e, paths);
+      const auto d = describe(action, code);
+      if (lowerCase(line + '\n' + (d ? d->prose + '\n' + d->bad : "")).find(wanted) ==
+          std::string::npos) {
+        continue;
+      }
+      out << line << '\n';
+      found = true;
+    }
+  }
+  return found;
 }
 
 void printOne(const Module& module, Entry e, std::ostream& out) {
@@ -145,13 +180,8 @@ void printCatalog(const Module& module, std::string_view which, std::ostream& ou
     if (which == (action ? "expressions" : "actions")) continue;
     const auto paths = menuPaths(module, action);
     const int32_t count = action ? abi::kActionCount : abi::kExpressionCount;
-    for (int32_t code = 0; code < count; ++code) {
-      const Entry e{action, code};
-      const auto path = paths.find(code);
-      out << (action ? 'A' : 'E') << code << ' ' << nameOf(module, e)
-          << parameters(module, e, describe(action, code)) << "  ["
-          << (path == paths.end() ? "no menu" : path->second) << "]\n";
-    }
+    for (int32_t code = 0; code < count; ++code)
+      out << catalogLine(module, {action, code}, paths) << '\n';
   }
 }
 
@@ -160,7 +190,7 @@ bool printDescription(const Module& module, std::string_view what, std::ostream&
     // A bare code names both an action and an expression.
     bool found = false;
     for (const char kind : {'A', 'E'}) {
-      if (const auto e = find(module, kind + std::string(what))) {
+      if (const auto e = find(kind + std::string(what))) {
         if (found) out << '\n';
         printOne(module, *e, out);
         found = true;
@@ -168,9 +198,9 @@ bool printDescription(const Module& module, std::string_view what, std::ostream&
     }
     return found;
   }
-  const auto e = find(module, what);
+  const auto e = find(what);
   if (e) printOne(module, *e, out);
-  return e.has_value();
+  return e.has_value() || (!what.empty() && printMatches(module, what, out));
 }
 
 int listCommand(const Module& module, const std::string& what) {
@@ -179,7 +209,10 @@ int listCommand(const Module& module, const std::string& what) {
     return 0;
   }
   if (!printDescription(module, what, std::cout)) {
-    throw UsageError("no action or expression is called " + what +
+    std::string near;
+    for (const std::string& name : nearestNames(what)) near += (near.empty() ? " " : ", ") + name;
+    throw UsageError("no action or expression is called " + what + " or mentions it" +
+                     (near.empty() ? "" : "; did you mean:" + near) +
                      " (quorrel list shows every name)");
   }
   return 0;

@@ -1,6 +1,9 @@
 // quorrel: a host for the Quorrel extension module on the command line.
+#include <cerrno>
 #include <cstdint>
+#include <cstdio>
 #include <cstring>
+#include <filesystem>
 #include <iostream>
 #include <map>
 #include <string>
@@ -29,23 +32,36 @@ Commands:
 Options:
   --module PATH       the extension module to load (default: the one installed or
                       built beside quorrel)
+  --ascii             print every byte of a text that is not printable ASCII as
+                      \xHH; by default valid UTF-8 prints as itself when LC_ALL,
+                      LC_CTYPE or LANG (the first one set) names UTF-8
   -h, --help          show this help; 'quorrel COMMAND --help' for one command
   --version           print the version
 )";
 
 const std::map<std::string, const char*> kCommandHelp = {
     {"run", R"(Usage: quorrel run FILE
-       quorrel run [--echo] [--no-warn-files] FILE
+       quorrel run [--echo] [--no-warn-files] [--strict] FILE
 
 Runs a script: one command per line; blank lines and lines starting with # are
-ignored. FILE - reads the script from standard input.
+ignored. FILE - reads the script from standard input. A UTF-8 byte-order mark at
+the start is read past, with a note on standard error.
 
   new [FIELD=VALUE]...     replace the instance; fields dims, x, y, case, wildcard,
-                           autoselect (integers) and delimiter (a quoted string)
+                           autoselect (integers) and delimiter (a quoted string);
+                           a value the setup dialog never stores (dims=7, x=-5,
+                           case=2) is kept, with a warning of what the module
+                           makes of it
   A NAME|CODE [ARG [ARG]]  call an action by name (appendString) or code (0..78);
                            prints nothing
   E NAME|CODE [ARG [ARG]]  call expression CODE (0..59) or a name such as rowList$(
                            and print its result: -12 or "a,b,7"
+
+A name may be typed in any case, with or without its "(", and its arguments may
+follow in parentheses, separated by commas: E labSum("qty"), E size,
+E getFromColumnRow(1, 2), A setLabel("qty", 1). An argument that the routine does
+not use (the second of findStr( ) may be left out. An unknown name is reported with
+the nearest real ones.
 
 'quorrel list' shows every name with its parameters; 'quorrel list NAME' says
 what one does. Arguments are integers or quoted strings with the escapes
@@ -56,20 +72,24 @@ one stops the run with status 1.
 
 A file action that fails (a file that cannot be opened, read, written, flushed
 or put in place) is named in a warning on standard error, with the step that
-failed; output and exit status stay the same. A script that is a directory or
-cannot be read is an error with status 1.
+failed; output and exit status stay the same unless --strict. A script that is a
+directory or cannot be read, and output that cannot be written, are errors with
+status 1.
 
-  --echo           print each E line beside its result: 12: E size(  →  3
+  --echo           print each E line beside its result: 12: E size(  ->  3
+                   (a Unicode arrow under a UTF-8 locale)
   --no-warn-files  no warnings about failed file actions (--warn-files, the
                    default, is still taken)
+  --strict         exit with status 1 when a file action failed
 )"},
     {"shell", R"(Usage: quorrel shell
-       quorrel shell [--echo] [--no-warn-files]
+       quorrel shell [--echo] [--no-warn-files] [--strict]
 
 Reads script commands interactively, one per line, with line editing, history
 (~/.quorrel_history) and Tab completion of commands and names on a terminal.
 Errors are reported and the session goes on; when the input is not a terminal, the
-exit status is then 2. Beside the script commands:
+exit status is then 2 (else 1 with --strict after a failed file action). Beside
+the script commands:
 help, help NAME|CODE, list, show (the current array), quit or exit. Ctrl-C
 clears the line, Ctrl-D ends. File warnings are on; --no-warn-files turns them off.
 )"},
@@ -83,7 +103,8 @@ read.
 
   --rows N     show at most N table rows or list elements (default 20 and 40)
   --all        show every row, column and element
-  --width N    cut cells at N characters (default 24; 0 never cuts)
+  --width N    cut cells at N characters, N at least 4 (default 24; 0 never
+               cuts); a cut cell ends in ...
 )"},
     {"convert", R"(Usage: quorrel convert IN OUT [--to native|host|csv|ini]
        quorrel convert [--from KIND] [--to KIND] [--force] IN OUT
@@ -102,11 +123,14 @@ output. Exits with status 1 when IN cannot be read or OUT cannot be written.
 
 A warning on standard error names each kind of content the target format loses.
 )"},
-    {"list", R"(Usage: quorrel list [actions|expressions|NAME|CODE]
+    {"list", R"(Usage: quorrel list [actions|expressions|NAME|CODE|WORD]
 
 Without an operand, lists every action (A) and expression (E): code, name,
-parameters with their types, and menu path. With a name (setLabel, labSum(),
-A12 or E12, or a bare code for both kinds) describes it in the help page's words.
+parameters with their types, and menu path. With a name in any case (setLabel,
+labsum, labSum(), A12 or E12, or a bare code for both kinds) describes it in the
+help page's words. Any other word lists every entry whose name, menu path,
+parameters or description contains it, in any case: quorrel list sort. Exits
+with status 2 when nothing matches, naming the nearest names.
 )"},
     {"menu", R"(Usage: quorrel menu actions|expressions|conditions
 
@@ -114,6 +138,10 @@ Prints the menu tree the editor receives, two spaces of indentation per level:
 a command as ID "Text", a submenu as "Text", a separator as -. A command or
 submenu whose state differs from the plain one shows it after the text, for
 example [grayed checked].
+
+The object has no conditions, so its conditions menu is empty: menu conditions
+prints nothing on standard output, says so on standard error and exits with
+status 0.
 )"},
     {"strings", R"(Usage: quorrel strings actions|expressions
 
@@ -128,6 +156,7 @@ struct Options {
   quorrel::tool::RunOptions run;
   bool noWarnFiles = false;
   bool help = false, version = false;
+  bool ascii = false;
   std::vector<std::pair<std::string, std::string>> owned;  // option, the command it needs
   std::vector<std::string> words;                          // the command and its operands
   std::string mistake;  // the first misuse found, reported once all is read
@@ -138,6 +167,16 @@ int32_t countOf(const std::string& option, const std::string& value) {
     throw UsageError(option + " needs a count, not '" + value + "'");
   }
   return std::stoi(value);
+}
+
+size_t widthOf(int32_t count) {
+  const size_t width = static_cast<size_t>(count);
+  if (width != 0 && width < quorrel::tool::kMinimumCutWidth) {
+    throw UsageError("--width needs 0 (never cut) or at least " +
+                     std::to_string(quorrel::tool::kMinimumCutWidth) +
+                     ": a cut cell keeps a character and ends in ...");
+  }
+  return width;
 }
 
 Options parseOptions(int argc, char** argv) {
@@ -156,6 +195,8 @@ Options parseOptions(int argc, char** argv) {
       options.help = true;
     } else if (arg == "--version") {
       options.version = true;
+    } else if (arg == "--ascii") {
+      options.ascii = true;
     } else if (name == "--module") {
       options.module = value();
     } else if (name == "--to") {
@@ -173,7 +214,7 @@ Options parseOptions(int argc, char** argv) {
         try {
           const int32_t count = countOf(name, text);
           if (name == "--rows") options.view.rows = count;
-          if (name == "--width") options.view.width = static_cast<size_t>(count);
+          if (name == "--width") options.view.width = widthOf(count);
         } catch (const UsageError& error) {
           options.mistake = error.what();
         }
@@ -186,6 +227,9 @@ Options parseOptions(int argc, char** argv) {
       options.run.echo = true;
       belongs("run");
     } else if (arg == "--warn-files") {
+      belongs("run");
+    } else if (arg == "--strict") {
+      options.run.strict = true;
       belongs("run");
     } else if (arg == "--no-warn-files") {
       options.noWarnFiles = true;
@@ -270,15 +314,46 @@ int dispatch(Options options) {
   return quorrel::tool::stringsCommand(module, words[1]);
 }
 
+// What was printed must have reached standard output: a full disk is an error. A reader
+// that went away (EPIPE) is not worth a word.
+int checkedOutput(int status) {
+  errno = 0;
+  const bool written = std::cout.flush().good() && std::fflush(stdout) == 0;
+  if (written) return status;
+  if (errno != EPIPE) {
+    std::cerr << "quorrel: cannot write standard output"
+              << (errno != 0 ? std::string(": ") + std::strerror(errno) : std::string()) << '\n';
+  }
+  return status == 0 ? 1 : status;
+}
+
+// A command copied away from its module finds none of the usual places; say which they
+// were and how to name the module instead.
+std::string whereModulesWereSought(const std::string& moduleOption) {
+  if (!moduleOption.empty()) return "";
+  std::error_code error;
+  std::string places;
+  for (const std::string& place : quorrel::tool::defaultModulePlaces()) {
+    if (std::filesystem::exists(place, error)) return "";
+    places += "\n  " + place;
+  }
+  return "quorrel: no module in the places looked at:" + places +
+         "\nName the module with --module PATH.\n";
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
   quorrel::tool::useBinaryStandardStreams();
   std::string command;
+  std::string moduleOption;
   try {
     Options options = parseOptions(argc, argv);
+    moduleOption = options.module;
     if (!options.words.empty()) command = options.words[0];
     if (!options.mistake.empty()) throw UsageError(options.mistake);
+    quorrel::tool::setTextForm(options.ascii ? quorrel::tool::TextForm::Escaped
+                                             : quorrel::tool::textFormOfEnvironment());
     if (options.version) {
       std::cout << "quorrel " QUORREL_VERSION "\n";
       return 0;
@@ -289,7 +364,7 @@ int main(int argc, char** argv) {
       return 0;
     }
     if (options.words.empty()) throw UsageError("no command given");
-    return dispatch(std::move(options));
+    return checkedOutput(dispatch(std::move(options)));
   } catch (const UsageError& error) {
     std::cerr << "quorrel: " << error.what() << "\nTry 'quorrel "
               << (kCommandHelp.count(command) ? command + " " : "") << "--help'.\n";
@@ -298,7 +373,7 @@ int main(int argc, char** argv) {
     std::cerr << "quorrel: " << error.what() << '\n';
     return 1;
   } catch (const quorrel::tool::ModuleError& error) {
-    std::cerr << "quorrel: " << error.what() << '\n';
+    std::cerr << "quorrel: " << error.what() << '\n' << whereModulesWereSought(moduleOption);
     return 1;
   }
 }

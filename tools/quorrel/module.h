@@ -7,6 +7,7 @@
 namespace quorrel::tool {
 
 using hostsim::defaultModulePath;
+using hostsim::defaultModulePlaces;
 using hostsim::ExpressionResult;
 using hostsim::Instance;
 using hostsim::MenuItem;

@@ -133,7 +133,8 @@ int shellCommand(const ModuleLoader& module, const RunOptions& options) {
   }
   if (reader.interactive()) std::cout << '\n';
   // Typed mistakes were answered on the spot; piped ones must reach the caller.
-  return hadError && !reader.interactive() ? 2 : 0;
+  if (reader.interactive()) return 0;
+  return hadError ? 2 : options.strict && session.fileActionFailed() ? 1 : 0;
 }
 
 }  // namespace quorrel::tool

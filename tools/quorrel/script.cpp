@@ -2,6 +2,7 @@
 
 #include <cctype>
 #include <charconv>
+#include <cstdlib>
 
 namespace quorrel::tool {
 namespace {
@@ -105,7 +106,69 @@ bool looksLikeName(std::string_view token) {
   return letters >= 3;
 }
 
+TextForm gTextForm = TextForm::Escaped;
+
+bool isContinuation(unsigned char byte) {
+  return (byte & 0xC0) == 0x80;
+}
+
+// The length of the valid UTF-8 sequence at the start of `bytes` that prints as a
+// character (not a C1 control), or 0.
+size_t printableUtf8Length(std::string_view bytes) {
+  const auto lead = static_cast<unsigned char>(bytes[0]);
+  const size_t length = lead >= 0xF0 ? 4 : lead >= 0xE0 ? 3 : lead >= 0xC2 ? 2 : 0;
+  if (length == 0 || lead > 0xF4 || bytes.size() < length) return 0;
+  uint32_t code = lead & (0x7F >> length);
+  for (size_t i = 1; i < length; ++i) {
+    const auto byte = static_cast<unsigned char>(bytes[i]);
+    if (!isContinuation(byte)) return 0;
+    code = code << 6 | (byte & 0x3F);
+  }
+  static constexpr uint32_t kShortest[] = {0, 0, 0x80, 0x800, 0x10000};
+  const bool valid = code >= kShortest[length] && code <= 0x10FFFF &&
+                     !(code >= 0xD800 && code <= 0xDFFF) && !(code >= 0x80 && code <= 0x9F);
+  return valid ? length : 0;
+}
+
+bool namesUtf8(std::string_view locale) {
+  std::string lower(locale);
+  for (char& c : lower) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+  return lower.find("utf-8") != std::string::npos || lower.find("utf8") != std::string::npos;
+}
+
 }  // namespace
+
+TextForm textFormOfEnvironment() {
+  for (const char* variable : {"LC_ALL", "LC_CTYPE", "LANG"}) {
+    const char* value = std::getenv(variable);
+    if (value && *value) return namesUtf8(value) ? TextForm::Utf8 : TextForm::Escaped;
+  }
+  return TextForm::Escaped;
+}
+
+void setTextForm(TextForm form) {
+  gTextForm = form;
+}
+
+TextForm textForm() {
+  return gTextForm;
+}
+
+size_t printedWidth(std::string_view printed) {
+  size_t width = 0;
+  for (char c : printed) width += !isContinuation(static_cast<unsigned char>(c));
+  return width;
+}
+
+std::string cutToWidth(std::string_view printed, size_t width) {
+  if (width < kMinimumCutWidth || printedWidth(printed) <= width) return std::string(printed);
+  // Keep width - 3 characters: stop at the first byte of the one after them.
+  size_t end = 0;
+  for (size_t kept = 0; end < printed.size(); ++end) {
+    if (!isContinuation(static_cast<unsigned char>(printed[end])) && kept++ == width - 3) break;
+  }
+  return std::string(printed.substr(0, end)) + "...";
+}
 
 std::vector<std::string> splitTokens(std::string_view line) {
   std::vector<std::string> tokens;
@@ -170,8 +233,16 @@ std::string parseQuoted(std::string_view token) {
 std::string quoteText(std::string_view bytes) {
   static constexpr char kHex[] = "0123456789abcdef";
   std::string out = "\"";
-  for (char c : bytes) {
+  for (size_t i = 0; i < bytes.size(); ++i) {
+    const char c = bytes[i];
     const auto byte = static_cast<unsigned char>(c);
+    if (byte >= 0x80 && gTextForm == TextForm::Utf8) {
+      if (const size_t length = printableUtf8Length(bytes.substr(i))) {
+        out += bytes.substr(i, length);
+        i += length - 1;
+        continue;
+      }
+    }
     switch (c) {
       case '"':
         out += "\\\"";
@@ -202,44 +273,106 @@ std::string quoteText(std::string_view bytes) {
   return out;
 }
 
+namespace {
+
+Argument parseArgument(std::string_view token) {
+  Argument arg;
+  arg.isText = isQuotedToken(token);
+  if (arg.isText) {
+    arg.text = parseQuoted(token);
+  } else {
+    arg.number = parseInteger(token);
+  }
+  return arg;
+}
+
+std::string_view trimmed(std::string_view text) {
+  const size_t start = text.find_first_not_of(" \t\r");
+  if (start == std::string_view::npos) return {};
+  return text.substr(start, text.find_last_not_of(" \t\r") - start + 1);
+}
+
+// The length of `text` when its last character closes it, a ")" outside any string;
+// otherwise npos.
+size_t closedCallLength(std::string_view text) {
+  size_t i = 0;
+  while (i < text.size() && !(text[i] == ')' && i + 1 == text.size())) {
+    i = text[i] == '"' ? skipQuoted(text, i) : i + 1;
+  }
+  return i < text.size() ? i : std::string_view::npos;
+}
+
+// "1, 2" or "\"x\"": arguments between commas outside strings, each one token.
+std::vector<Argument> parseArgumentList(std::string_view list) {
+  std::vector<Argument> args;
+  if (trimmed(list).empty()) return args;
+  for (size_t start = 0, i = 0;; ++i) {
+    if (i < list.size() && list[i] == '"') i = skipQuoted(list, i) - 1;
+    if (i < list.size() && list[i] != ',') continue;
+    const std::string_view piece = trimmed(list.substr(start, i - start));
+    const std::vector<std::string> tokens = splitTokens(piece);
+    if (tokens.size() != 1) {
+      throw ScriptError(
+          "argument " + std::to_string(args.size() + 1) +
+          (tokens.empty() ? " is missing" : " is more than one word: " + quoteText(piece)));
+    }
+    args.push_back(parseArgument(tokens[0]));
+    if (i >= list.size()) return args;
+    start = i + 1;
+  }
+}
+
+// After the name: blank-separated arguments, or a list in parentheses, as in
+// labSum("qty") or getFromColumnRow(1, 2).
+std::vector<Argument> parseArguments(std::string_view rest) {
+  if (!rest.empty() && rest.front() == '(') {
+    rest.remove_prefix(1);
+    const std::string_view call = trimmed(rest);
+    const size_t close = closedCallLength(call);
+    if (close != std::string_view::npos) return parseArgumentList(call.substr(0, close));
+  }
+  std::vector<Argument> args;
+  for (const std::string& token : splitTokens(rest)) args.push_back(parseArgument(token));
+  return args;
+}
+
+void setCodeOrName(Command& command, std::string_view word, bool isAction) {
+  if (looksLikeInteger(word) || (isAction && !looksLikeName(word))) {
+    command.code = parseInteger(word);
+    const int32_t count = isAction ? abi::kActionCount : abi::kExpressionCount;
+    if (command.code < 0 || command.code >= count) {
+      throw ScriptError((isAction ? "action code " : "expression code ") + std::string(word) +
+                        " is out of range 0.." + std::to_string(count - 1));
+    }
+  } else {
+    command.name = word;
+  }
+}
+
+}  // namespace
+
 Command parseLine(std::string_view line) {
   const size_t first = line.find_first_not_of(" \t\r");
   if (first == std::string_view::npos || line[first] == '#') return {};
-  std::vector<std::string> tokens = splitTokens(line);
   Command command;
-  const std::string& verb = tokens.front();
+  line.remove_prefix(first);
+  const std::string_view verb = line.substr(0, line.find_first_of(" \t\r"));
+  std::string_view rest = line.substr(verb.size());
   if (verb == "new") {
     command.kind = CommandKind::New;
-    for (size_t i = 1; i < tokens.size(); ++i) applyNewField(command.setup, tokens[i]);
+    for (const std::string& token : splitTokens(rest)) applyNewField(command.setup, token);
     return command;
   }
   if (verb != "A" && verb != "E") throw ScriptError("unknown command " + quoteText(verb));
   const bool isAction = verb == "A";
   command.kind = isAction ? CommandKind::Action : CommandKind::Expression;
-  if (tokens.size() < 2) {
+  rest = rest.substr(std::min(rest.size(), rest.find_first_not_of(" \t\r")));
+  const std::string_view word = rest.substr(0, rest.find_first_of(" \t\r("));
+  if (word.empty()) {
     throw ScriptError(isAction ? "A needs an action code" : "E needs an expression code or name");
   }
-  const std::string& code = tokens[1];
-  if (looksLikeInteger(code) || (isAction && !looksLikeName(code))) {
-    command.code = parseInteger(code);
-    const int32_t count = isAction ? abi::kActionCount : abi::kExpressionCount;
-    if (command.code < 0 || command.code >= count) {
-      throw ScriptError((isAction ? "action code " : "expression code ") + code +
-                        " is out of range 0.." + std::to_string(count - 1));
-    }
-  } else {
-    command.name = code;
-  }
-  for (size_t i = 2; i < tokens.size(); ++i) {
-    Argument arg;
-    arg.isText = isQuotedToken(tokens[i]);
-    if (arg.isText) {
-      arg.text = parseQuoted(tokens[i]);
-    } else {
-      arg.number = parseInteger(tokens[i]);
-    }
-    command.args.push_back(std::move(arg));
-  }
+  setCodeOrName(command, word, isAction);
+  command.args = parseArguments(rest.substr(word.size()));
   return command;
 }
 

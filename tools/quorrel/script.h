@@ -44,8 +44,28 @@ bool looksLikeInteger(std::string_view token);
 int32_t parseInteger(std::string_view token);
 std::string parseQuoted(std::string_view token);
 
+// How quoteText prints what is not printable ASCII: every such byte as \xHH, or valid
+// UTF-8 as itself (control characters and invalid bytes are still escaped).
+enum class TextForm { Escaped, Utf8 };
+
+// Utf8 when the first of LC_ALL, LC_CTYPE and LANG that is set names UTF-8, as a
+// terminal's locale does; only the variables are read, so the answer is the same
+// wherever the program runs.
+TextForm textFormOfEnvironment();
+// The form of every quoteText in the process; Escaped until set.
+void setTextForm(TextForm form);
+TextForm textForm();
+
 // The printed form of a text result: "..." with non-printing bytes escaped.
 std::string quoteText(std::string_view bytes);
+
+// The characters of printed text: a UTF-8 sequence counts as one.
+size_t printedWidth(std::string_view printed);
+// Printed text cut to at most `width` characters, the last three "..." when cut;
+// a width of 0 never cuts, and the cut never splits a character.
+std::string cutToWidth(std::string_view printed, size_t width);
+// The narrowest width cutToWidth cuts at: room for a character and the "...".
+inline constexpr size_t kMinimumCutWidth = 4;
 
 // Parses one line; blank lines and comments give CommandKind::Empty.
 Command parseLine(std::string_view line);

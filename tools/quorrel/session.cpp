@@ -5,6 +5,7 @@
 #include <cstring>
 #include <filesystem>
 #include <fstream>
+#include <tuple>
 
 namespace quorrel::tool {
 namespace {
@@ -30,6 +31,77 @@ void checkArguments(const Signature& signature, const std::vector<Argument>& arg
   }
 }
 
+// "; did you mean: size(, sum(" for a name that is close to real ones.
+std::string suggestion(std::string_view typed) {
+  const std::vector<std::string> near = nearestNames(typed);
+  if (near.empty()) return "";
+  std::string text = "; did you mean:";
+  for (size_t i = 0; i < near.size(); ++i) text += (i == 0 ? " " : ", ") + near[i];
+  return text;
+}
+
+int32_t codeOfName(bool action, const std::string& typed) {
+  if (const auto code = codeOfTypedName(action, typed)) return *code;
+  if (const auto other = codeOfTypedName(!action, typed)) {
+    throw ScriptError(std::string(nameOf(!action, *other)) + " is " +
+                      (action ? "an expression: E " : "an action: A ") +
+                      std::string(nameOf(!action, *other)));
+  }
+  throw ScriptError((action ? "unknown action " : "unknown expression ") + quoteText(typed) +
+                    suggestion(typed) + " (quorrel list " + (action ? "actions" : "expressions") +
+                    " shows every name)");
+}
+
+// Parameters the routine ignores may be left out at the end; they are passed as 0.
+std::vector<Argument> withUnusedFilled(bool action, int32_t code, const Signature& signature,
+                                       std::vector<Argument> args, uint16_t textType) {
+  for (int i = static_cast<int>(args.size()); i < signature.paramCount; ++i) {
+    if (!parameterUnused(action, code, i)) break;
+    Argument zero;
+    zero.isText = signature.paramTypes[i] == textType;
+    args.push_back(zero);
+  }
+  return args;
+}
+
+// Editors on Windows like to begin a UTF-8 file with a byte-order mark; it is not a
+// command. A UTF-16 script cannot be read as lines of bytes at all.
+void skipByteOrderMark(std::string& line, const std::string& name, std::ostream& err) {
+  constexpr std::string_view kUtf8Mark = "\xEF\xBB\xBF";
+  if (line.starts_with(kUtf8Mark)) {
+    line.erase(0, kUtf8Mark.size());
+    err << name << ": note: the script begins with a UTF-8 byte-order mark, read past\n";
+  } else if (line.starts_with("\xFF\xFE") || line.starts_with("\xFE\xFF")) {
+    throw ScriptError("the script is UTF-16 text; save it as UTF-8");
+  }
+}
+
+// What the module makes of a setup field the setup dialog never stores; empty when
+// the dialog could have stored it.
+std::vector<std::string> oddSetupFields(const SetupFields& setup) {
+  std::vector<std::string> odd;
+  if (setup.dims < 1 || setup.dims > 3) {
+    odd.push_back("dims=" + std::to_string(setup.dims) +
+                  ": the setup dialog stores 1, 2 or 3; the module makes the array "
+                  "one-dimensional");
+  }
+  for (const auto& [name, value] : {std::pair{"x", setup.x}, {"y", setup.y}}) {
+    if (value < 0) {
+      odd.push_back(std::string(name) + '=' + std::to_string(value) +
+                    ": the setup dialog stores no boundary below 0; the module leaves it 0");
+    }
+  }
+  for (const auto& [name, value, means] : {std::tuple{"case", setup.caseSensitive, "on"},
+                                           {"wildcard", setup.wildcard, "on"},
+                                           {"autoselect", setup.autoSelect, "off"}}) {
+    if (value != 0 && value != 1) {
+      odd.push_back(std::string(name) + '=' + std::to_string(value) +
+                    ": the setup dialog stores 0 or 1; the module takes it as " + means);
+    }
+  }
+  return odd;
+}
+
 }  // namespace
 
 Instance& Session::instance() {
@@ -53,11 +125,13 @@ constexpr const char* kFailedSteps[] = {"",
                                         "wrote nothing (no such element, or more cells "
                                         "than the format holds)"};
 
-void Session::warnAboutFile(int32_t code, const std::vector<Argument>& args, const Where& where) {
+void Session::checkFileAction(int32_t code, const std::vector<Argument>& args, const Where& where) {
   const ActionEntry& entry = actionEntry(code);
-  if (entry.file == FileUse::None || !warnings_) return;
+  if (entry.file == FileUse::None) return;
   const auto status = module_.get().fileStatus();
   if (!status || status->first == 0) return;
+  fileActionFailed_ = true;
+  if (!options_.warnFiles || !warnings_) return;
   const auto step = static_cast<size_t>(status->first);
   *warnings_ << where.file << ':' << where.line << ": warning: " << entry.name << ' '
              << quoteText(args[entry.pathParam].text) << ": "
@@ -71,41 +145,38 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
     case CommandKind::Empty:
       return;
     case CommandKind::New:
+      // A stored record may hold anything and the module absorbs it, which is worth
+      // running; the setup dialog would not have written such a value.
+      for (const std::string& odd : oddSetupFields(command.setup)) {
+        if (warnings_)
+          *warnings_ << where.file << ':' << where.line << ": warning: " << odd << '\n';
+      }
       replaceInstance(command.setup);
       return;
     case CommandKind::Action: {
-      int32_t code = command.code;
-      if (!command.name.empty()) {
-        const auto named = actionCodeOfName(command.name);
-        if (!named) {
-          throw ScriptError("unknown action " + quoteText(command.name) +
-                            " (quorrel list actions shows every name)");
-        }
-        code = *named;
-      }
-      const std::string what = "action " + std::to_string(code);
-      checkArguments(module_.get().actionSignature(code), command.args, what,
-                     abi::kActionParamText);
-      instance().callAction(code, command.args);
-      if (options_.warnFiles) warnAboutFile(code, command.args, where);
+      const int32_t code = command.name.empty() ? command.code : codeOfName(true, command.name);
+      const Signature signature = module_.get().actionSignature(code);
+      const std::vector<Argument> args =
+          withUnusedFilled(true, code, signature, command.args, abi::kActionParamText);
+      checkArguments(signature, args, "action " + std::to_string(code), abi::kActionParamText);
+      instance().callAction(code, args);
+      checkFileAction(code, args, where);
       return;
     }
     case CommandKind::Expression: {
-      int32_t code = command.code;
-      if (!command.name.empty()) {
-        const auto named = module_.get().expressionCodeOfName(command.name);
-        if (!named) throw ScriptError("unknown expression " + quoteText(command.name));
-        code = *named;
-      }
-      const std::string what = "expression " + std::to_string(code);
-      checkArguments(module_.get().expressionSignature(code), command.args, what,
+      const int32_t code = command.name.empty() ? command.code : codeOfName(false, command.name);
+      const Signature signature = module_.get().expressionSignature(code);
+      const std::vector<Argument> args =
+          withUnusedFilled(false, code, signature, command.args, abi::kExpressionParamText);
+      checkArguments(signature, args, "expression " + std::to_string(code),
                      abi::kExpressionParamText);
-      const ExpressionResult result = instance().callExpression(code, command.args);
+      const ExpressionResult result = instance().callExpression(code, args);
       if (options_.echo) {
         std::string_view text = where.text;
         text.remove_prefix(std::min(text.size(), text.find_first_not_of(" \t")));
         text = text.substr(0, text.find_last_not_of(" \t\r") + 1);
-        out << where.line << ": " << text << "  \xe2\x86\x92  ";
+        out << where.line << ": " << text
+            << (textForm() == TextForm::Utf8 ? "  \xe2\x86\x92  " : "  ->  ");
       }
       out << (result.isText ? quoteText(result.text) : std::to_string(result.number)) << '\n';
       return;
@@ -119,14 +190,16 @@ int runScript(const ModuleLoader& module, std::istream& in, const std::string& n
   std::string line;
   for (int lineNumber = 1; std::getline(in, line); ++lineNumber) {
     try {
+      if (lineNumber == 1) skipByteOrderMark(line, name, err);
       session.execute(parseLine(line), out, {name, lineNumber, line});
     } catch (const ScriptError& error) {
       out.flush();
       err << name << ':' << lineNumber << ": error: " << error.what() << '\n';
       return 2;
     }
+    if (!out) return 1;
   }
-  return 0;
+  return options.strict && session.fileActionFailed() ? 1 : 0;
 }
 
 }  // namespace quorrel::tool

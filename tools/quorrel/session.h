@@ -18,6 +18,7 @@ namespace quorrel::tool {
 struct RunOptions {
   bool echo = false;       // print each E line beside its result
   bool warnFiles = false;  // warn about file paths an action cannot use; changes nothing else
+  bool strict = false;     // a failed file action makes the exit status 1
 };
 
 // Where a command came from, for --echo and warnings.
@@ -40,16 +41,22 @@ class Session {
   Instance& instance();
   void replaceInstance(const SetupFields& setup);
 
+  // Whether a file action has failed since the session began.
+  bool fileActionFailed() const { return fileActionFailed_; }
+
  private:
-  void warnAboutFile(int32_t code, const std::vector<Argument>& args, const Where& where);
+  void checkFileAction(int32_t code, const std::vector<Argument>& args, const Where& where);
 
   const ModuleLoader& module_;
   RunOptions options_;
   std::ostream* warnings_;
   std::unique_ptr<Instance> instance_;
+  bool fileActionFailed_ = false;
 };
 
 // Runs a whole script; reports the first error as "NAME:LINE: error: WHAT" and returns 2.
+// Returns 1 when `out` fails (the caller says why) or, with options.strict, when a
+// file action failed.
 int runScript(const ModuleLoader& module, std::istream& in, const std::string& name,
               std::ostream& out, std::ostream& err, const RunOptions& options = {});
 

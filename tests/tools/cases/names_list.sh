@@ -5,7 +5,7 @@ q list
 q list setLabel
 q list 17
 q list labSum
-q list nothing
+q list lunchbox
 cat >named.qs <<'QS'
 new x=2 autoselect=1
 A setLabel "qty" 1

@@ -1,0 +1,15 @@
+# Texts print as UTF-8 under a UTF-8 locale and escaped otherwise; cells are cut by
+# characters; a byte-order mark is read past; exit statuses for files and --strict.
+q() { "$QUORREL" "$@"; echo "status $?"; }
+printf '\xef\xbb\xbfnew dims=1\nA appendString "Zo\xc3\xab \xc3\x91and\xc3\xba \xe2\x82\xac9"\n' >t.qs
+printf 'A appendString "bad \xff\xc3\x01"\nA saveToFile "t.arr"\nE get$( 0\n' >>t.qs
+q run --echo t.qs
+LC_ALL=C q run --echo t.qs 2>/dev/null
+q --ascii run t.qs 2>/dev/null
+q inspect --width 12 t.arr | tail -3
+q inspect --width 3 t.arr
+printf '\xff\xfeA\0' | q run -
+# A failed file action is a warning, and status 1 with --strict.
+printf 'A loadFromCsv "none.csv"\n' >f.qs
+q run --strict --no-warn-files f.qs
+q run .
