@@ -23,9 +23,7 @@ std::string state(ElementArray& a) {
 
 // A 2-column table of 3 rows, the middle one selected.
 ElementArray table() {
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 2);
+  ElementArray a = shaped(2, 2);
   for (int i = 0; i < 6; ++i) a.appendValue(i);
   a.rowStates[1] = RowSelected;
   return a;

@@ -9,18 +9,6 @@
 namespace quorrel {
 namespace {
 
-using States = std::vector<uint8_t>;
-constexpr uint8_t S = RowSelected;
-constexpr uint8_t U = RowUnselected;
-
-// An empty two-dimensional table of three columns.
-ElementArray threeColumns() {
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, 3);
-  return a;
-}
-
 // The resize written out step by step with single inserts and deletes.
 void resizeStepByStep(ElementArray& a, int32_t d, int32_t n) {
   if (n < 1 || d < 0 || d >= a.dimensions()) return;
@@ -80,7 +68,7 @@ TEST(Dimensions, ResizeMatchesSingleStepsOnRandomArrays) {
 // States belong to positions, not rows: edits that change the row count drop or add
 // positions at the end, new ones from the automatic selection; key setters change none.
 TEST(RowStates, StatesBelongToPositionsNotRows) {
-  ElementArray a = threeColumns();
+  ElementArray a = shaped(2, 3);
   EXPECT_EQ(a.indexOfDimIndex(nullptr), 0);  // no list at all reads as index 0
   a.settings.autoSelectNewRows = true;
   for (int i = 1; i <= 6; ++i) a.appendValue(i);
@@ -113,7 +101,7 @@ TEST(RowStates, StatesBelongToPositionsNotRows) {
 // Whatever happens, there is exactly one state per table row.
 TEST(RowStates, AlwaysOnePerTableRow) {
   std::mt19937 random(7);
-  ElementArray a = threeColumns();
+  ElementArray a = shaped(2, 3);
   for (int step = 0; step < 3000; ++step) {
     const int32_t pick = static_cast<int32_t>(random() % 100);
     const int32_t index = static_cast<int32_t>(random() % 40) - 2;

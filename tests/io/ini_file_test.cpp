@@ -7,20 +7,6 @@ namespace {
 
 using IniFile = IoTest;
 
-// Every element as key=value: "~" for a None value, "#n" for a number; keys must be texts.
-std::string entriesOf(ElementArray& a) {
-  std::string out;
-  for (int32_t i = 0; i < a.size(); ++i) {
-    const Element& e = a.at(i);
-    EXPECT_EQ(e.hasKey() ? e.key()->type() : ElementType::None, ElementType::String) << i;
-    out += (i == 0 ? "" : "|") + std::string(e.hasKey() ? a.getKeyString(i) : "") + "=";
-    out += e.type() == ElementType::None    ? "~"
-           : e.type() == ElementType::Value ? "#" + std::to_string(e.number())
-                                            : std::string(a.getString(i));
-  }
-  return out;
-}
-
 TEST_F(IniFile, SavesOneSectionWithALinePerElement) {
   ElementArray a;
   a.appendString("a");

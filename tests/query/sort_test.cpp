@@ -11,15 +11,10 @@
 
 #include "models.h"
 #include "query/sort_detail.h"
+#include "support/array_text.h"
 
 namespace quorrel {
 namespace {
-
-std::vector<std::string> texts(ElementArray& array) {
-  std::vector<std::string> out;
-  for (int32_t i = 0; i < array.size(); ++i) out.emplace_back(array.getString(i));
-  return out;
-}
 
 std::vector<int32_t> keyIds(const ElementArray& array) {
   std::vector<int32_t> out;
@@ -27,20 +22,18 @@ std::vector<int32_t> keyIds(const ElementArray& array) {
   return out;
 }
 
-using Texts = std::vector<std::string>;
-
 // Ranges are clipped to the array; swaps outside it change nothing and keys travel.
 TEST(SortElements, RangesAndSwaps) {
   ElementArray array = arrayOf({"e", "d", "c", "b", "a"});
   sortElementRange(array, SortByText, 0, 1, 3);
-  EXPECT_EQ(texts(array), (Texts{"e", "b", "c", "d", "a"}));
+  EXPECT_EQ(contents(array), "e|b|c|d|a");
   sortElementRange(array, SortByText, 0, -5, 99);  // clipped to the array
-  EXPECT_EQ(texts(array), (Texts{"a", "b", "c", "d", "e"}));
+  EXPECT_EQ(contents(array), "a|b|c|d|e");
   array.setKeyValue(7, 0);
   swapElements(array, 0, 4);
   swapElements(array, 0, 5);
   swapElements(array, -1, 0);
-  EXPECT_EQ(texts(array), (Texts{"e", "b", "c", "d", "a"}));
+  EXPECT_EQ(contents(array), "e|b|c|d|a");
   EXPECT_EQ(array.getKeyValue(4), 7);
 }
 

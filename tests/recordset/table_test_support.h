@@ -12,17 +12,12 @@
 
 namespace quorrel {
 
-inline constexpr uint8_t S = RowSelected;
-inline constexpr uint8_t U = RowUnselected;
-using States = std::vector<uint8_t>;
 using Texts = std::vector<std::string>;
 
 // A two-dimensional table of the given width, filled from delimited lists.
 inline ElementArray makeTable(int32_t columns, std::initializer_list<const char*> rows = {},
                               int32_t autoSelect = 1) {
-  ElementArray a;
-  a.setDimensions(2);
-  a.setBoundary(1, columns);
+  ElementArray a = shaped(2, columns);
   a.settings.autoSelectNewRows = autoSelect;
   for (const char* row : rows) appendRowFromList(a, row);
   return a;
