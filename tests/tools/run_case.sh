@@ -6,7 +6,7 @@
 #            on stderr, exit status 0; else exit status 2).
 #   NAME.sh: run with $QUORREL set; stdout and stderr together against NAME.out,
 #            exit status 0 (the session prints the statuses it wants to check).
-# $QUORREL_EXAMPLES names the examples folder.
+# $QUORREL_EXAMPLES names the examples folder. The sessions share the helpers below.
 set -u
 quorrel=$1 case=$2 work=$3 examples=${4:-}
 dir=$(dirname "$case")
@@ -24,6 +24,14 @@ compare() {  # golden actual label
     fail=1
   fi
 }
+
+# q runs the command and prints its exit status; run runs the script on standard
+# input, bad the lines given; dump prints a file's size and bytes.
+q() { "$QUORREL" "$@"; echo "status $?"; }
+run() { cat >s.qs; q run s.qs; }
+bad() { printf '%s\n' "$@" >bad.qs; q run bad.qs; }
+dump() { echo "$1: $(wc -c <"$1") bytes"; od -An -tx1 -v "$1"; }
+export -f q run bad dump
 
 if [[ $name == *.qs ]]; then
   "$quorrel" run --echo "$name" >stdout.txt 2>stderr.txt
