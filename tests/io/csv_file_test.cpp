@@ -6,19 +6,10 @@ namespace quorrel {
 namespace {
 
 using CsvFile = IoTest;
-TEST_F(CsvFile, SavesTableRowsWithEmptyCellsAsTwoQuotes) {
-  ElementArray a = shaped(2, 2);
-  a.appendString("name");
-  a.appendString("age");
-  a.appendValue(7);
-  EXPECT_EQ(saved(saveCsvFile, a), "name,age\r\n7,\"\"\r\n");
-  ElementArray b;
-  loadCsvFile(b, path("out").c_str(), LoadReplace);
-  EXPECT_EQ(b.dimensions(), 2);
-  EXPECT_EQ(b.boundary(1), 2);
-  EXPECT_EQ(contents(b), "name|age|7|");
-  EXPECT_EQ(b.at(3).size(), 1);
 
+// A table saved and loaded back is the file_csv case's; an empty cell read as a String
+// of size 1 is the model's (text_loaders_model_test).
+TEST_F(CsvFile, SavesTableRowsWithEmptyCellsAsTwoQuotes) {
   // One dimension, or a zero width, is one line; an empty table is an empty file.
   ElementArray c;
   EXPECT_EQ(saved(saveCsvFile, c), "\r\n");
