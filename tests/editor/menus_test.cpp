@@ -62,23 +62,26 @@ TEST(EditorStrings, LengthsCutsAndTablesEnds) {
   GetActionTitle(nullptr, 44, 0, small, 5);  // cut to the buffer, terminator included
   EXPECT_STREQ(small, "Sort");
 
-  // No conditions, so no condition strings; nor strings past the tables.
-  EXPECT_EQ(GetConditionString(nullptr, 0, buffer, sizeof buffer), 0);
-  EXPECT_EQ(GetActionString(nullptr, 79, buffer, sizeof buffer), 0);
-  EXPECT_EQ(GetExpressionString(nullptr, 60, buffer, sizeof buffer), 0);
-
-  EXPECT_EQ(GetActionString(nullptr, 6, buffer, sizeof buffer), 28);
-  EXPECT_EQ(GetActionString(nullptr, 6, buffer, 10), 9);
-  EXPECT_STREQ(buffer, "11%s: Ins");
-  EXPECT_EQ(GetActionString(nullptr, 6, buffer, 1), 0);
-  EXPECT_STREQ(buffer, "");
-  EXPECT_EQ(GetExpressionString(nullptr, 39, buffer, 6), 5);
-  EXPECT_STREQ(buffer, "index");
-  // The size counts in 16 bits, the code in its low 16 bits.
-  EXPECT_EQ(GetActionString(nullptr, 6, buffer, 0x1000A), 9);
-  EXPECT_STREQ(buffer, "11%s: Ins");
-  EXPECT_EQ(GetExpressionString(nullptr, 0x20000, buffer, sizeof buffer), 5);
-  EXPECT_STREQ(buffer, "size(");
+  // A string's answer is its length as written: cut to the buffer, terminator included;
+  // the size counts in 16 bits and the code in its low 16 bits. No conditions, so no
+  // condition strings, nor strings past the tables.
+  const struct {
+    abi::GetStringFn get;
+    int32_t code, size, answer;
+    const char* text;
+  } strings[] = {{GetActionString, 6, 256, 28, nullptr},
+                 {GetActionString, 6, 10, 9, "11%s: Ins"},
+                 {GetActionString, 6, 1, 0, ""},
+                 {GetExpressionString, 39, 6, 5, "index"},
+                 {GetActionString, 6, 0x1000A, 9, "11%s: Ins"},
+                 {GetExpressionString, 0x20000, 256, 5, "size("},
+                 {GetConditionString, 0, 256, 0, ""},
+                 {GetActionString, 79, 256, 0, ""},
+                 {GetExpressionString, 60, 256, 0, ""}};
+  for (const auto& s : strings) {
+    EXPECT_EQ(s.get(nullptr, s.code, buffer, s.size), s.answer) << s.code << " " << s.size;
+    EXPECT_STREQ(s.text == nullptr ? buffer : s.text, buffer) << s.code << " " << s.size;
+  }
 
   // Object information: four strings; the fifth does not exist, so the answer is 0.
   char name[255], author[255], copyright[255], comment[255], extra[255];

@@ -12,6 +12,7 @@
 #include "models.h"
 #include "query/sort_detail.h"
 #include "support/array_text.h"
+#include "support/partition_sort.h"
 
 namespace quorrel {
 namespace {
@@ -68,30 +69,19 @@ TEST(CompareElements, AbsentElementsKindsAndBytes) {
   }
 }
 
-// The sort written out step by step: slots modelled as element ids, the pivot held
-// as an element, recursion on the left part and a loop on the right part.
+// The element sort step by step: slots modelled as element ids, the middle one the pivot.
 void referenceSort(const ElementArray& original, std::vector<int32_t>& slots, SortKind kind,
                    bool descending, int32_t lo, int32_t hi) {
-  while (hi > lo) {
-    const int32_t pivot = slots[static_cast<std::size_t>((lo + hi) / 2)];
-    auto compare = [&](int32_t slot) {
-      return compareElements(original, &original.at(slots[static_cast<std::size_t>(slot)]),
-                             &original.at(pivot), kind);
-    };
-    int32_t i = lo;
-    int32_t j = hi;
-    for (;;) {
-      while (descending ? compare(i) > 0 : compare(i) < 0) ++i;
-      while (descending ? compare(j) < 0 : compare(j) > 0) --j;
-      if (i > j) break;
-      std::swap(slots[static_cast<std::size_t>(i)], slots[static_cast<std::size_t>(j)]);
-      ++i;
-      --j;
-      if (j < i) break;
-    }
-    referenceSort(original, slots, kind, descending, lo, j);
-    lo = i;
-  }
+  const auto at = [&](int32_t i) { return &original.at(slots[static_cast<std::size_t>(i)]); };
+  partitionSort(
+      lo, hi, [&](int32_t l, int32_t h) { return at((l + h) / 2); },
+      [&](int32_t i, const Element* pivot) {
+        const int32_t order = compareElements(original, at(i), pivot, kind);
+        return descending ? (order < 0) - (order > 0) : order;
+      },
+      [&](int32_t i, int32_t j) {
+        std::swap(slots[static_cast<std::size_t>(i)], slots[static_cast<std::size_t>(j)]);
+      });
 }
 
 void fillRandom(ElementArray& array, std::mt19937& rng, int count) {

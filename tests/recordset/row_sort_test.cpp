@@ -5,6 +5,7 @@
 #include <functional>
 #include <random>
 
+#include "support/partition_sort.h"
 #include "table_test_support.h"
 
 namespace quorrel {
@@ -22,32 +23,23 @@ TEST(RowSort, CompareCellAgainstAPivotText) {
 
 // --- Against a direct transcription of the partition steps ------------------------------
 
-void referenceRowSort(ElementArray& a, int32_t column, int32_t kind, bool descending, int32_t lo,
-                      int32_t hi) {
-  const int32_t sign = descending ? -1 : 1;
-  while (hi > lo) {
-    const std::string pivot = a.getString(cellIndex(a, lo, column));
-    int32_t i = lo;
-    int32_t j = hi;
-    for (;;) {
-      while (sign * compareCell(a, i, column, pivot.c_str(), kind) < 0) ++i;
-      while (sign * compareCell(a, j, column, pivot.c_str(), kind) > 0) --j;
-      if (i > j) break;
-      swapRows(a, i, j);
-      ++i;
-      --j;
-      if (j < i) break;
-    }
-    referenceRowSort(a, column, kind, descending, lo, j);
-    lo = i;
-  }
+// The row sort step by step: the first row of a range holds the pivot.
+void referenceRowSort(ElementArray& a, int32_t column, int32_t kind, bool descending) {
+  partitionSort(
+      0, a.tableRowCount() - 1,
+      [&](int32_t lo, int32_t) { return std::string(a.getString(cellIndex(a, lo, column))); },
+      [&](int32_t i, const std::string& pivot) {
+        const int32_t order = compareCell(a, i, column, pivot.c_str(), kind);
+        return descending ? (order < 0) - (order > 0) : order;
+      },
+      [&](int32_t i, int32_t j) { swapRows(a, i, j); });
 }
 
 // Sorts the table, and its copy by the transcription, on column 0; column 1 holds the
 // row's identity, so the order of equal rows shows.
 void expectSameAsReference(ElementArray& a, ElementArray& copy, int32_t kind, bool descending,
                            const std::string& what) {
-  referenceRowSort(copy, 0, kind, descending, 0, copy.tableRowCount() - 1);
+  referenceRowSort(copy, 0, kind, descending);
   sortRows(a, 0, kind, descending);
   ASSERT_EQ(columnTexts(a, 1), columnTexts(copy, 1))
       << what << " kind " << kind << " descending " << descending << " case "
