@@ -88,6 +88,7 @@ TEST_F(TextLoaders, AgreeWithTheirModelsOnRandomTexts) {
     SCOPED_TRACE(csv);
     ElementArray table = loaded(loadCsvFile, csv);
     const auto [width, cells] = csvModel(csv);
+    EXPECT_EQ(table.dimensions(), 2);
     EXPECT_EQ(table.boundary(1), width);
     EXPECT_EQ(contents(table), cells);
 
