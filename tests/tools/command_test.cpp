@@ -1,10 +1,35 @@
-// RFC 4180 CSV and JSON strings, without the module.
-#include "text_formats.h"
-
+// The quorrel command's own parts, without the module (the cases pin the rest end to
+// end): action names, printed script texts, RFC 4180 CSV and JSON strings.
 #include <gtest/gtest.h>
+
+#include "catalog.h"
+#include "host/abi.h"
+#include "script.h"
+#include "text_formats.h"
 
 namespace quorrel::tool {
 namespace {
+
+TEST(Catalog, EveryActionNameIsUniqueAndFindsItsCode) {
+  for (int32_t code = 0; code < abi::kActionCount; ++code) {
+    EXPECT_EQ(actionCodeOfName(actionEntry(code).name), code) << actionEntry(code).name;
+  }
+  EXPECT_FALSE(actionCodeOfName("SetLabel"));
+  EXPECT_FALSE(actionCodeOfName(""));
+  EXPECT_FALSE(describe(true, abi::kActionCount));
+}
+
+TEST(ScriptLiterals, PrintedTextsEscapeEverythingButPrintableAscii) {
+  EXPECT_EQ(quoteText("a,b,7"), R"("a,b,7")");
+  EXPECT_EQ(quoteText(" ~"), R"(" ~")");
+  EXPECT_EQ(quoteText("\"\\\n\r\t"), R"("\"\\\n\r\t")");
+  EXPECT_EQ(quoteText(std::string("\x01\x1f\x7f\x80\xc3\xa9\xff")),
+            R"("\x01\x1f\x7f\x80\xc3\xa9\xff")");
+  // Every byte but 0 reads back as itself from its printed form.
+  std::string all;
+  for (int byte = 1; byte < 256; ++byte) all += static_cast<char>(byte);
+  EXPECT_EQ(parseQuoted(quoteText(all)), all);
+}
 
 TEST(Rfc4180, ReadsQuotesDoubledQuotesAndLineBreaks) {
   const struct {
