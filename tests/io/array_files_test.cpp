@@ -24,9 +24,7 @@ const std::string kNativeExample =
 const std::string kHead = kMagic + le16(1) + le32(1) + le32(0);
 
 ElementArray exampleArray() {
-  ElementArray a = shaped(2, 3);
-  a.appendString("ab");
-  a.appendValue(7);
+  ElementArray a = with(shaped(2, 3), {"ab", "#7"});
   a.setKeyString("k", 1);
   return a;
 }
@@ -126,9 +124,7 @@ TEST_F(NativeFile, LoadThenSaveReproducesTheFile) {
 TEST_F(NativeFile, TruncatedExampleLoadsWhatItHolds) {
   for (size_t n = 0; n <= kNativeExample.size(); ++n) {
     SCOPED_TRACE(n);
-    ElementArray old;
-    old.appendString("old");
-    ElementArray a = loaded(loadNativeFile, kNativeExample.substr(0, n), std::move(old));
+    ElementArray a = loaded(loadNativeFile, kNativeExample.substr(0, n), with({}, {"old"}));
     EXPECT_EQ(a.dimensions(), n >= 11 ? 2 : 0);
     EXPECT_EQ(a.boundaryEntry(1), n >= 15 ? 3 : 0);
     const int32_t records = n > 45 ? 2 : (n > 30 ? 1 : 0);
@@ -194,10 +190,7 @@ const std::string kHostExample =
 
 TEST_F(HostArrayFile, WritesTheExampleByteForByte) {
   ASSERT_EQ(kHostExample.size(), 48u);
-  ElementArray a = shaped(3, 2, 2);
-  a.appendString("a");
-  a.appendValue(5);
-  a.appendString("");
+  ElementArray a = with(shaped(3, 2, 2), {"a", "#5", ""});
   a.setKeyString("key", 0);
   EXPECT_EQ(saved(saveHostArrayFile, a), kHostExample);
   EXPECT_EQ(a.settings.fileMode, FileModeTruncate);
@@ -297,8 +290,7 @@ TEST_F(HostArrayFile, NumberCellsAreSavedAsText) {
 TEST_F(HostArrayFile, TruncatedExampleLoadsWhatItHolds) {
   for (size_t n = 0; n <= kHostExample.size(); ++n) {
     SCOPED_TRACE(n);
-    ElementArray old;
-    old.appendString("old");
+    ElementArray old = with({}, {"old"});
     old.labels = LabelList{"keep"};
     ElementArray a = loaded(loadHostArrayFile, kHostExample.substr(0, n), std::move(old));
     EXPECT_EQ(a.labels, LabelList{"keep"});

@@ -29,10 +29,7 @@ std::string blockText(const ByteBuffer& b) {
 }
 
 TEST_F(ElementFile, WritesExactlyTheElementsBytes) {
-  ElementArray a;
-  a.appendString("abc");
-  a.appendValue(258);
-  a.appendValue(-2);
+  ElementArray a = with({}, {"abc", "#258", "#-2"});
   a.appendFile({"\0x\0", 3});
   a.appendValue(0);
   const auto savedElement = [&](int32_t index, FileMode mode = FileModeTruncate) {
@@ -132,12 +129,7 @@ class SaveFileTest : public IoTest {
     return st.st_mode & 07777;
   }
   // An array whose saves differ from every old file used here.
-  static ElementArray fresh() {
-    ElementArray a;
-    a.appendString("new");
-    a.appendValue(7);
-    return a;
-  }
+  static ElementArray fresh() { return with({}, {"new", "#7"}); }
 };
 
 TEST_F(SaveFileTest, ReplacesTheTargetKeepingItsPermissionsLinksAndFolder) {

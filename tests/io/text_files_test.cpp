@@ -21,9 +21,7 @@ TEST_F(CsvFile, SavesTableRowsWithEmptyCellsAsTwoQuotes) {
   // One dimension, or a zero width, is one line; an empty table is an empty file.
   ElementArray c;
   EXPECT_EQ(saved(saveCsvFile, c), "\r\n");
-  c.appendString("a");
-  c.appendValue(0);
-  c.appendValue(-5);
+  c = with(std::move(c), {"a", "#0", "#-5"});
   c.appendFile({"bin", 3});
   EXPECT_EQ(saved(saveCsvFile, c), "a,\"\",-5,\"\"\r\n");
   c.setDimensions(2);  // X boundary still 0
@@ -37,9 +35,7 @@ TEST_F(CsvFile, SavesTableRowsWithEmptyCellsAsTwoQuotes) {
   EXPECT_TRUE(exists(path("out")));
 
   // Cells are taken as they stand: delimiters and line breaks inside them are not quoted.
-  ElementArray s;
-  s.appendString("x,y");
-  s.appendString("l1\nl2");
+  ElementArray s = with({}, {"x,y", "l1\nl2"});
   EXPECT_EQ(saved(saveCsvFile, s), "x,y,l1\nl2\r\n");
 }
 
@@ -99,10 +95,8 @@ TEST_F(CsvFile, LoadThenSaveWritesEveryRowAtFullWidth) {
 }
 
 TEST_F(IniFile, SavesOneSectionWithALinePerElement) {
-  ElementArray a;
-  a.appendString("a");
+  ElementArray a = with({}, {"a", "#5"});
   a.setKeyString("k1", 0);
-  a.appendValue(5);
   EXPECT_EQ(saved(saveIniFile, a), "[ZUBArray]\r\nk1=a\r\n=5\r\n\r\n");
   ElementArray b = shaped(2, 3);
   b.labels = LabelList{"l"};

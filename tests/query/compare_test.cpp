@@ -152,7 +152,7 @@ std::vector<int32_t> keyIds(const ElementArray& array) {
 
 // Ranges are clipped to the array; swaps outside it change nothing and keys travel.
 TEST(SortElements, RangesAndSwaps) {
-  ElementArray array = arrayOf({"e", "d", "c", "b", "a"});
+  ElementArray array = with({}, {"e", "d", "c", "b", "a"});
   sortElementRange(array, SortByText, 0, 1, 3);
   EXPECT_EQ(contents(array), "e|b|c|d|a");
   sortElementRange(array, SortByText, 0, -5, 99);  // clipped to the array

@@ -2,6 +2,8 @@
 // compare arrays at once.
 #pragma once
 
+#include <cstdlib>
+#include <initializer_list>
 #include <string>
 #include <vector>
 
@@ -19,6 +21,13 @@ inline ElementArray shaped(int32_t dimensions, int32_t x = 0, int32_t y = 0) {
   a.setDimensions(dimensions);
   if (x != 0) a.setBoundary(1, x);
   if (y != 0) a.setBoundary(2, y);
+  return a;
+}
+
+// The array with texts, and numbers written as "#n" ("#0" stores None), appended.
+inline ElementArray with(ElementArray a, std::initializer_list<const char*> items) {
+  for (const char* item : items)
+    item[0] == '#' ? a.appendValue(std::atoi(item + 1)) : a.appendString(item);
   return a;
 }
 
