@@ -44,9 +44,7 @@ TEST_F(NativeFile, WritesTheExampleAndTheEmptyArrayByteForByte) {
   EXPECT_EQ(empty.settings.fileMode, FileModeAppend);
   EXPECT_EQ(saved(saveNativeFile, empty, FileModeTruncate), expected);
 
-  ElementArray b = shaped(3, 4, 5);
-  b.appendValue(0);
-  b.appendString("");
+  ElementArray b = with(shaped(3, 4, 5), {"#0", ""});
   b.appendFile({"x\0y", 3});
   b.setKeyValue(-2, 2);
   EXPECT_EQ(saved(saveNativeFile, b),
@@ -73,18 +71,6 @@ TEST_F(NativeFile, LabelsTravelAndLengthZeroLeavesAColumnAlone) {
   ElementArray d = shaped(2, 2);
   loadNativeFile(d, path("out").c_str(), LoadAppend);
   EXPECT_EQ(d.labels, (LabelList{"name", std::nullopt}));
-}
-
-TEST_F(NativeFile, AppendAddsAtTheEndAndKeepsDimensions) {
-  ElementArray a = shaped(3, 5, 6);
-  for (int i = 1; i <= 5; ++i) a.appendValue(i);
-  a = loaded(loadNativeFile, kNativeExample, std::move(a), LoadAppend);
-  EXPECT_EQ(contents(a), "#1|#2|#3|#4|#5|ab|#7");
-  EXPECT_EQ(a.dimensions(), 3);
-  EXPECT_EQ(a.boundary(1), 5);
-  EXPECT_EQ(a.boundary(2), 6);
-  EXPECT_FALSE(a.at(4).hasKey());
-  EXPECT_STREQ(a.getKeyString(6), "k");
 }
 
 // Files that cannot be used are the file_unusable script case's; versions 0 and 0xFFFF
@@ -200,9 +186,7 @@ TEST_F(HostArrayFile, WritesTheExampleByteForByte) {
             head(2, 2, 2, 2, 2) + le32(1) + "a" + le32(1) + "5" + std::string(24, '\0'));
 
   // Zero sizes count as one.
-  ElementArray b;  // one dimension: X and Y are 0
-  b.appendValue(-12);
-  b.appendString("xy");
+  ElementArray b = with({}, {"#-12", "xy"});  // one dimension: X and Y are 0
   EXPECT_EQ(saved(saveHostArrayFile, b),
             head(2, 1, 1, 3, 2) + le32(3) + "-12" + le32(2) + "xy" + le32(0));
   ElementArray empty = shaped(2, 3);
@@ -240,8 +224,7 @@ TEST_F(HostArrayFile, MoreCellsThanAnArrayHoldsWriteNothing) {
   a.setBoundary(2, 65536);  // 2^32 cells: wraps to 0 in 32 bits
   saveHostArrayFile(a, path("square.arr").c_str(), FileModeTruncate);
   EXPECT_FALSE(exists(path("square.arr")));
-  a.appendString("b");
-  a.appendString("c");
+  a = with(std::move(a), {"b", "c"});
   a.setBoundary(1, INT32_MAX);
   a.setBoundary(2, INT32_MAX);  // X × Y wraps to 1, so Z = size + 1 = 4: X × Y × Z > 2^63
   saveHostArrayFile(a, path("huge.arr").c_str(), FileModeTruncate);
@@ -267,13 +250,27 @@ TEST_F(HostArrayFile, ByteLessCellsUpToTheLimit) {
   EXPECT_EQ(a.boundary(1), 4097);
 }
 
-TEST_F(HostArrayFile, AppendKeepsDimensions) {
-  ElementArray a = shaped(2, 7);
-  a.appendValue(1);
-  a = loaded(loadHostArrayFile, kHostExample, std::move(a), LoadAppend);
-  EXPECT_EQ(contents(a), "#1|a|5|~|~");
-  EXPECT_EQ(a.dimensions(), 2);
-  EXPECT_EQ(a.boundary(1), 7);
+// An appending load of either format adds after the array's own elements, which keep
+// their keys, and leaves the array's dimensions and boundaries.
+TEST_F(HostArrayFile, AppendingLoadsOfBothFormatsKeepTheArraysShape) {
+  const struct {
+    FileStatus (*load)(ElementArray&, const char*, LoadMode);
+    const std::string& bytes;
+    const char *added, *key3;
+  } cases[] = {{loadNativeFile, kNativeExample, "|ab|#7", "k"},
+               {loadHostArrayFile, kHostExample, "|a|5|~|~", nullptr}};
+  for (const auto& c : cases) {
+    ElementArray a = with(shaped(3, 5, 6), {"#1", "#2"});
+    a.setKeyString("k1", 0);
+    a = loaded(c.load, c.bytes, std::move(a), LoadAppend);
+    EXPECT_EQ(contents(a), "#1|#2" + std::string(c.added));
+    EXPECT_EQ(a.dimensions(), 3);
+    EXPECT_EQ(a.boundary(1), 5);
+    EXPECT_EQ(a.boundary(2), 6);
+    EXPECT_STREQ(a.getKeyString(0), "k1");
+    EXPECT_FALSE(a.at(1).hasKey());
+    EXPECT_STREQ(a.getKeyString(3), c.key3);
+  }
 }
 
 // Number cells come back as Values and go out again as their decimal text.

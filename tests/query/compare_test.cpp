@@ -166,9 +166,7 @@ TEST(SortElements, RangesAndSwaps) {
 }
 
 TEST(CompareElements, AbsentElementsKindsAndBytes) {
-  ElementArray array;
-  array.appendValue(10);
-  array.appendValue(9);
+  ElementArray array = with({}, {"#10", "#9"});
   const char low[2] = {'a', '\x01'};
   const char high[2] = {'a', '\x80'};
   array.appendFile({low, 2});

@@ -2,7 +2,7 @@
 
 #include <gtest/gtest.h>
 
-#include <climits>
+#include "support/array_text.h"
 
 namespace quorrel {
 namespace {
@@ -13,9 +13,7 @@ const char kFileBytes[3] = {'f', '\0', 'g'};
 // (listed as nothing, element or key), None keys, a missing delimiter and a delimiter
 // between every pair even when empty.
 TEST(Lists, FileBytesNoneKeysAndDelimiters) {
-  ElementArray array;
-  array.appendValue(INT32_MIN);
-  array.appendString("x");
+  ElementArray array = with({}, {"#-2147483648", "x"});
   array.appendFile({kFileBytes, 3});
   array.appendString("");
   array.setKeyFile({kFileBytes, 3}, 0);
