@@ -39,7 +39,8 @@ std::string randomText(std::mt19937& rng, std::size_t maxLength) {
   return s;
 }
 
-// A probe that often occurs in the text: a piece of it with some letters flipped.
+// A probe that often occurs in the text: a piece of it with some letters flipped and
+// some characters made wildcards.
 std::string probeFor(std::mt19937& rng, const std::string& text, std::size_t maxLength) {
   if (rng() % 3 == 0 || text.empty()) return randomText(rng, maxLength);
   const std::size_t from = rng() % text.size();
@@ -48,7 +49,7 @@ std::string probeFor(std::mt19937& rng, const std::string& text, std::size_t max
     if (rng() % 4 == 0 && ((c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'))) c ^= 0x20;
     // The case bit of a character that is not a letter makes a different character.
     if (rng() % 12 == 0) c ^= 0x20;
-    if (rng() % 8 == 0) c = '?';
+    if (rng() % 8 == 0) c = "?*"[rng() % 2];
   }
   return piece;
 }
