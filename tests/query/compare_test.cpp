@@ -1,5 +1,5 @@
-// Comparisons of texts, patterns and elements, and the element sorts built on them
-// against the partition steps written out.
+// Comparisons of texts, patterns and elements, the element sorts built on them against
+// the partition steps written out, and the element, key and pair lists.
 #include <gtest/gtest.h>
 
 #include <cstdint>
@@ -11,6 +11,7 @@
 
 #include "models.h"
 #include "query/compare.h"
+#include "query/lists.h"
 #include "query/sort.h"
 #include "query/sort_detail.h"
 #include "support/array_text.h"
@@ -265,6 +266,34 @@ TEST(SortElements, KeylessNumbersMatchTheStepByStepSort) {
       ASSERT_EQ(array.at(i).type(), value == 0 ? ElementType::None : ElementType::Value);
     }
   }
+}
+
+const char kFileBytes[3] = {'f', '\0', 'g'};
+
+// The lists script case covers texts, values, None and quoting; these add file bytes
+// (listed as nothing, element or key), None keys, a missing delimiter and a delimiter
+// between every pair even when empty.
+TEST(Lists, FileBytesNoneKeysAndDelimiters) {
+  ElementArray array = with({}, {"#-2147483648", "x"});
+  array.appendFile({kFileBytes, 3});
+  array.appendString("");
+  array.setKeyFile({kFileBytes, 3}, 0);
+  array.setKeyValue(0, 1);  // a None key lists as nothing and pairs as the empty key
+  array.setKeyString("q'", 3);
+  EXPECT_EQ(elementList(array, "<->"), "-2147483648<->x<-><->");
+  EXPECT_EQ(elementList(array, nullptr), "-2147483648x");
+  EXPECT_EQ(quotedElementList(array, ";"), "-2147483648;'x';;''");
+  EXPECT_EQ(keyList(array, ","), ",,,q'");
+  EXPECT_EQ(quotedKeyList(array, "|"), "|||'q''");
+  // Every keyed Value or String pairs, its key read as text (None and File as nothing).
+  EXPECT_EQ(pairList(array, "=", ";"), "=-2147483648;=x;q'=");
+  EXPECT_EQ(quotedPairList(array, " => ", ", "), " => -2147483648,  => 'x', q' => ''");
+  EXPECT_EQ(quotedPairList(array, "", ""), "-2147483648'x'q'''");
+
+  ElementArray empty;
+  EXPECT_EQ(elementList(empty, ","), "");
+  EXPECT_EQ(quotedKeyList(empty, ","), "");
+  EXPECT_EQ(pairList(empty, "=", ";"), "");
 }
 
 }  // namespace
