@@ -1,14 +1,20 @@
-// The portable menu, string and dialog services the module exports, with the
-// answers the Windows functions of the same names give.
+// The portable menu, string, dialog and resource services the module exports, with the
+// answers the Windows functions of the same names give; the pictures the resource script
+// names (the editor shows them beside the object); and the setup dialog through
+// CreateObject and EditObject with the headless dialog playing the author.
 #include <gtest/gtest.h>
 
 #include <cstring>
+#include <fstream>
 #include <functional>
+#include <iterator>
 #include <string>
 #include <vector>
 
+#include "host/entry_points.h"
 #include "platform/headless_dialog.h"
 #include "platform/windows_services.h"
+#include "support/setup_dialog.h"
 
 namespace quorrel::editor_test {
 namespace {
@@ -46,12 +52,11 @@ TEST(PortableMenus, BuildReadAndRelease) {
   EXPECT_STREQ(text, "Sub");
   EXPECT_EQ(GetMenuStringA(top, 3, nullptr, 0, MF_BYPOSITION), 4);  // the length
 
-  // Destroying the top takes the submenu along; stale handles are refused.
+  // Destroying the top takes the submenu along (a destroyed menu's handle is refused as
+  // EntryLayer.StaleMenuHandlesNameNothing checks).
   EXPECT_TRUE(DestroyMenu(top));
-  EXPECT_FALSE(DestroyMenu(top));
   EXPECT_FALSE(DestroyMenu(sub));
   EXPECT_EQ(GetMenuItemCount(sub), -1);
-  EXPECT_FALSE(AppendMenuA(top, MF_STRING, 1, "x"));
 }
 
 TEST(PortableMenus, ResourceMenus) {
@@ -208,6 +213,87 @@ TEST(HeadlessDialog, FieldsNumbersAndUserSlot) {
     EXPECT_EQ(IsDlgButtonChecked(dialog, 1010), static_cast<UINT>(BST_CHECKED));
     EXPECT_FALSE(CheckDlgButton(dialog, 1009, BST_CHECKED));  // not a button
   });
+}
+
+// 32 x 32 pixels, 16 colours (4 bits per pixel), uncompressed: a 14-byte file header
+// ("BM", 630 bytes, pixels at 118), then a 40-byte information header (width, height,
+// one plane, bit count, compression 0), a 16-entry palette and 16 bytes per row.
+TEST(ResourceScript, BitmapsAreSmallSixteenColourPictures) {
+  const std::string head(
+      "BM\x76\x02\0\0\0\0\0\0\x76\0\0\0"
+      "\x28\0\0\0\x20\0\0\0\x20\0\0\0\x01\0\x04\0\0\0\0\0",
+      34);
+  for (const char* name : {"quorrel400.bmp", "quorrel401.bmp"}) {
+    std::ifstream in(std::string(QUORREL_RESOURCE_DIR) + "/" + name, std::ios::binary);
+    const std::string picture{std::istreambuf_iterator<char>(in), {}};
+    EXPECT_EQ(picture.size(), 14u + 40u + 16u * 4u + 32u * 16u) << name;
+    EXPECT_EQ(picture.substr(0, head.size()), head) << name;
+  }
+}
+
+// The setup dialog through CreateObject and EditObject, with the headless dialog
+// playing the author: the scenarios shared with the Windows test, and what only the
+// headless services can tell (a disabled field refuses typing, a dialog nobody answers).
+using namespace quorrel::setup_dialog_test;
+
+class HeadlessDriver : public Driver {
+ public:
+  HeadlessDriver() {
+    createObject = CreateObject;
+    editObject = EditObject;
+  }
+  // Plays `act` in every dialog opened during `call`.
+  int32_t withAuthor(const Act& act, const std::function<int32_t()>& call) override {
+    QuorrelSetDialogScript([](HWND dialog, void* a) { (*static_cast<const Act*>(a))(dialog); },
+                           const_cast<Act*>(&act));
+    const int32_t answer = call();
+    QuorrelSetDialogScript(nullptr, nullptr);
+    return answer;
+  }
+  void click(HWND dialog, int id) override {
+    EXPECT_TRUE(QuorrelDialogClick(dialog, id)) << "click " << id;
+  }
+  void type(HWND dialog, int id, const std::string& text) override {
+    EXPECT_TRUE(QuorrelDialogType(dialog, id, text.c_str())) << "type into " << id;
+  }
+  void setText(HWND dialog, int id, const std::string& text) override {
+    SetDlgItemTextA(dialog, id, text.c_str());
+  }
+  void press(HWND dialog, int key) override { EXPECT_TRUE(QuorrelDialogKey(dialog, key)); }
+  bool isOpen(HWND dialog) override { return QuorrelDialogIsOpen(dialog); }
+  void check(bool ok, const std::string& what) override { EXPECT_TRUE(ok) << what; }
+};
+
+TEST(SetupDialog, SharedScenarios) {
+  HeadlessDriver driver;
+  runAllScenarios(driver);
+}
+
+TEST(SetupDialog, DisabledFieldsTakeNoTyping) {
+  HeadlessDriver driver;
+  Record record = storedRecord({1, 10, 10, 0, 0, 0});
+  driver.edit(record, [](HWND dialog) {
+    EXPECT_FALSE(QuorrelDialogType(dialog, kX, "9"));
+    EXPECT_FALSE(QuorrelDialogType(dialog, kY, "9"));
+    QuorrelDialogClick(dialog, kOk);
+  });
+  EXPECT_EQ(fieldsOf(record), (Ints{1, 10, 10, 0, 0, 0}));
+}
+
+TEST(SetupDialog, AnUnansweredDialogIsCancelled) {
+  HeadlessDriver driver;
+  EditorContext editor(driver);
+  Record record = storedRecord({3, 1, 2, 0, 0, 0});
+  const Record before = record;
+  // No author: the dialog is left with Escape.
+  EXPECT_EQ(EditObject(editor.get(), 0, 0, record.data()), 0);
+  EXPECT_EQ(record, before);
+  Record fresh{};
+  EXPECT_EQ(CreateObject(editor.get(), 0, fresh.data()), -1);
+  EXPECT_EQ(readInt(fresh, abi::kSetupDimensionCount), 2);
+  // Without a record there is nothing to edit.
+  EXPECT_EQ(EditObject(editor.get(), 0, 0, nullptr), 0);
+  EXPECT_EQ(CreateObject(editor.get(), 0, nullptr), -1);
 }
 
 }  // namespace

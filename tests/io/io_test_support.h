@@ -58,13 +58,19 @@ class IoTest : public ::testing::Test {
   std::filesystem::path dir_;
 };
 
-// An array of the given dimensions and first boundaries.
-inline ElementArray shaped(int32_t dimensions, int32_t x = 0, int32_t y = 0) {
-  ElementArray a;
-  a.setDimensions(dimensions);
-  if (x != 0) a.setBoundary(1, x);
-  if (y != 0) a.setBoundary(2, y);
-  return a;
+// Every element as key=value, as INI files hold them: "~" for a None value, "#n" for a number; keys
+// must be texts.
+inline std::string entriesOf(ElementArray& a) {
+  std::string out;
+  for (int32_t i = 0; i < a.size(); ++i) {
+    const Element& e = a.at(i);
+    EXPECT_EQ(e.hasKey() ? e.key()->type() : ElementType::None, ElementType::String) << i;
+    out += (i == 0 ? "" : "|") + std::string(e.hasKey() ? a.getKeyString(i) : "") + "=";
+    out += e.type() == ElementType::None    ? "~"
+           : e.type() == ElementType::Value ? "#" + std::to_string(e.number())
+                                            : std::string(a.getString(i));
+  }
+  return out;
 }
 
 // Little-endian field builders for hand-made files.

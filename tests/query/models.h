@@ -1,8 +1,6 @@
 // Plain reference models shared by the query tests.
 #pragma once
 
-#include <cstdlib>
-#include <initializer_list>
 #include <string>
 #include <vector>
 
@@ -48,21 +46,6 @@ inline bool patternMatches(const std::string& pattern, const std::string& text,
     }
   }
   return at(p.size(), t.size()) != 0;
-}
-
-// Texts, and numbers written as "#n" ("#0" stores None); keyed elements get the keys
-// 1, 2, ... in their first order.
-inline ElementArray arrayOf(std::initializer_list<const char*> items, bool keyed = false) {
-  ElementArray array;
-  for (const char* item : items) {
-    if (item[0] == '#') {
-      array.appendValue(std::atoi(item + 1));
-    } else {
-      array.appendString(item);
-    }
-    if (keyed) array.setKeyValue(array.size(), array.size() - 1);
-  }
-  return array;
 }
 
 }  // namespace quorrel

@@ -1,11 +1,35 @@
-// Reading a whole array back as one text, for tests that compare arrays at once.
+// Building small arrays and reading a whole array back as one text, for tests that
+// compare arrays at once.
 #pragma once
 
+#include <cstdlib>
+#include <initializer_list>
 #include <string>
+#include <vector>
 
 #include "array/element_array.h"
 
 namespace quorrel {
+
+inline constexpr uint8_t S = RowSelected;
+inline constexpr uint8_t U = RowUnselected;
+using States = std::vector<uint8_t>;
+
+// An array of the given dimensions and first boundaries.
+inline ElementArray shaped(int32_t dimensions, int32_t x = 0, int32_t y = 0) {
+  ElementArray a;
+  a.setDimensions(dimensions);
+  if (x != 0) a.setBoundary(1, x);
+  if (y != 0) a.setBoundary(2, y);
+  return a;
+}
+
+// The array with texts, and numbers written as "#n" ("#0" stores None), appended.
+inline ElementArray with(ElementArray a, std::initializer_list<const char*> items) {
+  for (const char* item : items)
+    item[0] == '#' ? a.appendValue(std::atoi(item + 1)) : a.appendString(item);
+  return a;
+}
 
 // The element's own bytes (a String's with its terminator), for comparisons.
 inline std::string contentOf(const Element& e) {

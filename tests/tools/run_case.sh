@@ -7,7 +7,7 @@
 #            if it only warns).
 #   NAME.sh: run with $QUORREL set; stdout and stderr together against NAME.out,
 #            exit status 0 (the session prints the statuses it wants to check).
-# $QUORREL_EXAMPLES names the examples folder.
+# $QUORREL_EXAMPLES names the examples folder. The sessions share the helpers below.
 set -u
 # Texts print as UTF-8 and --echo draws its arrow whatever locale the tests run in.
 export LC_ALL=C.UTF-8
@@ -27,6 +27,14 @@ compare() {  # golden actual label
     fail=1
   fi
 }
+
+# q runs the command and prints its exit status; run runs the script on standard
+# input, bad the lines given; dump prints a file's size and bytes.
+q() { "$QUORREL" "$@"; echo "status $?"; }
+run() { cat >s.qs; q run s.qs; }
+bad() { printf '%s\n' "$@" >bad.qs; q run bad.qs; }
+dump() { echo "$1: $(wc -c <"$1") bytes"; od -An -tx1 -v "$1"; }
+export -f q run bad dump
 
 if [[ $name == *.qs ]]; then
   "$quorrel" run --echo "$name" >stdout.txt 2>stderr.txt

@@ -1,6 +1,4 @@
 # The command line: misuse exits 2, unreadable files and modules exit 1.
-q() { "$QUORREL" "$@"; echo "status $?"; }
-
 q
 q frobnicate
 q run
@@ -25,5 +23,4 @@ for c in "" run shell inspect convert menu strings; do
   echo "status ${PIPESTATUS[0]}"
 done
 # The shell goes on after an error, ends at the end of its input and then exits 2.
-printf 'E 0\nbad line\nA 9 5\nE 0\nE 2 0\n' | "$QUORREL" shell
-echo "status $?"
+printf 'E 0\nbad line\nA 9 5\nE 0\nE 2 0\n' | q shell

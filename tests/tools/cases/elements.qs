@@ -46,23 +46,6 @@ E get$( 7
 A deleteAll
 E size(
 E capacity(
-# Capacity grows by half when the size passes half of it.
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-A appendValue 1
-E capacity(
-A appendValue 1
-E capacity(
-E size(
 # Texts read as numbers as atol reads them in the C locale: blanks, one sign, then
 # digits up to the first other character, saturating at the int32 limits; 0xA0 is
 # not a blank.

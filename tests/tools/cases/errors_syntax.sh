@@ -1,7 +1,5 @@
 # Mistakes found in the script text itself: each script stops at its first one and
 # reports FILE:LINE; blank and comment lines count as lines.
-bad() { printf '%s\n' "$@" >bad.qs; "$QUORREL" run bad.qs; echo "status $?"; }
-
 bad '# a comment' '' 'frobnicate 1'
 bad 'a 1'
 bad '   ' 'A'
@@ -33,9 +31,9 @@ bad 'new y=4z'
 bad 'new delimiter=;'
 bad 'new delimiter="a' 
 bad "new delimiter=\"$(printf '%01024d' 0)\""
-printf 'A 8 "a\0b"\n' >bad.qs; "$QUORREL" run bad.qs; echo "status $?"
+printf 'A 8 "a\0b"\n' >bad.qs; q run bad.qs
 # Integers span exactly int32 with an optional sign and leading zeros; strings take
 # every escape; tabs separate tokens and a line may end in CR LF.
 printf '%s\r\n' 'A 9 -2147483648' 'A 9 +2147483647' $'A 9\t007' 'A 9 -0' \
   'A 8 "a\\b\"c\n\r\t"' 'A 8 "\x41\xfF\x01"' 'A 8 ""' 'A +06 "x" 0' 'E list$( "|"' >good.qs
-"$QUORREL" run --echo good.qs; echo "status $?"
+q run --echo good.qs

@@ -1,7 +1,4 @@
 # CSV saved byte for byte, loaded with padding of short rows, appended.
-dump() { echo "$1: $(wc -c <"$1") bytes"; od -An -tx1 -v "$1"; }
-run() { cat >s.qs; "$QUORREL" run s.qs; echo "status $?"; }
-
 echo "== csv"
 printf 'a\n\nb,c,d\r\ne,f' >rows.csv
 run <<'QS'

@@ -1,7 +1,4 @@
 # Single elements written to files, and whole files read into elements.
-dump() { echo "$1: $(wc -c <"$1") bytes"; od -An -tx1 -v "$1"; }
-run() { cat >s.qs; "$QUORREL" run s.qs; echo "status $?"; }
-
 echo "== element files"
 : >empty.bin
 run <<'QS'

@@ -1,7 +1,4 @@
 # The host array file: text cells written, text and number cells read.
-dump() { echo "$1: $(wc -c <"$1") bytes"; od -An -tx1 -v "$1"; }
-run() { cat >s.qs; "$QUORREL" run s.qs; echo "status $?"; }
-
 echo "== host"
 printf 'CNC ARRAY\0\x02\0\0\0\x02\0\0\0\x01\0\0\0\x01\0\0\0\x01\0\0\0\x07\0\0\0\0\0\0\0' >num.mmf
 run <<'QS'

@@ -1,7 +1,4 @@
 # INI saved byte for byte and read back, with comments, bare keys and sections.
-dump() { echo "$1: $(wc -c <"$1") bytes"; od -An -tx1 -v "$1"; }
-run() { cat >s.qs; "$QUORREL" run s.qs; echo "status $?"; }
-
 echo "== ini"
 printf 'junk=1\r\n[S]\r\n// c\r\n  key = v \r\nflag\r\nx\r\nx=\r\n[Other] z\r\na=b=c\r\n' >in.ini
 run <<'QS'

@@ -1,7 +1,4 @@
 # The native array file saved byte for byte, loaded and appended.
-dump() { echo "$1: $(wc -c <"$1") bytes"; od -An -tx1 -v "$1"; }
-run() { cat >s.qs; "$QUORREL" run s.qs; echo "status $?"; }
-
 echo "== native"
 run <<'QS'
 new x=3

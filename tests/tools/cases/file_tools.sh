@@ -1,6 +1,5 @@
 # The file tools' safety and reach: folders, - for standard input and output, refused
 # overwrites, one warning per kind of loss, RFC 4180 CSV and JSON.
-q() { "$QUORREL" "$@"; echo "status $?"; }
 mkdir adir
 q inspect adir
 q convert adir o.csv

@@ -1,6 +1,5 @@
 # inspect on native array files: a table with labels, a list with keys and types,
 # long contents cut short, and files that cannot be read.
-q() { "$QUORREL" "$@"; echo "status $?"; }
 {
   echo 'new x=9'
   for i in $(seq 198); do echo 'A 8 "x"'; done

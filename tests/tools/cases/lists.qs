@@ -60,11 +60,6 @@ A sortValuesAscending
 E list$( ","
 A sortStringsDescending
 E list$( ","
-A deleteAll
-A appendValue 2147483647
-A appendValue 1
-E sum(
-E max(
 # Totals: sums wrap and the average divides the wrapped sum, truncating toward zero.
 new dims=1
 A appendValue 2147483647

@@ -1,6 +1,5 @@
 # Actions by name, the list of every action and expression, one entry's description,
 # --echo and --warn-files, and the shell's own commands with piped input.
-q() { "$QUORREL" "$@"; echo "status $?"; }
 q list
 q list setLabel
 q list 17

@@ -1,7 +1,6 @@
 # convert through all four formats and inspect each file on the way: native with
 # labels and a key, CSV (texts only), INI (keys, no dimensions), host (3D, no keys)
 # and back to native.
-q() { "$QUORREL" "$@"; echo "status $?"; }
 cat >make.qs <<'QS'
 new x=3
 A appendString "ann"

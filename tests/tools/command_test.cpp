@@ -1,0 +1,89 @@
+// The quorrel command's own parts, without the module (the cases pin the rest end to
+// end): action names, printed script texts, RFC 4180 CSV and JSON strings.
+#include <gtest/gtest.h>
+
+#include "catalog.h"
+#include "host/abi.h"
+#include "script.h"
+#include "text_formats.h"
+
+namespace quorrel::tool {
+namespace {
+
+TEST(Catalog, EveryActionNameIsUniqueAndFindsItsCode) {
+  for (int32_t code = 0; code < abi::kActionCount; ++code) {
+    EXPECT_EQ(actionCodeOfName(actionEntry(code).name), code) << actionEntry(code).name;
+  }
+  EXPECT_FALSE(actionCodeOfName("SetLabel"));
+  EXPECT_FALSE(actionCodeOfName(""));
+  EXPECT_FALSE(describe(true, abi::kActionCount));
+}
+
+TEST(ScriptLiterals, PrintedTextsEscapeEverythingButPrintableAscii) {
+  EXPECT_EQ(quoteText("a,b,7"), R"("a,b,7")");
+  EXPECT_EQ(quoteText(" ~"), R"(" ~")");
+  EXPECT_EQ(quoteText("\"\\\n\r\t"), R"("\"\\\n\r\t")");
+  EXPECT_EQ(quoteText(std::string("\x01\x1f\x7f\x80\xc3\xa9\xff")),
+            R"("\x01\x1f\x7f\x80\xc3\xa9\xff")");
+  // Every byte but 0 reads back as itself from its printed form.
+  std::string all;
+  for (int byte = 1; byte < 256; ++byte) all += static_cast<char>(byte);
+  EXPECT_EQ(parseQuoted(quoteText(all)), all);
+}
+
+TEST(ScriptLiterals, Utf8FormKeepsOnlyValidPrintableCharacters) {
+  setTextForm(TextForm::Utf8);
+  // é and € pass; a lone lead byte, an overlong "/", a surrogate half and the C1
+  // control U+0085 stay escaped byte by byte.
+  EXPECT_EQ(quoteText("\xc3\xa9\xe2\x82\xac \xc3 \xc0\xaf \xed\xa0\x80 \xc2\x85"),
+            R"("é€ \xc3 \xc0\xaf \xed\xa0\x80 \xc2\x85")");
+  setTextForm(TextForm::Escaped);
+  // Cuts count characters, so "Zoë Ña..." is nine.
+  EXPECT_EQ(cutToWidth("Zoë Ñandú", 10), "Zoë Ñandú");
+  EXPECT_EQ(cutToWidth("Zoë Ñandú!", 9), "Zoë Ña...");
+  EXPECT_EQ(cutToWidth("abcdef", 4), "a...");
+  EXPECT_EQ(cutToWidth("abcdef", 0), "abcdef");
+}
+
+TEST(Rfc4180, ReadsQuotesDoubledQuotesAndLineBreaks) {
+  const struct {
+    std::string_view text;
+    CsvRows rows;
+  } cases[] = {
+      {"", {}},
+      {"a,b\r\n", {{"a", "b"}}},
+      {"a,b", {{"a", "b"}}},
+      {"a\nb\rc\r\n", {{"a"}, {"b"}, {"c"}}},
+      {",\r\n", {{"", ""}}},
+      {"\r\n", {{""}}},
+      {R"("a,b","say ""hi""",""
+x)",
+       {{"a,b", "say \"hi\"", ""}, {"x"}}},
+      {"\"two\r\nlines\",z\r\n", {{"two\r\nlines", "z"}}},
+      // Lenient: a quote inside an unquoted field is text; text after a closing
+      // quote is kept; an unterminated quote runs to the end.
+      {"a\"b,\"c\"d,\"e\nf", {{"a\"b", "cd", "e\nf"}}},
+  };
+  for (const auto& c : cases) EXPECT_EQ(readRfc4180(c.text), c.rows) << c.text;
+}
+
+TEST(Rfc4180, WritesQuotesOnlyWhereNeededAndReadsBack) {
+  // A lone CR or LF each needs quotes: either one alone would end the record.
+  const CsvRows rows = {{"plain", "a,b", "q\"", ""}, {"cr\r", "lf\n", " lead"}, {""}};
+  const std::string text = writeRfc4180(rows);
+  EXPECT_EQ(text, "plain,\"a,b\",\"q\"\"\",\r\n\"cr\r\",\"lf\n\", lead\r\n\r\n");
+  EXPECT_EQ(readRfc4180(text), rows);
+}
+
+TEST(Json, StringsEscapeControlsAndKeepUtf8) {
+  EXPECT_EQ(jsonString("a\"\\\n\r\t\x01"), R"("a\"\\\n\r\t\u0001")");
+  EXPECT_EQ(jsonString("\xc3\xa9\xe2\x86\x92"), "\"\xc3\xa9\xe2\x86\x92\"");
+  // Bytes that are not UTF-8 (a lone continuation, an overlong form, a surrogate)
+  // become the Latin-1 characters of their values.
+  EXPECT_EQ(jsonString("\x80"), "\"\xc2\x80\"");
+  EXPECT_EQ(jsonString("\xc0\xaf"), "\"\xc3\x80\xc2\xaf\"");
+  EXPECT_EQ(jsonString("\xed\xa0\x80"), "\"\xc3\xad\xc2\xa0\xc2\x80\"");
+}
+
+}  // namespace
+}  // namespace quorrel::tool
