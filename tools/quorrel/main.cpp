@@ -1,5 +1,7 @@
 // quorrel: a host for the Quorrel extension module on the command line.
+#include <cerrno>
 #include <cstdint>
+#include <cstdio>
 #include <cstring>
 #include <iostream>
 #include <map>
@@ -124,24 +126,30 @@ Prints one line per code: CODE "display string or name" "title".
 struct Options {
   std::string module;
   quorrel::tool::ConvertOptions convert;
-  quorrel::tool::ViewOptions view;
+  quorrel::tool::InspectOptions inspect;
   quorrel::tool::RunOptions run;
   bool noWarnFiles = false;
   bool help = false, version = false;
-  std::vector<std::pair<std::string, std::string>> owned;  // option, the command it needs
+  std::vector<std::pair<std::string, std::string>> owned;  // option, the commands it needs
   std::vector<std::string> words;                          // the command and its operands
   std::string mistake;  // the first misuse found, reported once all is read
 };
 
-int32_t countOf(const std::string& option, const std::string& value) {
-  if (!quorrel::tool::looksLikeInteger(value) || value[0] == '-' || value.size() > 9) {
-    throw UsageError(option + " needs a count, not '" + value + "'");
+constexpr const char* kFileCommands = "inspect and convert";
+
+std::optional<quorrel::tool::ArrayFormat> formatOption(const std::string& option,
+                                                       const std::string& name) {
+  const auto format = quorrel::tool::formatOfName(name);
+  if (!format) {
+    throw UsageError("unknown format '" + name + "' for " + option + " (one of " +
+                     quorrel::tool::formatNames() + ")");
   }
-  return std::stoi(value);
+  return format;
 }
 
 Options parseOptions(int argc, char** argv) {
   Options options;
+  bool operandsOnly = false;
   for (int i = 1; i < argc; ++i) {
     const std::string arg = argv[i];
     const std::string name = arg.substr(0, arg.find('='));
@@ -152,35 +160,45 @@ Options parseOptions(int argc, char** argv) {
       return {};
     };
     auto belongs = [&](const char* command) { options.owned.emplace_back(name, command); };
-    if (arg == "--help" || arg == "-h") {
+    // Misuse is reported once all is read, so that --help still answers.
+    auto noting = [&](auto&& take) {
+      try {
+        take();
+      } catch (const UsageError& error) {
+        if (options.mistake.empty()) options.mistake = error.what();
+      }
+    };
+    if (operandsOnly || arg == "-" || arg.empty() || arg[0] != '-') {
+      options.words.push_back(arg);
+    } else if (arg == "--") {
+      operandsOnly = true;
+    } else if (arg == "--help" || arg == "-h") {
       options.help = true;
     } else if (arg == "--version") {
       options.version = true;
     } else if (name == "--module") {
       options.module = value();
-    } else if (name == "--to") {
-      options.convert.to = value();
-      belongs("convert");
-    } else if (name == "--from") {
-      options.convert.from = value();
-      belongs("convert");
+    } else if (name == "--to" || name == "--from") {
+      const std::string kind = value();
+      noting([&] {
+        auto& format = name == "--to" ? options.convert.to : options.convert.from;
+        if (!kind.empty()) format = formatOption(name, kind);
+      });
+      belongs(kFileCommands);
+    } else if (arg == "--header" || arg == "--lenient") {
+      (arg == "--header" ? options.convert.header : options.convert.lenient) = true;
+      belongs(kFileCommands);
     } else if (arg == "--force") {
       options.convert.force = true;
       belongs("convert");
-    } else if (name == "--rows" || name == "--width") {
-      const std::string text = value();
-      if (options.mistake.empty() && !text.empty()) {
-        try {
-          const int32_t count = countOf(name, text);
-          if (name == "--rows") options.view.rows = count;
-          if (name == "--width") options.view.width = static_cast<size_t>(count);
-        } catch (const UsageError& error) {
-          options.mistake = error.what();
-        }
-      }
-      belongs("inspect");
-    } else if (arg == "--all") {
-      options.view.all = true;
+    } else if (name == "--rows" || name == "--width" || arg == "--all" || arg == "--keys") {
+      noting([&] {
+        const auto next = [&]() -> std::optional<std::string> {
+          if (i + 1 < argc) return std::string(argv[++i]);
+          return std::nullopt;
+        };
+        quorrel::tool::takeViewOption(arg, next, options.inspect.view);
+      });
       belongs("inspect");
     } else if (arg == "--echo") {
       options.run.echo = true;
@@ -190,12 +208,13 @@ Options parseOptions(int argc, char** argv) {
     } else if (arg == "--no-warn-files") {
       options.noWarnFiles = true;
       belongs("run");
-    } else if (arg.size() > 1 && arg[0] == '-') {
-      if (options.mistake.empty()) options.mistake = "unknown option " + arg;
-    } else {
-      options.words.push_back(arg);
+    } else if (options.mistake.empty()) {
+      options.mistake = "unknown option " + arg + " (-- ends the options, for a file named so)";
     }
   }
+  options.inspect.from = options.convert.from;
+  options.inspect.header = options.convert.header;
+  options.inspect.lenient = options.convert.lenient;
   return options;
 }
 
@@ -213,11 +232,26 @@ void expectKind(const std::string& kind, std::initializer_list<const char*> allo
   throw UsageError("unknown kind " + kind);
 }
 
+// Without --to, OUT's extension names the format.
+void expectOutputFormat(const quorrel::tool::ConvertOptions& convert) {
+  if (convert.to) return;
+  if (convert.out == "-") {
+    throw UsageError("--to is needed to write standard output (one of " +
+                     quorrel::tool::formatNames() + ")");
+  }
+  if (!quorrel::tool::formatOfExtension(convert.out)) {
+    throw UsageError("cannot tell the format of " + convert.out +
+                     " from its extension (.arr, .mmf, .csv, .ini, .json); add --to with one of " +
+                     quorrel::tool::formatNames());
+  }
+}
+
 int dispatch(Options options) {
   const std::string& command = options.words[0];
   for (const auto& [option, owner] : options.owned) {
     // --echo and the file warnings' options serve the shell as well as run.
-    const bool shared = owner == "run" && command == "shell";
+    const bool shared = (owner == "run" && command == "shell") ||
+                        (owner == kFileCommands && (command == "inspect" || command == "convert"));
     if (owner != command && !shared) {
       throw UsageError(option + " belongs to " + (owner == "run" ? "run and shell" : owner));
     }
@@ -229,16 +263,12 @@ int dispatch(Options options) {
     expectOperands(options, 0, "no operands");
   } else if (command == "inspect") {
     expectOperands(options, 1, "a file");
-    if (options.view.all && options.view.rows)
-      throw UsageError("--rows and --all exclude each other");
+    if (options.convert.to) throw UsageError("--to belongs to convert");
   } else if (command == "convert") {
     expectOperands(options, 2, "an input and an output file");
-    for (const auto& [option, owner] : options.owned) {
-      if (option == "--to") {
-        expectKind(options.convert.to, {"native", "host", "csv", "ini", "csv-rfc4180", "json"});
-      }
-      if (option == "--from") expectKind(options.convert.from, {"csv-rfc4180"});
-    }
+    options.convert.in = options.words[1];
+    options.convert.out = options.words[2];
+    expectOutputFormat(options.convert);
   } else if (command == "list") {
     if (options.words.size() > 2) throw UsageError("list takes at most one name or code");
   } else if (command == "menu") {
@@ -258,16 +288,24 @@ int dispatch(Options options) {
   if (command == "run") return quorrel::tool::runCommand(loader, words[1], options.run);
   if (command == "shell") return quorrel::tool::shellCommand(loader, options.run);
   const auto& module = loader.get();
-  if (command == "inspect") return quorrel::tool::inspectCommand(module, words[1], options.view);
-  if (command == "convert") {
-    options.convert.in = words[1];
-    options.convert.out = words[2];
-    return quorrel::tool::convertCommand(module, options.convert);
-  }
+  if (command == "inspect") return quorrel::tool::inspectCommand(module, words[1], options.inspect);
+  if (command == "convert") return quorrel::tool::convertCommand(module, options.convert);
   if (command == "list")
     return quorrel::tool::listCommand(module, words.size() > 1 ? words[1] : "");
   if (command == "menu") return quorrel::tool::menuCommand(module, words[1]);
   return quorrel::tool::stringsCommand(module, words[1]);
+}
+
+// What was printed must have reached standard output: a full disk is an error. A
+// reader that went away (a closed pipe) is not.
+int finishStandardOutput(int status) {
+  std::cout.flush();
+  errno = 0;
+  if (std::cout.good() && std::fflush(stdout) == 0 && !std::ferror(stdout)) return status;
+  if (errno == EPIPE) return status;
+  std::cerr << "quorrel: cannot write standard output"
+            << (errno ? std::string(": ") + std::strerror(errno) : std::string()) << '\n';
+  return 1;
 }
 
 }  // namespace
@@ -289,7 +327,8 @@ int main(int argc, char** argv) {
       return 0;
     }
     if (options.words.empty()) throw UsageError("no command given");
-    return dispatch(std::move(options));
+    const int status = dispatch(std::move(options));
+    return finishStandardOutput(status);
   } catch (const UsageError& error) {
     std::cerr << "quorrel: " << error.what() << "\nTry 'quorrel "
               << (kCommandHelp.count(command) ? command + " " : "") << "--help'.\n";
