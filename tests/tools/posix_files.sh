@@ -22,6 +22,22 @@ check 1 "quorrel: cannot read /dev/zero: it is not a regular file" convert /dev/
 printf 'A 8 "x"\nA 0 "/dev/null/x.arr"\nA 0 "/dev/full"\n' >t.qs
 check 0 't.qs:2: warning: saveToFile "/dev/null/x.arr": could not open it (Not a directory)
 t.qs:3: warning: saveToFile "/dev/full": could not write it (No space left on device)' run t.qs
+# What cannot reach standard output is an error; binary output to a terminal needs --force.
+for command in "inspect t.qs --from csv" "convert t.qs - --to json --from csv"; do
+  err=$($quorrel $command 2>&1 >/dev/full)
+  status=$?
+  if [[ $status != 1 || $err != "quorrel: cannot write standard output"* ]]; then
+    echo "quorrel $command >/dev/full: status $status, stderr '$err'"
+    fail=1
+  fi
+done
+if command -v script >/dev/null; then
+  err=$(script -qec "$quorrel convert t.qs - --to native --from csv" /dev/null | tr -d '\r')
+  if [[ $err != "quorrel: convert will not write a native array file to a terminal"* ]]; then
+    echo "binary output to a terminal: $err"
+    fail=1
+  fi
+fi
 if [[ $(id -u) != 0 ]]; then
   printf 'a,b\r\n' >locked.csv && chmod 000 locked.csv
   check 1 "quorrel: cannot read locked.csv: Permission denied" inspect locked.csv

@@ -44,6 +44,7 @@ bool takeViewOption(std::string_view arg, const std::function<std::optional<std:
 struct InspectOptions {
   ViewOptions view;
   std::optional<ArrayFormat> from;  // none: recognised
+  std::optional<ArrayFormat> to;    // show the array as it comes back from this format
   bool header = false;              // a CSV's first row is its labels
   bool lenient = false;             // broken RFC 4180 CSV: a warning, not an error
 };
@@ -55,6 +56,7 @@ struct ConvertOptions {
   bool header = false;              // CSV labels as a first row, both ways
   bool lenient = false;
   bool force = false;  // overwrite IN; binary output to a terminal
+  bool report = true;  // say what was converted
 };
 
 int runCommand(const ModuleLoader& module, const std::string& path, const RunOptions& options);

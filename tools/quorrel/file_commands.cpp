@@ -826,13 +826,23 @@ void printArray(Instance& instance, const ViewOptions& view, std::ostream& out) 
 
 int inspectCommand(const Module& module, const std::string& path, const InspectOptions& options) {
   const ProgressNote progress("inspecting " + path);
-  const Input input = openInput(path, options.from);
+  std::optional<TempFile> converted;
+  if (options.to) {
+    // What the array becomes in that format: converted, then inspected as such.
+    converted.emplace();
+    convertCommand(module, {path, converted->path(), options.to, options.from, options.header,
+                            options.lenient, true, false});
+  }
+  Input input =
+      openInput(converted ? converted->path() : path, converted ? options.to : options.from);
+  if (converted) input.name = path + " as " + formatInfo(input.format).name;
   auto instance = loadInput(module, input, {options.from, options.header, options.lenient});
   std::cout << "file        " << input.name << '\n';
   std::cout << "format      " << formatInfo(input.format).description << " ("
             << std::filesystem::file_size(input.path) << " bytes)\n";
   printArray(*instance, options.view, std::cout);
   std::cout.flush();
+  instance.reset();
   if (input.format == ArrayFormat::Native) warnAboutDamage(input.name, input.path);
   return 0;
 }
@@ -882,6 +892,7 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
   }
   if (output) output->finish();
   warnLosses(header, tally, target, options.header);
+  if (!options.report) return 0;
   (toStdout ? std::cerr : std::cout)
       << input.name << " (" << formatInfo(input.format).name << ") -> "
       << (toStdout ? "<stdout>" : out) << " (" << formatInfo(target).name

@@ -213,6 +213,7 @@ Options parseOptions(int argc, char** argv) {
     }
   }
   options.inspect.from = options.convert.from;
+  options.inspect.to = options.convert.to;
   options.inspect.header = options.convert.header;
   options.inspect.lenient = options.convert.lenient;
   return options;
@@ -263,7 +264,6 @@ int dispatch(Options options) {
     expectOperands(options, 0, "no operands");
   } else if (command == "inspect") {
     expectOperands(options, 1, "a file");
-    if (options.convert.to) throw UsageError("--to belongs to convert");
   } else if (command == "convert") {
     expectOperands(options, 2, "an input and an output file");
     options.convert.in = options.words[1];
