@@ -22,7 +22,7 @@ it only through its exported entry points.
 Commands:
   run FILE            run a script (FILE - reads standard input)
   shell               type script commands interactively
-  inspect FILE        show what a native array, host array, CSV or INI file holds
+  inspect FILE        show what an array file holds (native, host, CSV, INI, JSON)
   convert IN OUT      convert an array file to another format
   list [WHAT]         list actions and expressions, or describe one (a name, A12, E12)
   menu KIND           print the editor menu tree: actions, expressions or conditions
@@ -76,33 +76,53 @@ help, help NAME|CODE, list, show (the current array), quit or exit. Ctrl-C
 clears the line, Ctrl-D ends. File warnings are on; --no-warn-files turns them off.
 )"},
     {"inspect", R"(Usage: quorrel inspect FILE
-       quorrel inspect [--rows N | --all] [--width N] FILE
+       quorrel inspect [--rows N | --all] [--width N] [--keys]
+                       [--from KIND] [--to KIND] [--header] [--lenient] FILE
 
-Recognises a native array file, a host array file, a CSV or an INI file, loads it
-into a fresh instance and prints its format, dimensions, boundaries, labels and
-elements. FILE - reads standard input. Exits with status 1 when FILE cannot be
-read.
+Recognises a native array, host array, CSV, INI or JSON file (or reads it as
+--from says), loads it into a fresh instance and prints its format, dimensions,
+boundaries, labels and elements. FILE - reads standard input. A native file that
+ends inside an element, or has bytes after its last one, is named in a warning
+with the byte offset. Exits with status 1 when FILE cannot be read.
 
-  --rows N     show at most N table rows or list elements (default 20 and 40)
-  --all        show every row, column and element
-  --width N    cut cells at N characters (default 24; 0 never cuts)
+  --rows N      show at most N table rows or list elements (default 20 and 40)
+  --all         show every row, column and element
+  --width N     cut cells at N characters (default 24; 0 never cuts)
+  --keys        list every element with its type and its key's type and key: a
+                text is quoted ("" is an empty text), an empty element is blank
+  --from KIND   read FILE as KIND (below) instead of recognising it
+  --to KIND     show the array as it comes back from KIND, with convert's warnings
+  --header      a CSV file's first row holds the column labels
+  --lenient     broken RFC 4180 CSV: a warning and the records before the fault
+
+KIND is native, host, csv, ini, csv-rfc4180 or json, in any case.
 )"},
-    {"convert", R"(Usage: quorrel convert IN OUT [--to native|host|csv|ini]
-       quorrel convert [--from KIND] [--to KIND] [--force] IN OUT
+    {"convert", R"(Usage: quorrel convert IN OUT
+       quorrel convert [--from KIND] [--to KIND] [--header] [--lenient] [--force]
+                       [--] IN OUT
 
-Loads IN (its format recognised as by inspect) and saves it as OUT. Without --to
-the format follows OUT's extension: .csv, .ini, anything else native. The host
-array format needs --to host. IN - reads standard input, OUT - writes standard
-output. Exits with status 1 when IN cannot be read or OUT cannot be written.
+Loads IN (its format recognised as by inspect, or as --from says) and saves it as
+OUT in the format --to names, or else OUT's extension: .arr native, .mmf host,
+.csv, .ini, .json (any case); another extension needs --to. IN - reads standard
+input, OUT - writes standard output (with --to). Exits with status 1 when IN
+cannot be read or OUT cannot be written, 2 on misuse.
 
-  --to csv-rfc4180   CSV whose cells are quoted when they hold a comma, a quote
-                     or a line break, so that they read back whole
-  --to json          dimensions, boundaries, labels, and each element's type,
-                     value or text and key
-  --from csv-rfc4180 read IN as such CSV (quotes, doubled quotes, line breaks)
-  --force            allow OUT to be IN itself
+  --to KIND, --from KIND
+               native, host, csv, ini, csv-rfc4180 or json, in any case
+               csv-rfc4180: cells quoted when they hold a comma, a quote or a
+               line break, so that they read back whole; broken quoting in IN is
+               an error that names its line
+               json: dimensions, boundaries, labels, and each element's type,
+               value, text or bytes (base64) and key; it reads back exactly
+  --header     write the column labels as a first CSV row; read a first row as
+               the labels
+  --lenient    broken RFC 4180 CSV: a warning and the records before the fault
+  --force      allow OUT to be IN itself, and binary output to a terminal
+  --           ends the options (for a file whose name starts with -)
 
 A warning on standard error names each kind of content the target format loses.
+A command that runs longer than 2 seconds shows its progress on standard error
+when that is a terminal.
 )"},
     {"list", R"(Usage: quorrel list [actions|expressions|NAME|CODE]
 
