@@ -18,6 +18,7 @@
 #include "array_files.h"
 #include "catalog.h"
 #include "commands.h"
+#include "io/file_handle.h"
 #include "temp_file.h"
 #include "text_formats.h"
 
@@ -196,6 +197,16 @@ struct Snapshot {
   }
 };
 
+// A snapshot's bytes, read as the extension's loaders read a file.
+ByteBuffer readSnapshot(const std::string& path) {
+  FileStatus status;
+  std::optional<ByteBuffer> bytes = readFileBytes(path.c_str(), 0, status);
+  if (!bytes)
+    throw FileError("cannot read a snapshot of the array: " +
+                    std::string(std::strerror(status.error)));
+  return std::move(*bytes);
+}
+
 // A native file made by the command, loaded by a fresh one-dimensional instance (the
 // load sets the dimensions the file holds).
 std::unique_ptr<Instance> loadBuilt(const Module& module, NativeFileBuilder& builder) {
@@ -242,8 +253,10 @@ void buildFromRecords(NativeFileBuilder& builder, const CsvRows& rows, bool head
   }
 }
 
-// ---- JSON, both ways. An element is {"type": ..., "value"|"text"|"base64": ...,
-// "key": ...}; a key is a number, a text, or {"type": ..., ...} like an element.
+// ---- JSON, both ways. An element (or key) is what says all of it: null for an empty
+// element, a number for a value, a string for a UTF-8 text; else {"base64": ...} for a
+// text that is not UTF-8 and {"file": ...} for file bytes, both base64. An element with
+// a key is {"element": ..., "key": ...}.
 
 // A string half's text, up to its first zero byte.
 std::string_view textBytes(const NativeHalf& half) {
@@ -251,37 +264,25 @@ std::string_view textBytes(const NativeHalf& half) {
 }
 
 void appendJsonHalf(std::string& out, const NativeHalf& half) {
-  out += "\"type\": \"";
-  out += elementTypeName(half.type);
-  out += '"';
   if (half.type == kValue) {
-    out += ", \"value\": ";
     out += std::to_string(half.number);
   } else if (half.type == kString && isUtf8(textBytes(half))) {
-    out += ", \"text\": ";
     appendJsonString(out, textBytes(half));
-  } else if (half.type != 0 && !half.bytes.empty()) {
-    // Bytes that are not UTF-8 text, exactly.
-    out += ", \"base64\": \"";
-    out += base64(half.type == kString ? textBytes(half) : half.bytes);
-    out += '"';
+  } else if (half.type == kString) {
+    out += "{\"base64\": \"" + base64(textBytes(half)) + "\"}";
+  } else if (half.type != 0) {
+    out += "{\"file\": \"" + base64(half.bytes) + "\"}";
+  } else {
+    out += "null";
   }
 }
 
 void appendJsonElement(std::string& out, const NativeHalf& value, const NativeHalf& key) {
-  out += '{';
+  if (key.type == 0) return appendJsonHalf(out, value);
+  out += "{\"element\": ";
   appendJsonHalf(out, value);
-  if (key.type == kValue) {
-    out += ", \"key\": ";
-    out += std::to_string(key.number);
-  } else if (key.type == kString && isUtf8(textBytes(key))) {
-    out += ", \"key\": ";
-    appendJsonString(out, textBytes(key));
-  } else if (key.type != 0) {
-    out += ", \"key\": {";
-    appendJsonHalf(out, key);
-    out += '}';
-  }
+  out += ", \"key\": ";
+  appendJsonHalf(out, key);
   out += '}';
 }
 
@@ -311,30 +312,30 @@ int32_t jsonInt32(const JsonValue* v, const char* what) {
 
 // One element or key half from its JSON form; `held` keeps the bytes it points to.
 NativeHalf halfOfJson(const JsonValue& v, std::string& held) {
-  if (v.kind == JsonValue::Kind::Number) return {kValue, 4, jsonInt32(&v, "a value key"), {}};
-  if (v.kind == JsonValue::Kind::String) {
-    held = v.text;
-    return stringHalf(held);
+  switch (v.kind) {
+    case JsonValue::Kind::Null:
+      return {};
+    case JsonValue::Kind::Number:
+      return {kValue, 4, jsonInt32(&v, "a value"), {}};
+    case JsonValue::Kind::String:
+      held = v.text;
+      return stringHalf(held);
+    default:
+      break;
   }
-  const JsonValue* type = v.find("type");
-  if (v.kind != JsonValue::Kind::Object || !type || type->kind != JsonValue::Kind::String) {
-    throw JsonMistake("an element needs a \"type\"");
+  const JsonValue* text = v.find("base64");
+  const JsonValue* file = v.find("file");
+  const JsonValue* encoded = text ? text : file;
+  const auto bytes = encoded && encoded->kind == JsonValue::Kind::String ? fromBase64(encoded->text)
+                                                                         : std::nullopt;
+  if (!bytes) {
+    throw JsonMistake(
+        "an element is null, a number, a string, or an object with \"element\", "
+        "\"base64\" or \"file\" (base64 text)");
   }
-  const JsonValue* encoded = v.find("base64");
-  if (encoded) {
-    const auto bytes = fromBase64(encoded->kind == JsonValue::Kind::String ? encoded->text : "!");
-    if (!bytes) throw JsonMistake("\"base64\" must be base64 text");
-    held = *bytes;
-  }
-  if (type->text == "none") return {};
-  if (type->text == "value") return {kValue, 4, jsonInt32(v.find("value"), "\"value\""), {}};
-  if (type->text == "string") {
-    const JsonValue* t = v.find("text");
-    if (t && t->kind == JsonValue::Kind::String) held = t->text;
-    return stringHalf(held);
-  }
-  if (type->text == "file") return {kFile, static_cast<int32_t>(held.size()), 0, held};
-  throw JsonMistake("unknown element type \"" + type->text + '"');
+  held = *bytes;
+  if (text) return stringHalf(held);
+  return {kFile, static_cast<int32_t>(held.size()), 0, held};
 }
 
 void buildFromJson(NativeFileBuilder& builder, const JsonValue& document) {
@@ -363,20 +364,24 @@ void buildFromJson(NativeFileBuilder& builder, const JsonValue& document) {
   }
   std::string valueBytes, keyBytes;
   for (const JsonValue& element : elements->items) {
-    const NativeHalf value = halfOfJson(element, valueBytes);
+    const JsonValue* keyed = element.find("element");
     const JsonValue* key = element.find("key");
-    builder.append(value, key ? halfOfJson(*key, keyBytes) : NativeHalf{});
+    if (keyed && key) {
+      builder.append(halfOfJson(*keyed, valueBytes), halfOfJson(*key, keyBytes));
+    } else {
+      builder.append(halfOfJson(element, valueBytes), {});
+    }
   }
 }
 
 // The first table row becomes the labels: the array is rebuilt without it.
 std::unique_ptr<Instance> takeHeaderRow(const Module& module, Instance& instance) {
   const Snapshot snapshot(instance);
-  const std::string bytes = readWholeFile(snapshot.file.path());
+  const ByteBuffer bytes = readSnapshot(snapshot.file.path());
   NativeHeader header;
   NativeFileBuilder builder;
   std::vector<std::optional<std::string>> labels;
-  walkNativeFile(bytes, header, [&](const NativeHalf& value, const NativeHalf& key) {
+  walkNativeFile(bytes.view(), header, [&](const NativeHalf& value, const NativeHalf& key) {
     if (labels.size() < static_cast<size_t>(std::max(header.columns(), 0))) {
       labels.emplace_back(textOf(value));
     } else {
@@ -552,9 +557,9 @@ void printList(Instance& instance, int32_t size, const ViewOptions& view, std::o
   const int32_t shown = limit(size, view.all ? -1 : view.rows.value_or(40));
   std::vector<std::vector<std::string>> lines(1, {"index", "type", "value", "key type", "key"});
   const Snapshot snapshot(instance);
-  const std::string bytes = readWholeFile(snapshot.file.path());
+  const ByteBuffer bytes = readSnapshot(snapshot.file.path());
   NativeHeader header;
-  walkNativeFile(bytes, header, [&](const NativeHalf& value, const NativeHalf& key) {
+  walkNativeFile(bytes.view(), header, [&](const NativeHalf& value, const NativeHalf& key) {
     lines.push_back({std::to_string(lines.size() - 1), elementTypeName(value.type),
                      halfText(value, view.width), key.type ? elementTypeName(key.type) : "-",
                      halfText(key, view.width)});
@@ -847,7 +852,8 @@ int inspectCommand(const Module& module, const std::string& path, const InspectO
   return 0;
 }
 
-int convertCommand(const Module& module, const ConvertOptions& options) {
+// The format of OUT, once it is clear that OUT may be written.
+ArrayFormat checkedTarget(const ConvertOptions& options) {
   const std::string& out = options.out;
   const bool toStdout = out == "-";
   if (!toStdout && options.in != "-" && !options.force && sameFile(options.in, out)) {
@@ -856,22 +862,31 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
   if (!toStdout && std::filesystem::is_directory(out)) {
     throw FileError("cannot write " + out + ": it is a directory");
   }
-  const ArrayFormat target = options.to ? *options.to : *formatOfExtension(out);
+  const ArrayFormat target = options.to ? *options.to : formatOfExtension(out).value();
   if (toStdout && formatInfo(target).binary && !options.force && isTerminal(stdout)) {
     throw UsageError(std::string("convert will not write a ") + formatInfo(target).description +
                      " to a terminal; redirect it or add --force");
   }
+  return target;
+}
+
+int convertCommand(const Module& module, const ConvertOptions& options) {
+  const ArrayFormat target = checkedTarget(options);
+  const std::string& out = options.out;
+  const bool toStdout = out == "-";
   const ProgressNote progress("converting " + options.in);
   const Input input = openInput(options.in, options.from);
   auto instance = loadInput(module, input, {options.from, options.header, options.lenient});
+  const int32_t elements = askNumber(*instance, kSize);
 
-  // The extension writes its own formats; the snapshot is the native one.
+  // The extension writes its own formats, into OUT when nothing goes before them.
   const bool ownFormat = formatInfo(target).saveAction != nullptr;
   const bool direct = ownFormat && !toStdout && !(target == ArrayFormat::Csv && options.header);
   std::optional<TempFile> staging;
   if (ownFormat && !direct) staging.emplace();
   const std::string written = direct ? out : staging ? staging->path() : std::string();
   if (ownFormat) fileAction(module, *instance, formatInfo(target).saveAction, written, out);
+  // A native file loses nothing, so it needs no walk; every other target does.
   std::optional<Snapshot> snapshot;
   if (target != ArrayFormat::Native) snapshot.emplace(*instance);
   instance.reset();  // the module's copy goes before the snapshot is read
@@ -879,24 +894,22 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
   std::optional<Output> output;
   if (!direct) output.emplace(out);
   NativeHeader header;
-  Tally tally{target};
-  {
-    const std::string bytes = readWholeFile(snapshot ? snapshot->file.path() : written);
-    tally =
-        writeFromSnapshot(bytes, {target, options.header, ownFormat ? nullptr : &*output}, header);
+  if (snapshot) {
+    const ByteBuffer bytes = readSnapshot(snapshot->file.path());
+    const Tally tally = writeFromSnapshot(
+        bytes.view(), {target, options.header, ownFormat ? nullptr : &*output}, header);
+    warnLosses(header, tally, target, options.header);
   }
   if (output && ownFormat) {
-    if (options.header)
-      output->write(plainCsvRow(labelRow(header, csvColumns(header, tally.elements))));
+    if (options.header) output->write(plainCsvRow(labelRow(header, csvColumns(header, elements))));
     output->copyFrom(written);
   }
   if (output) output->finish();
-  warnLosses(header, tally, target, options.header);
   if (!options.report) return 0;
   (toStdout ? std::cerr : std::cout)
       << input.name << " (" << formatInfo(input.format).name << ") -> "
       << (toStdout ? "<stdout>" : out) << " (" << formatInfo(target).name
-      << "): " << plural(tally.elements, "element") << '\n';
+      << "): " << plural(elements, "element") << '\n';
   return 0;
 }
 

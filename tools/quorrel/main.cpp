@@ -112,8 +112,10 @@ cannot be read or OUT cannot be written, 2 on misuse.
                csv-rfc4180: cells quoted when they hold a comma, a quote or a
                line break, so that they read back whole; broken quoting in IN is
                an error that names its line
-               json: dimensions, boundaries, labels, and each element's type,
-               value, text or bytes (base64) and key; it reads back exactly
+               json: dimensions, boundaries, labels, and each element as null
+               (empty), a number, a string, {"base64": ...} (text that is not
+               UTF-8) or {"file": ...} (bytes), with {"element": ..., "key": ...}
+               for a keyed one; it reads back exactly
   --header     write the column labels as a first CSV row; read a first row as
                the labels
   --lenient    broken RFC 4180 CSV: a warning and the records before the fault
