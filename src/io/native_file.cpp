@@ -140,9 +140,9 @@ template <class Sink>
 // dimensions). Labels and records that would start at or past the end of the file
 // are not produced, which also bounds what a crafted count can ask for.
 template <class Sink>
-NativeFileExtent parseNative(std::string_view file, Sink& sink) {
+FileExtent parseNative(std::string_view file, Sink& sink) {
   Cursor in(file);
-  NativeFileExtent extent;
+  FileExtent extent;
   if (!in.matches(kNativeFileMagic)) return extent;
   const uint16_t version = in.u16();
   sink.version(version);
@@ -167,7 +167,7 @@ NativeFileExtent parseNative(std::string_view file, Sink& sink) {
   }
 
   const int32_t elementCount = in.i32();
-  extent.declaredElements = elementCount;
+  extent.declared = elementCount;
   // Every complete record takes at least 12 bytes.
   sink.expectElements(std::min<std::size_t>(std::max(elementCount, 0), in.remaining() / 12 + 1));
   bool more = true;
@@ -176,7 +176,7 @@ NativeFileExtent parseNative(std::string_view file, Sink& sink) {
     extent.lastRecordStart = in.position();
     readHalf(in, sink, r.type, r.size, r.number, r.data);
     readHalf(in, sink, r.keyType, r.keySize, r.keyNumber, r.keyData);
-    ++extent.elementsRead;
+    ++extent.read;
     extent.endsInsideRecord = in.ranShort();
     more = sink.element(r);
   }
@@ -284,7 +284,7 @@ struct VisitorSink {
 
 }  // namespace
 
-NativeFileExtent scanNativeFile(std::string_view file, NativeFileVisitor& visitor) {
+FileExtent scanNativeFile(std::string_view file, NativeFileVisitor& visitor) {
   VisitorSink sink{visitor, {}};
   return parseNative(file, sink);
 }

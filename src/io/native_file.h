@@ -40,17 +40,7 @@ class NativeFileVisitor {
   virtual bool element(const NativeHalf& value, const NativeHalf& key) = 0;
 };
 
-// How far a walk got, for telling a damaged file from a whole one.
-struct NativeFileExtent {
-  bool usable = false;  // the magic, a version of 1 or less, at most 10 dimensions
-  int32_t declaredElements = 0;
-  int32_t elementsRead = 0;       // records handed to the visitor
-  bool endsInsideRecord = false;  // the file ends inside the last record handed over
-  std::size_t lastRecordStart = 0;
-  std::size_t end = 0;  // where the walk stopped; the file's size unless bytes follow
-};
-
 // Walks the file's bytes with the loader's own reader.
-NativeFileExtent scanNativeFile(std::string_view file, NativeFileVisitor& visitor);
+FileExtent scanNativeFile(std::string_view file, NativeFileVisitor& visitor);
 
 }  // namespace quorrel

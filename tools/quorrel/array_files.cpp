@@ -144,8 +144,8 @@ const char* elementTypeName(uint16_t type) {
   return type < std::size(kNames) ? kNames[type] : "?";
 }
 
-NativeFileExtent walkNativeFile(std::string_view bytes, NativeHeader& header,
-                                const ElementVisit& element) {
+FileExtent walkNativeFile(std::string_view bytes, NativeHeader& header,
+                          const ElementVisit& element) {
   HeaderVisitor visitor(header, element);
   return scanNativeFile(bytes, visitor);
 }

@@ -54,8 +54,8 @@ struct NativeHeader {
 // Walks a native file's bytes: the header and labels first, then each element until
 // `element` returns false.
 using ElementVisit = std::function<bool(const NativeHalf& value, const NativeHalf& key)>;
-NativeFileExtent walkNativeFile(std::string_view bytes, NativeHeader& header,
-                                const ElementVisit& element);
+FileExtent walkNativeFile(std::string_view bytes, NativeHeader& header,
+                          const ElementVisit& element);
 
 // The text an element or key reads as: a number in decimal, a string up to its
 // first zero byte, nothing for the other types.

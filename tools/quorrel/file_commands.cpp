@@ -19,6 +19,7 @@
 #include "catalog.h"
 #include "commands.h"
 #include "io/file_handle.h"
+#include "io/host_array_file.h"
 #include "temp_file.h"
 #include "text_formats.h"
 
@@ -431,24 +432,27 @@ std::unique_ptr<Instance> loadInput(const Module& module, const Input& input,
 // ---------------------------------------------------------------------------------
 // Damage: a native file that ends inside an element or goes on after its last one.
 
-void warnAboutDamage(const std::string& name, const std::string& path) {
+void warnAboutDamage(const std::string& name, const std::string& path, ArrayFormat format) {
   const std::string bytes = readWholeFile(path);
   NativeHeader header;
-  const NativeFileExtent extent =
-      walkNativeFile(bytes, header, [](const NativeHalf&, const NativeHalf&) { return true; });
+  const FileExtent extent =
+      format == ArrayFormat::Host
+          ? measureHostFile(bytes)
+          : walkNativeFile(bytes, header,
+                           [](const NativeHalf&, const NativeHalf&) { return true; });
+  const char* record = format == ArrayFormat::Host ? "cell" : "element";
   if (!extent.usable) return;
   if (extent.endsInsideRecord) {
-    warn(name + " ends inside element " + std::to_string(extent.elementsRead - 1) +
-         " (its record starts at byte " + std::to_string(extent.lastRecordStart) +
-         ", the file has " + plural(static_cast<int64_t>(bytes.size()), "byte") +
-         "); it declares " + plural(extent.declaredElements, "element"));
-  } else if (extent.elementsRead < extent.declaredElements) {
+    warn(name + " ends inside " + record + ' ' + std::to_string(extent.read - 1) +
+         " (which starts at byte " + std::to_string(extent.lastRecordStart) + ", the file has " +
+         plural(static_cast<int64_t>(bytes.size()), "byte") + "); it declares " +
+         plural(extent.declared, record));
+  } else if (extent.read < extent.declared) {
     warn(name + " ends at byte " + std::to_string(extent.end) + " after " +
-         plural(extent.elementsRead, "element") + "; it declares " +
-         std::to_string(extent.declaredElements));
+         plural(extent.read, record) + "; it declares " + std::to_string(extent.declared));
   } else if (extent.end < bytes.size()) {
     warn(name + " has " + plural(static_cast<int64_t>(bytes.size() - extent.end), "byte") +
-         " after its last element, from byte " + std::to_string(extent.end));
+         " after its last " + record + ", from byte " + std::to_string(extent.end));
   }
 }
 
@@ -560,10 +564,11 @@ void printList(Instance& instance, int32_t size, const ViewOptions& view, std::o
   const ByteBuffer bytes = readSnapshot(snapshot.file.path());
   NativeHeader header;
   walkNativeFile(bytes.view(), header, [&](const NativeHalf& value, const NativeHalf& key) {
+    if (static_cast<int32_t>(lines.size()) - 1 >= shown) return false;
     lines.push_back({std::to_string(lines.size() - 1), elementTypeName(value.type),
                      halfText(value, view.width), key.type ? elementTypeName(key.type) : "-",
                      halfText(key, view.width)});
-    return static_cast<int32_t>(lines.size()) - 1 < shown;
+    return true;
   });
   printRows(lines, out);
   if (size > shown) out << "  ... " << plural(size - shown, "more element") << " not shown\n";
@@ -848,7 +853,7 @@ int inspectCommand(const Module& module, const std::string& path, const InspectO
   printArray(*instance, options.view, std::cout);
   std::cout.flush();
   instance.reset();
-  if (input.format == ArrayFormat::Native) warnAboutDamage(input.name, input.path);
+  if (formatInfo(input.format).binary) warnAboutDamage(input.name, input.path, input.format);
   return 0;
 }
 

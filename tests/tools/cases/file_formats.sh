@@ -23,6 +23,9 @@ head -c 60 t.arr >cut.arr
 q inspect cut.arr --rows 1
 cat t.arr three.bin >long.arr
 q inspect long.arr --rows 0
+q convert t.arr t.mmf 2>/dev/null
+head -c 40 t.mmf >cut.mmf
+q inspect cut.mmf --rows 0
 # JSON by extension, and back: the same bytes. Kinds in any case; a wrong one lists them.
 q convert t.arr t.json
 q convert --from JSON t.json back.arr --to Native
