@@ -1,10 +1,12 @@
 #include "array_files.h"
 
 #include <cctype>
+#include <climits>
 #include <cstring>
 
 #include "array/element_array.h"
 #include "io/host_array_file.h"
+#include "text_formats.h"
 
 namespace quorrel::tool {
 namespace {
@@ -82,6 +84,59 @@ class HeaderVisitor : public NativeFileVisitor {
   NativeHeader& header_;
   const ElementVisit& element_;
 };
+
+NativeHalf stringHalf(const std::string& value) {
+  return {kStringType, static_cast<int32_t>(value.size() + 1), 0, value};
+}
+
+void appendJsonHalf(std::string& out, const NativeHalf& half) {
+  if (half.type == kValueType) {
+    out += std::to_string(half.number);
+  } else if (half.type == kStringType && isUtf8(textBytes(half))) {
+    appendJsonString(out, textBytes(half));
+  } else if (half.type == kStringType) {
+    out += "{\"base64\": \"" + base64(textBytes(half)) + "\"}";
+  } else if (half.type != 0) {
+    out += "{\"file\": \"" + base64(half.bytes) + "\"}";
+  } else {
+    out += "null";
+  }
+}
+
+int32_t jsonInt32(const JsonValue* v, const char* what) {
+  if (!v || !v->integer || *v->integer < INT32_MIN || *v->integer > INT32_MAX) {
+    throw JsonMistake(std::string(what) + " must be a 32-bit integer");
+  }
+  return static_cast<int32_t>(*v->integer);
+}
+
+// One element or key half from its JSON form; `held` keeps the bytes it points to.
+NativeHalf halfOfJson(const JsonValue& v, std::string& held) {
+  switch (v.kind) {
+    case JsonValue::Kind::Null:
+      return {};
+    case JsonValue::Kind::Number:
+      return {kValueType, 4, jsonInt32(&v, "a value"), {}};
+    case JsonValue::Kind::String:
+      held = v.text;
+      return stringHalf(held);
+    default:
+      break;
+  }
+  const JsonValue* text = v.find("base64");
+  const JsonValue* file = v.find("file");
+  const JsonValue* encoded = text ? text : file;
+  const auto bytes = encoded && encoded->kind == JsonValue::Kind::String ? fromBase64(encoded->text)
+                                                                         : std::nullopt;
+  if (!bytes) {
+    throw JsonMistake(
+        "an element is null, a number, a string, or an object with \"element\", "
+        "\"base64\" or \"file\" (base64 text)");
+  }
+  held = *bytes;
+  if (text) return stringHalf(held);
+  return {kFileType, static_cast<int32_t>(held.size()), 0, held};
+}
 
 ElementValue operandOf(const NativeHalf& half, std::string& text) {
   switch (static_cast<ElementType>(half.type)) {
@@ -186,6 +241,88 @@ void NativeFileBuilder::append(const NativeHalf& value, const NativeHalf& key) {
 
 bool NativeFileBuilder::save(const std::string& path) {
   return saveNativeFile(parts_->array, path.c_str(), FileModeTruncate).ok();
+}
+
+std::string_view textBytes(const NativeHalf& half) {
+  return half.bytes.substr(0, half.bytes.find('\0'));
+}
+
+void buildFromRecords(NativeFileBuilder& builder, const CsvRows& rows, bool header) {
+  size_t columns = 0;
+  for (const auto& row : rows) columns = std::max(columns, row.size());
+  builder.setShape(2, {static_cast<int32_t>(columns), 0});
+  const size_t first = header && !rows.empty() ? 1 : 0;
+  if (first == 1) {
+    builder.setLabels(std::vector<std::optional<std::string>>(rows[0].begin(), rows[0].end()));
+  }
+  const std::string empty;
+  for (size_t r = first; r < rows.size(); ++r) {
+    for (size_t c = 0; c < columns; ++c) {
+      builder.append(stringHalf(c < rows[r].size() ? rows[r][c] : empty), {});
+    }
+  }
+}
+
+void appendJsonElement(std::string& out, const NativeHalf& value, const NativeHalf& key) {
+  if (key.type == 0) return appendJsonHalf(out, value);
+  out += "{\"element\": ";
+  appendJsonHalf(out, value);
+  out += ", \"key\": ";
+  appendJsonHalf(out, key);
+  out += '}';
+}
+
+void appendJsonHeader(std::string& out, const NativeHeader& header) {
+  out += "{\n  \"dimensions\": " + std::to_string(header.dimensions) + ",\n  \"boundaries\": [";
+  for (size_t d = 0; d < header.boundaries.size(); ++d) {
+    out += (d ? ", " : "") + std::to_string(header.boundaries[d]);
+  }
+  out += "],\n  \"labels\": [";
+  for (size_t c = 0; c < header.labels.size(); ++c) {
+    if (c) out += ", ";
+    out += header.labels[c] ? jsonString(*header.labels[c]) : "null";
+  }
+  out += "],\n  \"elements\": [";
+}
+
+void appendJsonEnd(std::string& out, bool anyElement) {
+  out += anyElement ? "\n  ]\n}\n" : "]\n}\n";
+}
+
+void buildFromJson(NativeFileBuilder& builder, const JsonValue& document) {
+  const JsonValue* dims = document.find("dimensions");
+  const JsonValue* boundaries = document.find("boundaries");
+  const JsonValue* labels = document.find("labels");
+  const JsonValue* elements = document.find("elements");
+  if (!elements || elements->kind != JsonValue::Kind::Array) {
+    throw JsonMistake("the document needs an \"elements\" list");
+  }
+  std::vector<int32_t> shape;
+  if (boundaries) {
+    for (const JsonValue& b : boundaries->items) shape.push_back(jsonInt32(&b, "a boundary"));
+  }
+  builder.setShape(dims ? jsonInt32(dims, "\"dimensions\"") : 1, shape);
+  if (labels) {
+    std::vector<std::optional<std::string>> list;
+    for (const JsonValue& label : labels->items) {
+      if (label.kind == JsonValue::Kind::String) {
+        list.emplace_back(label.text);
+      } else {
+        list.emplace_back();
+      }
+    }
+    builder.setLabels(list);
+  }
+  std::string valueBytes, keyBytes;
+  for (const JsonValue& element : elements->items) {
+    const JsonValue* keyed = element.find("element");
+    const JsonValue* key = element.find("key");
+    if (keyed && key) {
+      builder.append(halfOfJson(*keyed, valueBytes), halfOfJson(*key, keyBytes));
+    } else {
+      builder.append(halfOfJson(element, valueBytes), {});
+    }
+  }
 }
 
 }  // namespace quorrel::tool

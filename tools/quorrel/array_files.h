@@ -6,7 +6,9 @@
 
 #include <cstdint>
 #include <functional>
+#include <memory>
 #include <optional>
+#include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -16,6 +18,9 @@
 namespace quorrel::tool {
 
 enum class ArrayFormat { Native, Host, Csv, Ini, CsvRfc4180, Json };
+
+// The element type codes of a native file's records (0 is an empty element, or no key).
+inline constexpr uint16_t kValueType = 1, kStringType = 2, kFileType = 3;
 
 struct FormatInfo {
   const char* name;         // as --from and --to take it
@@ -60,6 +65,8 @@ FileExtent walkNativeFile(std::string_view bytes, NativeHeader& header,
 // The text an element or key reads as: a number in decimal, a string up to its
 // first zero byte, nothing for the other types.
 std::string textOf(const NativeHalf& half);
+// A string half's text, up to its first zero byte.
+std::string_view textBytes(const NativeHalf& half);
 
 // Builds a native file from parts, with the core's own writer: for the formats the
 // command reads itself, which the extension then loads from it.
@@ -81,5 +88,27 @@ class NativeFileBuilder {
   struct Parts;
   std::unique_ptr<Parts> parts_;
 };
+
+// The formats the command reads itself become a native file first.
+// RFC 4180 records as a table of string cells, short records padded; with `header`,
+// the first record gives the column labels.
+void buildFromRecords(NativeFileBuilder& builder, const std::vector<std::vector<std::string>>& rows,
+                      bool header);
+
+// JSON. An element (or key) is what says all of it: null for an empty element, a number
+// for a value, a string for a UTF-8 text; else {"base64": ...} for a text that is not
+// UTF-8 and {"file": ...} for file bytes, both base64. An element with a key is
+// {"element": ..., "key": ...}. The document holds "dimensions", "boundaries", "labels"
+// (null for a label record without text) and "elements".
+struct JsonValue;
+// A document that does not describe an array.
+struct JsonMistake : std::runtime_error {
+  using std::runtime_error::runtime_error;
+};
+void buildFromJson(NativeFileBuilder& builder, const JsonValue& document);
+// Written in three parts, so that a big array goes out in pieces.
+void appendJsonHeader(std::string& out, const NativeHeader& header);
+void appendJsonElement(std::string& out, const NativeHalf& value, const NativeHalf& key);
+void appendJsonEnd(std::string& out, bool anyElement);
 
 }  // namespace quorrel::tool

@@ -4,7 +4,6 @@
 // one pass) comes from a native snapshot the instance saves, walked with the core's
 // own reader.
 #include <algorithm>
-#include <atomic>
 #include <chrono>
 #include <condition_variable>
 #include <cstdlib>
@@ -18,6 +17,7 @@
 #include "array_files.h"
 #include "catalog.h"
 #include "commands.h"
+#include "instance_reads.h"
 #include "io/file_handle.h"
 #include "io/host_array_file.h"
 #include "temp_file.h"
@@ -26,69 +26,12 @@
 namespace quorrel::tool {
 namespace {
 
-constexpr int32_t kMaxTableColumns = 12;
-
-// Expression codes the views read.
-constexpr int32_t kSize = 0;
-constexpr int32_t kGetString = 2;
-constexpr int32_t kDim = 26;
-constexpr int32_t kBoundary = 27;
-constexpr int32_t kNumberOfRows = 40;
-constexpr int32_t kRowList = 41;
-constexpr int32_t kGetLabel = 43;
-constexpr int32_t kDelimiter = 51;
-
-constexpr uint16_t kValue = 1, kString = 2, kFile = 3;
-
-Argument number(int32_t value) {
-  return Argument(value);
-}
 Argument text(const std::string& value) {
   return Argument(value);
 }
 
-int32_t askNumber(Instance& instance, int32_t code, std::vector<Argument> args = {}) {
-  const ExpressionResult result = instance.callExpression(code, args);
-  return result.isText ? 0 : result.number;
-}
-
-std::optional<std::string> askText(Instance& instance, int32_t code, std::vector<Argument> args) {
-  ExpressionResult result = instance.callExpression(code, args);
-  if (!result.isText) return std::nullopt;
-  return std::move(result.text);
-}
-
-// head + tail by appending: GCC 12 at -O3 reports a false -Wrestrict overlap in
-// "literal" + std::string&& (its insert-at-front path), which -Werror turns fatal.
-std::string joined(const char* head, const std::string& tail) {
-  std::string text = head;
-  text += tail;
-  return text;
-}
-
-std::string plural(int64_t count, const char* noun) {
-  return std::to_string(count) + ' ' + noun + (count == 1 ? "" : "s");
-}
-
-int32_t limit(int32_t count, int32_t most) {
-  return most < 0 ? count : std::min(count, most);
-}
-
 void warn(const std::string& what) {
   std::cerr << "quorrel: warning: " << what << '\n';
-}
-
-// The steps of a file action that can fail, as the module numbers them.
-const char* failedStep(int32_t step) {
-  static constexpr const char* kSteps[] = {"done",
-                                           "cannot open it",
-                                           "cannot read it",
-                                           "cannot write it",
-                                           "cannot flush it to the disk",
-                                           "cannot put the new file in place",
-                                           "out of memory",
-                                           "nothing written"};
-  return step >= 0 && step < static_cast<int32_t>(std::size(kSteps)) ? kSteps[step] : "failed";
 }
 
 // Runs a file action and turns a failure the module reports into a FileError.
@@ -99,7 +42,7 @@ void fileAction(const Module& module, Instance& instance, const char* action,
   if (!status || status->first == 0) return;
   const bool load = std::string_view(action).starts_with("load");
   throw FileError(std::string(load ? "cannot read " : "cannot write ") + shownPath + ": " +
-                  (status->second ? std::strerror(status->second) : failedStep(status->first)));
+                  (status->second ? std::strerror(status->second) : failedFileStep(status->first)));
 }
 
 // ---------------------------------------------------------------------------------
@@ -184,30 +127,6 @@ Input openInput(const std::string& operand, std::optional<ArrayFormat> from) {
   return input;
 }
 
-// ---------------------------------------------------------------------------------
-// Native snapshots: the instance saved with its own action, walked with the core's
-// reader.
-
-// The save reports nothing here (the shell's show has no module at hand); a snapshot
-// that could not be written reads as an unusable file.
-struct Snapshot {
-  TempFile file;
-  explicit Snapshot(Instance& instance) {
-    instance.callAction(actionCodeOfName(formatInfo(ArrayFormat::Native).saveAction).value(),
-                        {text(file.path())});
-  }
-};
-
-// A snapshot's bytes, read as the extension's loaders read a file.
-ByteBuffer readSnapshot(const std::string& path) {
-  FileStatus status;
-  std::optional<ByteBuffer> bytes = readFileBytes(path.c_str(), 0, status);
-  if (!bytes)
-    throw FileError("cannot read a snapshot of the array: " +
-                    std::string(std::strerror(status.error)));
-  return std::move(*bytes);
-}
-
 // A native file made by the command, loaded by a fresh one-dimensional instance (the
 // load sets the dimensions the file holds).
 std::unique_ptr<Instance> loadBuilt(const Module& module, NativeFileBuilder& builder) {
@@ -233,152 +152,10 @@ void reportProblem(const std::string& name, const std::optional<TextProblem>& pr
   warn(problemText(name, *problem) + "; " + kept + " kept");
 }
 
-NativeHalf stringHalf(const std::string& value) {
-  return {kString, static_cast<int32_t>(value.size() + 1), 0, value};
-}
-
-// RFC 4180 records as a table of string cells, short records padded.
-void buildFromRecords(NativeFileBuilder& builder, const CsvRows& rows, bool header) {
-  size_t columns = 0;
-  for (const auto& row : rows) columns = std::max(columns, row.size());
-  builder.setShape(2, {static_cast<int32_t>(columns), 0});
-  const size_t first = header && !rows.empty() ? 1 : 0;
-  if (first == 1) {
-    builder.setLabels(std::vector<std::optional<std::string>>(rows[0].begin(), rows[0].end()));
-  }
-  const std::string empty;
-  for (size_t r = first; r < rows.size(); ++r) {
-    for (size_t c = 0; c < columns; ++c) {
-      builder.append(stringHalf(c < rows[r].size() ? rows[r][c] : empty), {});
-    }
-  }
-}
-
-// ---- JSON, both ways. An element (or key) is what says all of it: null for an empty
-// element, a number for a value, a string for a UTF-8 text; else {"base64": ...} for a
-// text that is not UTF-8 and {"file": ...} for file bytes, both base64. An element with
-// a key is {"element": ..., "key": ...}.
-
-// A string half's text, up to its first zero byte.
-std::string_view textBytes(const NativeHalf& half) {
-  return half.bytes.substr(0, half.bytes.find('\0'));
-}
-
-void appendJsonHalf(std::string& out, const NativeHalf& half) {
-  if (half.type == kValue) {
-    out += std::to_string(half.number);
-  } else if (half.type == kString && isUtf8(textBytes(half))) {
-    appendJsonString(out, textBytes(half));
-  } else if (half.type == kString) {
-    out += "{\"base64\": \"" + base64(textBytes(half)) + "\"}";
-  } else if (half.type != 0) {
-    out += "{\"file\": \"" + base64(half.bytes) + "\"}";
-  } else {
-    out += "null";
-  }
-}
-
-void appendJsonElement(std::string& out, const NativeHalf& value, const NativeHalf& key) {
-  if (key.type == 0) return appendJsonHalf(out, value);
-  out += "{\"element\": ";
-  appendJsonHalf(out, value);
-  out += ", \"key\": ";
-  appendJsonHalf(out, key);
-  out += '}';
-}
-
-void appendJsonHeader(std::string& out, const NativeHeader& header) {
-  out += "{\n  \"dimensions\": " + std::to_string(header.dimensions) + ",\n  \"boundaries\": [";
-  for (size_t d = 0; d < header.boundaries.size(); ++d) {
-    out += (d ? ", " : "") + std::to_string(header.boundaries[d]);
-  }
-  out += "],\n  \"labels\": [";
-  for (size_t c = 0; c < header.labels.size(); ++c) {
-    if (c) out += ", ";
-    out += header.labels[c] ? jsonString(*header.labels[c]) : "null";
-  }
-  out += "],\n  \"elements\": [";
-}
-
-struct JsonMistake : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
-
-int32_t jsonInt32(const JsonValue* v, const char* what) {
-  if (!v || !v->integer || *v->integer < INT32_MIN || *v->integer > INT32_MAX) {
-    throw JsonMistake(std::string(what) + " must be a 32-bit integer");
-  }
-  return static_cast<int32_t>(*v->integer);
-}
-
-// One element or key half from its JSON form; `held` keeps the bytes it points to.
-NativeHalf halfOfJson(const JsonValue& v, std::string& held) {
-  switch (v.kind) {
-    case JsonValue::Kind::Null:
-      return {};
-    case JsonValue::Kind::Number:
-      return {kValue, 4, jsonInt32(&v, "a value"), {}};
-    case JsonValue::Kind::String:
-      held = v.text;
-      return stringHalf(held);
-    default:
-      break;
-  }
-  const JsonValue* text = v.find("base64");
-  const JsonValue* file = v.find("file");
-  const JsonValue* encoded = text ? text : file;
-  const auto bytes = encoded && encoded->kind == JsonValue::Kind::String ? fromBase64(encoded->text)
-                                                                         : std::nullopt;
-  if (!bytes) {
-    throw JsonMistake(
-        "an element is null, a number, a string, or an object with \"element\", "
-        "\"base64\" or \"file\" (base64 text)");
-  }
-  held = *bytes;
-  if (text) return stringHalf(held);
-  return {kFile, static_cast<int32_t>(held.size()), 0, held};
-}
-
-void buildFromJson(NativeFileBuilder& builder, const JsonValue& document) {
-  const JsonValue* dims = document.find("dimensions");
-  const JsonValue* boundaries = document.find("boundaries");
-  const JsonValue* labels = document.find("labels");
-  const JsonValue* elements = document.find("elements");
-  if (!elements || elements->kind != JsonValue::Kind::Array) {
-    throw JsonMistake("the document needs an \"elements\" list");
-  }
-  std::vector<int32_t> shape;
-  if (boundaries) {
-    for (const JsonValue& b : boundaries->items) shape.push_back(jsonInt32(&b, "a boundary"));
-  }
-  builder.setShape(dims ? jsonInt32(dims, "\"dimensions\"") : 1, shape);
-  if (labels) {
-    std::vector<std::optional<std::string>> list;
-    for (const JsonValue& label : labels->items) {
-      if (label.kind == JsonValue::Kind::String) {
-        list.emplace_back(label.text);
-      } else {
-        list.emplace_back();
-      }
-    }
-    builder.setLabels(list);
-  }
-  std::string valueBytes, keyBytes;
-  for (const JsonValue& element : elements->items) {
-    const JsonValue* keyed = element.find("element");
-    const JsonValue* key = element.find("key");
-    if (keyed && key) {
-      builder.append(halfOfJson(*keyed, valueBytes), halfOfJson(*key, keyBytes));
-    } else {
-      builder.append(halfOfJson(element, valueBytes), {});
-    }
-  }
-}
-
 // The first table row becomes the labels: the array is rebuilt without it.
 std::unique_ptr<Instance> takeHeaderRow(const Module& module, Instance& instance) {
   const Snapshot snapshot(instance);
-  const ByteBuffer bytes = readSnapshot(snapshot.file.path());
+  const ByteBuffer bytes = readBytes(snapshot.file.path());
   NativeHeader header;
   NativeFileBuilder builder;
   std::vector<std::optional<std::string>> labels;
@@ -396,7 +173,6 @@ std::unique_ptr<Instance> takeHeaderRow(const Module& module, Instance& instance
 }
 
 struct LoadOptions {
-  std::optional<ArrayFormat> from;
   bool header = false;
   bool lenient = false;
 };
@@ -412,7 +188,7 @@ std::unique_ptr<Instance> loadInput(const Module& module, const Input& input,
       buildFromRecords(builder, read.rows, options.header);
     } else {
       const JsonRead read = readJson(bytes);
-      reportProblem(input.name, read.problem, false, "");
+      if (read.problem) throw FileError(problemText(input.name, *read.problem));
       try {
         buildFromJson(builder, read.value);
       } catch (const JsonMistake& mistake) {
@@ -454,124 +230,6 @@ void warnAboutDamage(const std::string& name, const std::string& path, ArrayForm
     warn(name + " has " + plural(static_cast<int64_t>(bytes.size() - extent.end), "byte") +
          " after its last " + record + ", from byte " + std::to_string(extent.end));
   }
-}
-
-// ---------------------------------------------------------------------------------
-// The views of inspect and the shell's show.
-
-// Plain text stays as it is; anything a reader could mistake is quoted.
-std::string displayText(const std::string& value, size_t width) {
-  const bool plain =
-      !value.empty() && value.front() != ' ' && value.back() != ' ' && value.front() != '"' &&
-      std::all_of(value.begin(), value.end(), [](char c) { return c >= 0x20 && c <= 0x7E; });
-  std::string shown = plain ? value : quoteText(value);
-  if (width >= 4 && shown.size() > width) shown = shown.substr(0, width - 3) + "...";
-  return shown;
-}
-
-void printRows(const std::vector<std::vector<std::string>>& rows, std::ostream& out) {
-  std::vector<size_t> widths;
-  for (const auto& row : rows) {
-    widths.resize(std::max(widths.size(), row.size()), 0);
-    for (size_t c = 0; c < row.size(); ++c) widths[c] = std::max(widths[c], row[c].size());
-  }
-  for (const auto& row : rows) {
-    std::string line = " ";
-    for (size_t c = 0; c < row.size(); ++c) {
-      line += ' ' + row[c];
-      if (c + 1 < row.size()) line += std::string(widths[c] - row[c].size(), ' ');
-    }
-    line.erase(line.find_last_not_of(' ') + 1);
-    out << line << '\n';
-  }
-}
-
-// Which of the first `count` table rows are selected. No expression answers it: the
-// visible rows (rowList$) are matched in order against the table rows' texts, so of
-// identical rows the first ones count as the selected ones.
-std::vector<bool> selectedRows(Instance& instance, int32_t count, int32_t columns, int32_t size) {
-  const int32_t visible = askNumber(instance, kNumberOfRows);
-  const std::string delimiter = askText(instance, kDelimiter, {}).value_or(",");
-  std::vector<bool> selected(static_cast<size_t>(count), false);
-  int32_t next = 0;
-  for (int32_t r = 0; r < count && next < visible; ++r) {
-    std::string row;
-    for (int32_t c = 0; c < columns; ++c) {
-      const int32_t index = r * columns + c;
-      if (c) row += delimiter;
-      row += index < size ? askText(instance, kGetString, {number(index)}).value_or("") : "";
-    }
-    if (askText(instance, kRowList, {number(next)}) == row) {
-      selected[static_cast<size_t>(r)] = true;
-      ++next;
-    }
-  }
-  return selected;
-}
-
-void printTable(Instance& instance, int32_t size, int32_t columns, const ViewOptions& view,
-                std::ostream& out) {
-  const int32_t rows = size / columns + (size % columns ? 1 : 0);
-  const int32_t shownColumns = limit(columns, view.all ? -1 : kMaxTableColumns);
-  const int32_t shownRows = limit(rows, view.all ? -1 : view.rows.value_or(20));
-  out << "table       " << plural(rows, "row") << " x " << plural(columns, "column") << '\n';
-  std::vector<bool> selected;
-  if (view.selection) {
-    out << "selected    " << askNumber(instance, kNumberOfRows) << " of " << plural(rows, "row")
-        << " (marked *)\n";
-    selected = selectedRows(instance, shownRows, columns, size);
-  }
-  std::vector<std::vector<std::string>> lines(1, {"row"});
-  for (int32_t c = 0; c < shownColumns; ++c) {
-    const auto label = askText(instance, kGetLabel, {number(c)});
-    lines[0].push_back(label && !label->empty() ? displayText(*label, view.width)
-                                                : joined("#", std::to_string(c)));
-  }
-  for (int32_t r = 0; r < shownRows; ++r) {
-    const bool marked = !selected.empty() && selected[static_cast<size_t>(r)];
-    lines.push_back({(marked ? "*" : "") + std::to_string(r)});
-    for (int32_t c = 0; c < shownColumns; ++c) {
-      const int32_t index = r * columns + c;
-      const auto cell =
-          index < size ? askText(instance, kGetString, {number(index)}) : std::nullopt;
-      lines.back().push_back(cell ? displayText(*cell, view.width) : "");
-    }
-  }
-  printRows(lines, out);
-  if (rows > shownRows) out << "  ... " << plural(rows - shownRows, "more row") << " not shown\n";
-  if (columns > shownColumns) {
-    out << "  ... " << plural(columns - shownColumns, "more column") << " not shown\n";
-  }
-}
-
-// A value, a string (always quoted, so that "" is an empty text) or a file's size.
-std::string halfText(const NativeHalf& half, size_t width) {
-  if (half.type == 0) return "";
-  if (half.type == kValue) return std::to_string(half.number);
-  if (half.type != kString) {
-    return joined("(", plural(static_cast<int64_t>(half.bytes.size()), "byte")) + ")";
-  }
-  std::string shown = quoteText(textOf(half));
-  if (width >= 4 && shown.size() > width) shown = shown.substr(0, width - 3) + "...";
-  return shown;
-}
-
-// Every element with its type and key, from a snapshot.
-void printList(Instance& instance, int32_t size, const ViewOptions& view, std::ostream& out) {
-  const int32_t shown = limit(size, view.all ? -1 : view.rows.value_or(40));
-  std::vector<std::vector<std::string>> lines(1, {"index", "type", "value", "key type", "key"});
-  const Snapshot snapshot(instance);
-  const ByteBuffer bytes = readSnapshot(snapshot.file.path());
-  NativeHeader header;
-  walkNativeFile(bytes.view(), header, [&](const NativeHalf& value, const NativeHalf& key) {
-    if (static_cast<int32_t>(lines.size()) - 1 >= shown) return false;
-    lines.push_back({std::to_string(lines.size() - 1), elementTypeName(value.type),
-                     halfText(value, view.width), key.type ? elementTypeName(key.type) : "-",
-                     halfText(key, view.width)});
-    return true;
-  });
-  printRows(lines, out);
-  if (size > shown) out << "  ... " << plural(size - shown, "more element") << " not shown\n";
 }
 
 // ---------------------------------------------------------------------------------
@@ -634,10 +292,10 @@ struct Tally {
   void count(const NativeHalf& value, const NativeHalf& key) {
     ++elements;
     keys += key.type != 0;
-    values += value.type == kValue;
-    files += value.type == kFile;
-    valueKeys += key.type == kValue;
-    if (target == ArrayFormat::Csv && value.type == kString) {
+    values += value.type == kValueType;
+    files += value.type == kFileType;
+    valueKeys += key.type == kValueType;
+    if (target == ArrayFormat::Csv && value.type == kStringType) {
       split += textBytes(value).find_first_of(",\r\n") != std::string_view::npos;
     }
     if (target == ArrayFormat::Ini) {
@@ -770,7 +428,7 @@ Tally writeFromSnapshot(std::string_view snapshot, const ConvertPlan& plan, Nati
     return true;
   });
   if (!begun) begin();
-  if (plan.target == ArrayFormat::Json) pending += tally.elements ? "\n  ]\n}\n" : "]\n}\n";
+  if (plan.target == ArrayFormat::Json) appendJsonEnd(pending, tally.elements > 0);
   if (plan.target == ArrayFormat::CsvRfc4180 && !record.empty()) {
     // The last row padded, as the extension's CSV save pads it.
     if (h.dimensions > 1) record.resize(static_cast<size_t>(csvColumns(h, 0)));
@@ -787,53 +445,6 @@ bool sameFile(const std::string& a, const std::string& b) {
 
 }  // namespace
 
-bool takeViewOption(std::string_view arg, const std::function<std::optional<std::string>()>& next,
-                    ViewOptions& view) {
-  const std::string_view name = arg.substr(0, arg.find('='));
-  const auto count = [&]() -> size_t {
-    const std::optional<std::string> value =
-        name.size() < arg.size() ? std::optional<std::string>(arg.substr(name.size() + 1)) : next();
-    if (!value) throw UsageError(std::string(name) + " needs a value");
-    if (!looksLikeInteger(*value) || (*value)[0] == '-' || value->size() > 9) {
-      throw UsageError(std::string(name) + " needs a count, not '" + *value + "'");
-    }
-    return static_cast<size_t>(std::stoi(*value));
-  };
-  if (name == "--rows") {
-    view.rows = static_cast<int32_t>(count());
-  } else if (name == "--width") {
-    view.width = count();
-  } else if (arg == "--all") {
-    view.all = true;
-  } else if (arg == "--keys") {
-    view.keys = true;
-  } else {
-    return false;
-  }
-  if (view.all && view.rows) throw UsageError("--rows and --all exclude each other");
-  return true;
-}
-
-void printArray(Instance& instance, const ViewOptions& view, std::ostream& out) {
-  const int32_t dims = askNumber(instance, kDim);
-  const int32_t size = askNumber(instance, kSize);
-  out << "dimensions  " << dims << '\n';
-  out << "boundaries ";
-  static constexpr const char* kAxes[] = {"X", "Y", "Z"};
-  for (int32_t d = 1; d <= std::max(dims, 1); ++d) {
-    const std::string axis = d <= 3 ? kAxes[d - 1] : joined("D", std::to_string(d));
-    out << ' ' << axis << ' ' << askNumber(instance, kBoundary, {number(d)});
-  }
-  out << '\n';
-  out << "elements    " << size << '\n';
-  const int32_t columns = askNumber(instance, kBoundary, {number(1)});
-  if (dims == 2 && columns > 0 && size > 0 && !view.keys) {
-    printTable(instance, size, columns, view, out);
-  } else if (size > 0) {
-    printList(instance, size, view, out);
-  }
-}
-
 int inspectCommand(const Module& module, const std::string& path, const InspectOptions& options) {
   const ProgressNote progress("inspecting " + path);
   std::optional<TempFile> converted;
@@ -846,7 +457,7 @@ int inspectCommand(const Module& module, const std::string& path, const InspectO
   Input input =
       openInput(converted ? converted->path() : path, converted ? options.to : options.from);
   if (converted) input.name = path + " as " + formatInfo(input.format).name;
-  auto instance = loadInput(module, input, {options.from, options.header, options.lenient});
+  auto instance = loadInput(module, input, {options.header, options.lenient});
   std::cout << "file        " << input.name << '\n';
   std::cout << "format      " << formatInfo(input.format).description << " ("
             << std::filesystem::file_size(input.path) << " bytes)\n";
@@ -881,7 +492,7 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
   const bool toStdout = out == "-";
   const ProgressNote progress("converting " + options.in);
   const Input input = openInput(options.in, options.from);
-  auto instance = loadInput(module, input, {options.from, options.header, options.lenient});
+  auto instance = loadInput(module, input, {options.header, options.lenient});
   const int32_t elements = askNumber(*instance, kSize);
 
   // The extension writes its own formats, into OUT when nothing goes before them.
@@ -900,7 +511,7 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
   if (!direct) output.emplace(out);
   NativeHeader header;
   if (snapshot) {
-    const ByteBuffer bytes = readSnapshot(snapshot->file.path());
+    const ByteBuffer bytes = readBytes(snapshot->file.path());
     const Tally tally = writeFromSnapshot(
         bytes.view(), {target, options.header, ownFormat ? nullptr : &*output}, header);
     warnLosses(header, tally, target, options.header);
