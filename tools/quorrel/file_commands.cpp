@@ -206,10 +206,12 @@ std::unique_ptr<Instance> loadInput(const Module& module, const Input& input,
 }
 
 // ---------------------------------------------------------------------------------
-// Damage: a native file that ends inside an element or goes on after its last one.
+// Damage: a native or host array file that ends inside an element (a cell) or goes on
+// after its last one, as the loader's own reader finds it.
 
 void warnAboutDamage(const std::string& name, const std::string& path, ArrayFormat format) {
-  const std::string bytes = readWholeFile(path);
+  const ByteBuffer read = readBytes(path);
+  const std::string_view bytes = read.view();
   NativeHeader header;
   const FileExtent extent =
       format == ArrayFormat::Host
