@@ -397,7 +397,8 @@ std::string plainCsvRow(const std::vector<std::string>& row) {
 struct ConvertPlan {
   ArrayFormat target;
   bool header;
-  Output* out;  // for the formats the command writes; null otherwise
+  int32_t elements;  // as the instance counted them
+  Output* out;       // for the formats the command writes; null otherwise
 };
 
 // Walks the snapshot once: counts for the warnings, and the command's own formats.
@@ -409,8 +410,8 @@ Tally writeFromSnapshot(std::string_view snapshot, const ConvertPlan& plan, Nati
   const auto begin = [&] {
     begun = true;
     if (plan.target == ArrayFormat::Json) appendJsonHeader(pending, h);
-    if (plan.target == ArrayFormat::CsvRfc4180 && plan.header && h.dimensions > 1) {
-      appendRfc4180Record(labelRow(h, csvColumns(h, 0)), pending);
+    if (plan.target == ArrayFormat::CsvRfc4180 && plan.header) {
+      appendRfc4180Record(labelRow(h, csvColumns(h, plan.elements)), pending);
     }
   };
   walkNativeFile(snapshot, h, [&](const NativeHalf& value, const NativeHalf& key) {
@@ -421,7 +422,7 @@ Tally writeFromSnapshot(std::string_view snapshot, const ConvertPlan& plan, Nati
       appendJsonElement(pending, value, key);
     } else if (plan.target == ArrayFormat::CsvRfc4180) {
       record.push_back(textOf(value));
-      if (h.dimensions > 1 && static_cast<int32_t>(record.size()) == csvColumns(h, 0)) {
+      if (static_cast<int32_t>(record.size()) == csvColumns(h, plan.elements)) {
         appendRfc4180Record(record, pending);
         record.clear();
       }
@@ -433,7 +434,7 @@ Tally writeFromSnapshot(std::string_view snapshot, const ConvertPlan& plan, Nati
   if (plan.target == ArrayFormat::Json) appendJsonEnd(pending, tally.elements > 0);
   if (plan.target == ArrayFormat::CsvRfc4180 && !record.empty()) {
     // The last row padded, as the extension's CSV save pads it.
-    if (h.dimensions > 1) record.resize(static_cast<size_t>(csvColumns(h, 0)));
+    record.resize(static_cast<size_t>(csvColumns(h, plan.elements)));
     appendRfc4180Record(record, pending);
   }
   if (plan.out) plan.out->drain(pending, true);
@@ -515,7 +516,7 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
   if (snapshot) {
     const ByteBuffer bytes = readBytes(snapshot->file.path());
     const Tally tally = writeFromSnapshot(
-        bytes.view(), {target, options.header, ownFormat ? nullptr : &*output}, header);
+        bytes.view(), {target, options.header, elements, ownFormat ? nullptr : &*output}, header);
     warnLosses(header, tally, target, options.header);
   }
   if (output && ownFormat) {
