@@ -48,7 +48,7 @@ std::optional<ArrayFormat> formatOfExtension(std::string_view path);
 
 const char* elementTypeName(uint16_t type);
 
-// A native array file's contents, held whole.
+// What comes before a native file's elements: dimensions, boundaries, label records.
 struct NativeHeader {
   int32_t dimensions = 0;
   std::vector<int32_t> boundaries;                 // of dimensions 1..dimensions

@@ -13,6 +13,7 @@ namespace quorrel::tool {
 namespace {
 
 constexpr int32_t kMaxTableColumns = 12;
+
 Argument number(int32_t value) {
   return Argument(value);
 }
