@@ -8,10 +8,13 @@ _quorrel() {
       run | shell | inspect | convert | list | menu | strings) command=$word; break ;;
     esac
   done
+  # After --, every word is a file.
+  for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
+    [[ $word == -- ]] && { COMPREPLY=($(compgen -f -- "$cur")); return; }
+  done
   case $prev in
     --module) COMPREPLY=($(compgen -f -- "$cur")); return ;;
-    --to) COMPREPLY=($(compgen -W "native host csv ini csv-rfc4180 json" -- "$cur")); return ;;
-    --from) COMPREPLY=($(compgen -W "csv-rfc4180" -- "$cur")); return ;;
+    --to | --from) COMPREPLY=($(compgen -W "native host csv ini csv-rfc4180 json" -- "$cur")); return ;;
     --rows | --width) return ;;
   esac
   local options
@@ -19,8 +22,8 @@ _quorrel() {
     "") COMPREPLY=($(compgen -W "run shell inspect convert list menu strings --module --ascii --help --version" -- "$cur")); return ;;
     run) options="--echo --no-warn-files --strict --help" ;;
     shell) options="--echo --no-warn-files --strict --help" ;;
-    inspect) options="--rows --all --width --help" ;;
-    convert) options="--from --to --force --help" ;;
+    inspect) options="--rows --all --width --keys --from --to --header --lenient --help" ;;
+    convert) options="--from --to --header --lenient --force --help" ;;
     list) COMPREPLY=($(compgen -W "actions expressions --help" -- "$cur")); return ;;
     menu) COMPREPLY=($(compgen -W "actions expressions conditions" -- "$cur")); return ;;
     strings) COMPREPLY=($(compgen -W "actions expressions" -- "$cur")); return ;;

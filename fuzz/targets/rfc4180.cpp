@@ -9,9 +9,10 @@
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   using namespace quorrel::tool;
-  const CsvRows rows = readRfc4180(std::string_view(reinterpret_cast<const char*>(data), size));
+  const CsvRows rows =
+      readRfc4180(std::string_view(reinterpret_cast<const char*>(data), size)).rows;
   const std::string text = writeRfc4180(rows);
-  if (readRfc4180(text) != rows) std::abort();
-  if (writeRfc4180(readRfc4180(text)) != text) std::abort();
+  if (readRfc4180(text).rows != rows) std::abort();
+  if (writeRfc4180(readRfc4180(text).rows) != text) std::abort();
   return 0;
 }

@@ -59,6 +59,17 @@ inline constexpr std::size_t kMaxFileBytes = INT32_MAX;
 // file.
 std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare, FileStatus& status);
 
+// How far a reader got through the records (elements, cells) of a binary file, for
+// telling a damaged file from a whole one.
+struct FileExtent {
+  bool usable = false;  // the header is one the reader takes
+  int64_t declared = 0;
+  int64_t read = 0;               // records handed on
+  bool endsInsideRecord = false;  // the file ends inside the last record handed on
+  std::size_t lastRecordStart = 0;
+  std::size_t end = 0;  // where the reader stopped; the file's size unless bytes follow
+};
+
 // Collects output in large blocks so a file is written in few system calls; flushes
 // when destroyed. Numbers are written little-endian. After a refused write the rest
 // of the output is dropped and failed() is true.

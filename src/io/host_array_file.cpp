@@ -1,5 +1,7 @@
 #include "io/host_array_file.h"
 
+#include <string>
+
 #include <algorithm>
 #include <cstring>
 #include <memory>
@@ -101,9 +103,11 @@ int64_t cellCount(int32_t x, int32_t y, int32_t z) {
 // the byte after a cell's text (the next cell's length, once read, or the byte past
 // the file, which must be writable) becomes its terminator.
 template <class Sink>
-bool parseHost(char* data, std::size_t size, Sink& sink) {
+FileExtent parseHost(char* data, std::size_t size, Sink& sink) {
   Cursor in({data, size});
-  if (!in.matches(kHostFileHeader)) return false;
+  FileExtent extent;
+  if (!in.matches(kHostFileHeader)) return extent;
+  extent.usable = true;
   const int32_t version = in.i32();
   const int32_t x = in.i32();
   const int32_t y = in.i32();
@@ -111,33 +115,48 @@ bool parseHost(char* data, std::size_t size, Sink& sink) {
   const int32_t kind = in.i32();
   sink.header(x, y, z);
   const int64_t count = cellCount(x, y, z);
-  if (count <= 0) return true;
+  extent.end = in.position();
+  if (count <= 0) return extent;
+  extent.declared = count;
   // Every stored cell takes at least 4 bytes.
   sink.expectCells(std::min<int64_t>(count, static_cast<int64_t>(in.remaining() / 4 + 1)));
   if (kind == 1 || kind == 5) {
-    for (int64_t i = 0; i < count && !in.atEnd(); ++i) sink.number(in.i32());
+    for (int64_t i = 0; i < count && !in.atEnd(); ++i) {
+      extent.lastRecordStart = in.position();
+      sink.number(in.i32());
+      ++extent.read;
+    }
   } else if ((kind == 2 || kind == 6) && version == kVersion) {
     bool more = !in.atEnd();
+    extent.lastRecordStart = in.position();
     int32_t n = more ? in.i32() : 0;
     for (int64_t i = 0; i < count && more; ++i) {
-      if (n <= 0) {
-        sink.text(nullptr, n);
-        more = !in.atEnd();
-        n = more ? in.i32() : 0;
+      const int32_t length = n;
+      const std::string_view held = length > 0 ? in.take(length) : std::string_view{};
+      extent.read = i + 1;
+      extent.endsInsideRecord = in.ranShort();
+      extent.end = in.position();
+      // The next cell's length is read ahead: its first byte becomes this text's end.
+      more = !in.atEnd() && i + 1 < count;
+      if (more) extent.lastRecordStart = in.position();
+      n = more ? in.i32() : 0;
+      if (length <= 0) {
+        sink.text(nullptr, length);
         continue;
       }
-      const std::string_view held = in.take(n);
       // Nothing held means the file ended: the text is the empty one past it.
       char* const text = held.empty() ? data + size : data + (held.data() - data);
-      more = !in.atEnd() && i + 1 < count;
-      n = more ? in.i32() : 0;
       text[held.size()] = '\0';
       sink.text(text, static_cast<int32_t>(held.size()));
     }
+    return extent;
   } else if ((kind == 2 || kind == 6) && count <= kMaxByteless) {
     sink.emptyTexts(count);
+    extent.read = count;
   }
-  return true;
+  extent.endsInsideRecord = in.ranShort();
+  extent.end = in.position();
+  return extent;
 }
 
 // Texts are borrowed from the file's bytes (which the array then keeps).
@@ -175,6 +194,27 @@ struct LoadSink {
 };
 
 }  // namespace
+
+namespace {
+
+// Passes the cells by: only where they lie counts.
+struct MeasureSink {
+  void header(int32_t, int32_t, int32_t) {}
+  void expectCells(int64_t) {}
+  void number(int32_t) {}
+  void text(const char*, int32_t) {}
+  void emptyTexts(int64_t) {}
+};
+
+}  // namespace
+
+FileExtent measureHostFile(std::string_view file) {
+  // The reader ends texts in place, one byte past the file at most: it walks a copy.
+  std::string copy(file);
+  copy.push_back('\0');
+  MeasureSink sink;
+  return parseHost(copy.data(), file.size(), sink);
+}
 
 FileStatus saveHostArrayFile(ElementArray& array, const char* path, FileMode mode) {
   array.settings.fileMode = mode;

@@ -22,4 +22,7 @@ FileStatus saveHostArrayFile(ElementArray& array, const char* path, FileMode mod
 // dimensions); otherwise the cells are added at the end and dimensions stay.
 FileStatus loadHostArrayFile(ElementArray& array, const char* path, LoadMode mode);
 
+// How far the loader's own reader gets through a host array file's cells.
+FileExtent measureHostFile(std::string_view file);
+
 }  // namespace quorrel

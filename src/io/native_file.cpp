@@ -140,14 +140,16 @@ template <class Sink>
 // dimensions). Labels and records that would start at or past the end of the file
 // are not produced, which also bounds what a crafted count can ask for.
 template <class Sink>
-bool parseNative(std::string_view file, Sink& sink) {
+FileExtent parseNative(std::string_view file, Sink& sink) {
   Cursor in(file);
-  if (!in.matches(kNativeFileMagic)) return false;
+  FileExtent extent;
+  if (!in.matches(kNativeFileMagic)) return extent;
   const uint16_t version = in.u16();
   sink.version(version);
-  if (static_cast<int16_t>(version) > 1) return false;
+  if (static_cast<int16_t>(version) > 1) return extent;
   const int32_t dimensions = in.i32();
-  if (dimensions > kMaxDimensions) return false;
+  if (dimensions > kMaxDimensions) return extent;
+  extent.usable = true;
   int32_t boundaries[kMaxDimensions] = {};
   for (int32_t d = 0; d < dimensions; ++d) boundaries[d] = in.i32();
   sink.header(dimensions, boundaries);
@@ -165,15 +167,21 @@ bool parseNative(std::string_view file, Sink& sink) {
   }
 
   const int32_t elementCount = in.i32();
+  extent.declared = elementCount;
   // Every complete record takes at least 12 bytes.
   sink.expectElements(std::min<std::size_t>(std::max(elementCount, 0), in.remaining() / 12 + 1));
-  for (int32_t i = 0; i < elementCount && !in.atEnd(); ++i) {
+  bool more = true;
+  for (int32_t i = 0; i < elementCount && !in.atEnd() && more; ++i) {
     ElementRecord r;
+    extent.lastRecordStart = in.position();
     readHalf(in, sink, r.type, r.size, r.number, r.data);
     readHalf(in, sink, r.keyType, r.keySize, r.keyNumber, r.keyData);
-    sink.element(r);
+    ++extent.read;
+    extent.endsInsideRecord = in.ranShort();
+    more = sink.element(r);
   }
-  return true;
+  extent.end = in.position();
+  return extent;
 }
 
 // The operand of one half of a record: the value or key that a load stores.
@@ -216,7 +224,11 @@ struct LoadSink {
     pendingLabels.emplace_back(
         column, std::string(io_detail::textOf({label.text, static_cast<size_t>(label.length)})));
   }
-  void element(const ElementRecord& r) {
+  bool element(const ElementRecord& r) {
+    add(r);
+    return true;
+  }
+  void add(const ElementRecord& r) {
     // A half with neither bytes nor number is None whatever its type (most keys).
     const bool plainNone = r.keyData == nullptr && r.keyNumber == 0;
     const ElementValue key =
@@ -244,7 +256,38 @@ struct LoadSink {
   }
 };
 
+// Hands the parts to a visitor; a block cut short by the end is handed over as held.
+struct VisitorSink {
+  NativeFileVisitor& visitor;
+  void version(uint16_t) {}
+  void expectElements(std::size_t) {}
+  void header(int32_t dimensions, const int32_t* boundaries) {
+    visitor.header(dimensions, boundaries);
+  }
+  void label(const LabelRecord& label) { visitor.label(label.text, label.length); }
+  bool element(const ElementRecord& r) {
+    return visitor.element(half(r.type, r.size, r.number, r.data),
+                           half(r.keyType, r.keySize, r.keyNumber, r.keyData));
+  }
+  static NativeHalf half(uint16_t type, int32_t size, int32_t number, const char* data) {
+    if (type == kTypeValue || data == nullptr) return {type, size, number, {}};
+    return {type, size, number, {data, static_cast<std::size_t>(std::max(size, 0))}};
+  }
+  // Only the file's last block can be cut short, so one buffer serves.
+  const char* zeroFilled(std::string_view held, int32_t size) {
+    filled.assign(held);
+    filled.resize(static_cast<std::size_t>(size), '\0');
+    return filled.data();
+  }
+  std::string filled;
+};
+
 }  // namespace
+
+FileExtent scanNativeFile(std::string_view file, NativeFileVisitor& visitor) {
+  VisitorSink sink{visitor, {}};
+  return parseNative(file, sink);
+}
 
 FileStatus saveNativeFile(ElementArray& array, const char* path, FileMode mode) {
   array.settings.fileMode = mode;

@@ -20,4 +20,27 @@ FileStatus saveNativeFile(ElementArray& array, const char* path, FileMode mode);
 // elements are added at the end. Labels of the file replace column labels in both.
 FileStatus loadNativeFile(ElementArray& array, const char* path, LoadMode mode);
 
+// One half of an element record as the file holds it: `number` for a Value, else
+// `bytes` (a String's with its terminating zero), cut short where the file ends.
+struct NativeHalf {
+  uint16_t type = 0;
+  int32_t size = 0;
+  int32_t number = 0;
+  std::string_view bytes;
+};
+
+// Receives a native file's parts in file order, for a reader that builds no array.
+class NativeFileVisitor {
+ public:
+  virtual ~NativeFileVisitor() = default;
+  virtual void header(int32_t dimensions, const int32_t* boundaries) = 0;
+  // `text` is null for a label record without text.
+  virtual void label(const char* text, int32_t length) = 0;
+  // False stops the walk.
+  virtual bool element(const NativeHalf& value, const NativeHalf& key) = 0;
+};
+
+// Walks the file's bytes with the loader's own reader.
+FileExtent scanNativeFile(std::string_view file, NativeFileVisitor& visitor);
+
 }  // namespace quorrel

@@ -27,10 +27,14 @@ class Cursor {
 
   bool atEnd() const { return pos_ >= file_.size(); }
   std::size_t fileSize() const { return file_.size(); }
+  std::size_t position() const { return pos_; }
+  // Whether a field or block wanted more bytes than the file had left.
+  bool ranShort() const { return ranShort_; }
   std::size_t remaining() const { return file_.size() - pos_; }
 
   uint32_t unsignedLE(int byteCount) {
     const std::size_t held = std::min(static_cast<std::size_t>(byteCount), remaining());
+    ranShort_ |= held < static_cast<std::size_t>(byteCount);
     const auto* p = reinterpret_cast<const unsigned char*>(file_.data()) + pos_;
     uint32_t v = 0;
     if (held == 4) {
@@ -50,6 +54,7 @@ class Cursor {
 
   bool matches(std::string_view magic) {
     const bool same = file_.substr(pos_).starts_with(magic);
+    ranShort_ |= remaining() < magic.size();
     pos_ = std::min(pos_ + magic.size(), file_.size());
     return same;
   }
@@ -59,6 +64,7 @@ class Cursor {
   std::string_view take(int32_t count) {
     const std::size_t wanted = count > 0 ? static_cast<std::size_t>(count) : 0;
     const std::size_t held = std::min(wanted, remaining());
+    ranShort_ |= held < wanted;
     std::string_view block = atEnd() ? std::string_view(kEmpty, 0) : file_.substr(pos_, held);
     pos_ = std::min(pos_ + wanted, file_.size());
     return block;
@@ -68,6 +74,7 @@ class Cursor {
   static constexpr char kEmpty[1] = {'\0'};
   std::string_view file_;
   std::size_t pos_ = 0;
+  bool ranShort_ = false;
 };
 
 // The high bit of every byte of x that is zero, and no other bit (the carry of one

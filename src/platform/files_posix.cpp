@@ -7,6 +7,8 @@
 #include <cerrno>
 #include <cstdlib>
 #include <memory>
+#include <random>
+#include <string>
 #include <utility>
 
 #include "platform/file_system.h"
@@ -24,10 +26,14 @@ namespace {
 
 constexpr std::size_t kMaxTransfer = std::size_t{1} << 30;
 
+// A created file gets what the umask leaves of read and write for everyone, as any
+// program's plain create does.
+constexpr mode_t kCreateMode = 0666;
+
 int openRetrying(const char* path, int flags) {
   int fd;
   do {
-    fd = ::open(path, flags | O_CLOEXEC, 0600);
+    fd = ::open(path, flags | O_CLOEXEC, kCreateMode);
   } while (fd < 0 && errno == EINTR);
   return fd;
 }
@@ -89,6 +95,25 @@ const char* const kFolderSeparators = "/";
 
 }  // namespace file_system
 
+namespace {
+
+// A new file beside the target that no one else has, created like any other file
+// (mkstemp would give it mode 0600 whatever the umask). Its name goes to `temp`.
+int createTemporary(const std::string& folder, std::string& temp) {
+  static constexpr char kNameChars[] = "abcdefghijklmnopqrstuvwxyz0123456789";
+  std::random_device entropy;
+  std::minstd_rand pick(entropy());
+  for (int attempt = 0; attempt < 100; ++attempt) {
+    temp = folder + ".quorrel-";
+    for (int i = 0; i < 8; ++i) temp += kNameChars[pick() % (sizeof kNameChars - 1)];
+    const int fd = file_system::openRetrying(temp.c_str(), O_WRONLY | O_CREAT | O_EXCL);
+    if (fd >= 0 || errno != EEXIST) return fd;
+  }
+  return -1;
+}
+
+}  // namespace
+
 void SaveFile::openReplacing(const char* path) {
   // A link is followed to the file it names, which is the one replaced. A dangling
   // link is written through, creating the file it names.
@@ -113,8 +138,8 @@ void SaveFile::openReplacing(const char* path) {
     existing = FileHandle(file_system::open(target.c_str(), file_system::OpenFor::Rewriting));
     if (!existing.isOpen()) return;
   }
-  std::string temp = folderOf(target) + ".quorrel-XXXXXX";
-  const int fd = ::mkostemp(temp.data(), O_CLOEXEC);
+  std::string temp;
+  const int fd = createTemporary(folderOf(target), temp);
   if (fd < 0) {
     // A read-only folder: the old file is rewritten where it is.
     if (existing.isOpen() && ::ftruncate(existing.fd_, 0) == 0) {

@@ -307,6 +307,29 @@ TEST_F(HostArrayFile, TruncatedExampleLoadsWhatItHolds) {
   }
 }
 
+TEST_F(HostArrayFile, MeasureSaysWhereTheCellsEnd) {
+  // The example's cells start at bytes 30, 35, 40 and 44; the file ends at 48.
+  const FileExtent whole = measureHostFile(kHostExample + "xyz");
+  EXPECT_TRUE(whole.usable);
+  EXPECT_EQ(whole.declared, 4);
+  EXPECT_EQ(whole.read, 4);
+  EXPECT_FALSE(whole.endsInsideRecord);
+  EXPECT_EQ(whole.end, 48u);
+  const FileExtent inside = measureHostFile(kHostExample.substr(0, 38));  // in cell 1's length
+  EXPECT_EQ(inside.read, 2);
+  EXPECT_TRUE(inside.endsInsideRecord);
+  EXPECT_EQ(inside.lastRecordStart, 35u);
+  const FileExtent between = measureHostFile(kHostExample.substr(0, 40));  // after cell 1
+  EXPECT_EQ(between.read, 2);
+  EXPECT_FALSE(between.endsInsideRecord);
+  EXPECT_EQ(between.end, 40u);
+  const FileExtent numbers = measureHostFile(head(2, 2, 1, 1, 1) + le32(7) + "ab");
+  EXPECT_EQ(numbers.read, 2);
+  EXPECT_TRUE(numbers.endsInsideRecord);
+  EXPECT_EQ(numbers.lastRecordStart, 34u);
+  EXPECT_FALSE(measureHostFile("CNC ARR").usable);
+}
+
 TEST_F(HostArrayFile, HostileSizesReadNoCellsOrOnlyWhatIsThere) {
   const std::string cells = le32(1) + "a" + le32(1) + "b";
   for (const std::string& bytes :

@@ -141,10 +141,15 @@ TEST_F(SaveFileTest, ReplacesTheTargetKeepingItsPermissionsLinksAndFolder) {
     const std::string expected = readBytes(path("expected"));
     ASSERT_FALSE(expected.empty());
 
-    // A new file gets owner read and write.
+    // A new file gets what the umask leaves of 0666, as a plain create would.
     save(a, path("new").c_str());
     EXPECT_EQ(readBytes(path("new")), expected);
-    EXPECT_EQ(modeOf(path("new")), 0600u);
+    EXPECT_EQ(modeOf(path("new")), 0644u);
+    umask(027);
+    save(a, path("private").c_str());
+    EXPECT_EQ(modeOf(path("private")), 0640u);
+    umask(022);
+    std::filesystem::remove(path("private"));
 
     // An old file keeps its permission bits.
     writeBytes(path("old"), "old bytes");

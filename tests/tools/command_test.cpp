@@ -60,11 +60,34 @@ TEST(Rfc4180, ReadsQuotesDoubledQuotesAndLineBreaks) {
 x)",
        {{"a,b", "say \"hi\"", ""}, {"x"}}},
       {"\"two\r\nlines\",z\r\n", {{"two\r\nlines", "z"}}},
-      // Lenient: a quote inside an unquoted field is text; text after a closing
-      // quote is kept; an unterminated quote runs to the end.
-      {"a\"b,\"c\"d,\"e\nf", {{"a\"b", "cd", "e\nf"}}},
   };
-  for (const auto& c : cases) EXPECT_EQ(readRfc4180(c.text), c.rows) << c.text;
+  for (const auto& c : cases) {
+    const Rfc4180Read read = readRfc4180(c.text);
+    EXPECT_EQ(read.rows, c.rows) << c.text;
+    EXPECT_FALSE(read.problem) << c.text;
+  }
+}
+
+TEST(Rfc4180, NamesTheLineOfTheFirstBrokenRecordAndKeepsTheRecordsBefore) {
+  const struct {
+    std::string_view text;
+    size_t line;
+    const char* what;
+    CsvRows before;
+  } cases[] = {
+      // The quote opens on line 1 and is never closed.
+      {"a,\"unterminated\nb,2\n", 1, "a quoted field is not closed", {}},
+      // A quoted line break counts: the text after the quote is on line 3.
+      {"h\n\"x\ny\"z,1\n", 3, "text after a closing quote", {{"h"}}},
+      {"ok\r\nok\r\na\"b\r\n", 3, "a quote inside an unquoted field", {{"ok"}, {"ok"}}},
+  };
+  for (const auto& c : cases) {
+    const Rfc4180Read read = readRfc4180(c.text);
+    ASSERT_TRUE(read.problem) << c.text;
+    EXPECT_EQ(read.problem->line, c.line) << c.text;
+    EXPECT_EQ(read.problem->what, c.what) << c.text;
+    EXPECT_EQ(read.rows, c.before) << c.text;
+  }
 }
 
 TEST(Rfc4180, WritesQuotesOnlyWhereNeededAndReadsBack) {
@@ -72,7 +95,7 @@ TEST(Rfc4180, WritesQuotesOnlyWhereNeededAndReadsBack) {
   const CsvRows rows = {{"plain", "a,b", "q\"", ""}, {"cr\r", "lf\n", " lead"}, {""}};
   const std::string text = writeRfc4180(rows);
   EXPECT_EQ(text, "plain,\"a,b\",\"q\"\"\",\r\n\"cr\r\",\"lf\n\", lead\r\n\r\n");
-  EXPECT_EQ(readRfc4180(text), rows);
+  EXPECT_EQ(readRfc4180(text).rows, rows);
 }
 
 TEST(Json, StringsEscapeControlsAndKeepUtf8) {
@@ -83,6 +106,33 @@ TEST(Json, StringsEscapeControlsAndKeepUtf8) {
   EXPECT_EQ(jsonString("\x80"), "\"\xc2\x80\"");
   EXPECT_EQ(jsonString("\xc0\xaf"), "\"\xc3\x80\xc2\xaf\"");
   EXPECT_EQ(jsonString("\xed\xa0\x80"), "\"\xc3\xad\xc2\xa0\xc2\x80\"");
+}
+
+TEST(Json, ReadsWhatItWritesAndNamesTheLineOfAMistake) {
+  const JsonRead read =
+      readJson("{\"a\": [1, -2147483648, 2.5, null, true],\n \"s\": \"\\u00e9\\ud83d\\ude00\\n\"}");
+  ASSERT_FALSE(read.problem);
+  const JsonValue* a = read.value.find("a");
+  ASSERT_TRUE(a && a->items.size() == 5);
+  EXPECT_EQ(a->items[1].integer, -2147483648);
+  EXPECT_FALSE(a->items[2].integer);  // not an integer
+  EXPECT_EQ(a->items[3].kind, JsonValue::Kind::Null);
+  EXPECT_EQ(read.value.find("s")->text, "\xc3\xa9\xf0\x9f\x98\x80\n");
+  const JsonRead broken = readJson("{\n\"a\": [1,\n 2\n}");
+  ASSERT_TRUE(broken.problem);
+  EXPECT_EQ(broken.problem->line, 4u);
+  EXPECT_EQ(broken.problem->what, "a closing bracket is missing");
+}
+
+TEST(Base64, EncodesEveryLengthAndRefusesOtherText) {
+  EXPECT_EQ(base64(""), "");
+  EXPECT_EQ(base64("f"), "Zg==");
+  EXPECT_EQ(base64("fo"), "Zm8=");
+  EXPECT_EQ(base64(std::string("\0\xff\x10", 3)), "AP8Q");
+  EXPECT_EQ(fromBase64("Zm8="), "fo");
+  EXPECT_EQ(fromBase64("AP8Q"), std::string("\0\xff\x10", 3));
+  EXPECT_FALSE(fromBase64("Z"));
+  EXPECT_FALSE(fromBase64("Zm-8"));
 }
 
 }  // namespace

@@ -22,7 +22,8 @@ check 1 "quorrel: cannot read /dev/zero: it is not a regular file" convert /dev/
 printf 'A 8 "x"\nA 0 "/dev/null/x.arr"\nA 0 "/dev/full"\n' >t.qs
 check 0 't.qs:2: warning: saveToFile "/dev/null/x.arr": could not open it (Not a directory)
 t.qs:3: warning: saveToFile "/dev/full": could not write it (No space left on device)' run t.qs
-# Output that cannot be written is an error, whether found while running or at the end.
+# Output that cannot be written is an error, whether found while running or at the end;
+# binary output to a terminal needs --force.
 check_full() {  # command...
   local err
   err=$("$quorrel" "$@" 2>&1 >/dev/full)
@@ -33,6 +34,8 @@ check_full() {  # command...
   fi
 }
 check_full list
+check_full inspect t.qs --from csv
+check_full convert t.qs - --to json --from csv
 printf 'E size(\n' >size.qs
 check_full run size.qs
 # A command copied away from its module says where it looked and how to name it.
@@ -40,6 +43,13 @@ cp "$quorrel" ./copied
 err=$(./copied list 2>&1 >/dev/null)
 if [[ $? != 1 || $err != *"$PWD/libquorrel.so"*"--module PATH"* ]]; then
   echo "a copied quorrel: '$err'"; fail=1
+fi
+if command -v script >/dev/null; then
+  err=$(script -qec "$quorrel convert t.qs - --to native --from csv" /dev/null | tr -d '\r')
+  if [[ $err != "quorrel: convert will not write a native array file to a terminal"* ]]; then
+    echo "binary output to a terminal: $err"
+    fail=1
+  fi
 fi
 if [[ $(id -u) != 0 ]]; then
   printf 'a,b\r\n' >locked.csv && chmod 000 locked.csv

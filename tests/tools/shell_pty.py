@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
 """The interactive shell through a pseudo-terminal: help, completion, Ctrl-C, history
-across two sessions, quitting. Usage: shell_pty.py QUORREL. Exit 77 (skipped) when
+across two sessions, show with its options and the selection, quitting. Usage: shell_pty.py QUORREL. Exit 77 (skipped) when
 the system has no pseudo-terminals or the shell was built without line editing."""
 import fcntl
 import os
@@ -127,6 +127,24 @@ with tempfile.TemporaryDirectory() as home:
     shell.send("\x1b[A\x1b[A\x1b[A\r")
     shell.expect("E size(", "recalled line")
     shell.expect("0\r\n", "recalled line's result in a fresh instance")
+    shell.expect("quorrel> ", "prompt before show")
+    # show marks the selected rows, shows all ten columns of a default-width table
+    # and takes inspect's view options.
+    rows = [f'A appendRowFromList "r{row},b,c,d,e,f,g,h,i,j{row}"' for row in range(3)]
+    for line in ["new autoselect=1", *rows, "A invertSelection",
+                 'A selectWhereContainingByColumn 0 "r1"']:
+        shell.send(line + "\r")
+        shell.expect("quorrel> ", line)
+    shell.send("show\r")
+    shell.expect("selected    1 of 3 rows (marked *)", "show's selection")
+    shell.expect("#8 #9\r\n", "show's tenth column")
+    shell.expect("  0   r0", "show's unselected row")
+    shell.expect("  *1  r1", "show's selected row")
+    shell.send("show --keys --rows 1\r")
+    shell.expect('0     string "r0"', "show --keys")
+    shell.expect("29 more elements not shown", "show --rows")
+    shell.send("show --bogus\r")
+    shell.expect("not --bogus", "show's unknown option")
     shell.expect("quorrel> ", "prompt before Ctrl-D")
     shell.send_control("\x04", "Ctrl-D")
     shell.finish("Ctrl-D")
@@ -134,4 +152,4 @@ with tempfile.TemporaryDirectory() as home:
 if failures:
     print("\n".join(failures))
     sys.exit(1)
-print("shell: help, completion, Ctrl-C, show, history and quitting work")
+print("shell: help, completion, Ctrl-C, show and its options, history and quitting work")

@@ -1,365 +1,444 @@
 // `quorrel inspect` and `quorrel convert`: a file is loaded into a fresh instance
 // through the load actions and read back through the expressions, as a host would.
+// What no expression tells (element and key types, every element of a big array in
+// one pass) comes from a native snapshot the instance saves, walked with the core's
+// own reader.
 #include <algorithm>
+#include <chrono>
+#include <condition_variable>
 #include <cstdlib>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <iostream>
+#include <mutex>
+#include <thread>
 
 #include "array_files.h"
 #include "catalog.h"
 #include "commands.h"
+#include "instance_reads.h"
+#include "io/file_handle.h"
+#include "io/host_array_file.h"
 #include "temp_file.h"
 #include "text_formats.h"
 
 namespace quorrel::tool {
 namespace {
 
-constexpr int kMaxTableColumns = 8;
-
-// Expression codes the inspection reads.
-constexpr int32_t kSize = 0;
-constexpr int32_t kGetString = 2;
-constexpr int32_t kGetValue = 3;
-constexpr int32_t kKeyString = 4;
-constexpr int32_t kKeyValue = 5;
-constexpr int32_t kDim = 26;
-constexpr int32_t kBoundary = 27;
-constexpr int32_t kGetLabel = 43;
-constexpr int32_t kAppendString = 8;
-
-ArrayFormat recogniseOrFail(const std::string& path, std::string_view bytes) {
-  const auto format = recogniseFormat(bytes);
-  if (!format) throw FileError(path + " is not a native array, host array, CSV or INI file");
-  return *format;
-}
-
-Argument number(int32_t value) {
-  return Argument(value);
-}
 Argument text(const std::string& value) {
   return Argument(value);
 }
 
-int32_t askNumber(Instance& instance, int32_t code, std::vector<Argument> args = {}) {
-  const ExpressionResult result = instance.callExpression(code, args);
-  return result.isText ? 0 : result.number;
+void warn(const std::string& what) {
+  std::cerr << "quorrel: warning: " << what << '\n';
 }
 
-std::optional<std::string> askText(Instance& instance, int32_t code, std::vector<Argument> args) {
-  ExpressionResult result = instance.callExpression(code, args);
-  if (!result.isText) return std::nullopt;
-  return std::move(result.text);
+// Runs a file action and turns a failure the module reports into a FileError.
+void fileAction(const Module& module, Instance& instance, const char* action,
+                const std::string& path, const std::string& shownPath) {
+  instance.callAction(actionCodeOfName(action).value(), {text(path)});
+  const auto status = module.fileStatus();
+  if (!status || status->first == 0) return;
+  const bool load = std::string_view(action).starts_with("load");
+  throw FileError(std::string(load ? "cannot read " : "cannot write ") + shownPath + ": " +
+                  (status->second ? std::strerror(status->second) : failedFileStep(status->first)));
 }
 
-// A file operand: its bytes, and a path the extension can open (a copy of standard
-// input for "-").
-struct Input {
-  std::string name;
-  std::string bytes;
-  std::unique_ptr<TempFile> copy;
-  std::string path() const { return copy ? copy->path() : name; }
+// ---------------------------------------------------------------------------------
+// A note on standard error while a long command runs, when it is a terminal.
+
+class ProgressNote {
+ public:
+  explicit ProgressNote(std::string what) : what_(std::move(what)) {
+    if (!isTerminal(stderr)) return;
+    ticker_ = std::thread([this] { tick(); });
+  }
+  ~ProgressNote() {
+    if (!ticker_.joinable()) return;
+    {
+      const std::lock_guard lock(mutex_);
+      done_ = true;
+    }
+    wake_.notify_one();
+    ticker_.join();
+  }
+  ProgressNote(const ProgressNote&) = delete;
+  ProgressNote& operator=(const ProgressNote&) = delete;
+
+ private:
+  static constexpr auto kQuiet = std::chrono::seconds(2);
+
+  void tick() {
+    std::unique_lock lock(mutex_);
+    const auto start = std::chrono::steady_clock::now();
+    if (wake_.wait_for(lock, kQuiet, [this] { return done_; })) return;
+    bool shown = false;
+    do {
+      const auto seconds =
+          std::chrono::duration_cast<std::chrono::seconds>(std::chrono::steady_clock::now() - start)
+              .count();
+      std::fprintf(stderr, "\rquorrel: %s... %llds", what_.c_str(),
+                   static_cast<long long>(seconds));
+      std::fflush(stderr);
+      shown = true;
+    } while (!wake_.wait_for(lock, std::chrono::seconds(1), [this] { return done_; }));
+    if (shown) std::fprintf(stderr, "\r\033[K");
+  }
+
+  std::string what_;
+  std::thread ticker_;
+  std::mutex mutex_;
+  std::condition_variable wake_;
+  bool done_ = false;
 };
 
-Input readInput(const std::string& name) {
-  Input input{name, {}, nullptr};
-  if (name == "-") {
+// ---------------------------------------------------------------------------------
+// Input: a path the extension can open (a copy of standard input for "-") and its
+// format.
+
+constexpr size_t kRecognitionBytes = 64 * 1024;
+
+struct Input {
+  std::string name;  // as messages show it
+  std::string path;
+  ArrayFormat format = ArrayFormat::Native;
+  std::unique_ptr<TempFile> copy;
+};
+
+Input openInput(const std::string& operand, std::optional<ArrayFormat> from) {
+  Input input{operand, operand, ArrayFormat::Native, nullptr};
+  if (operand == "-") {
     input.name = "<stdin>";
-    input.bytes = readStandardInput();
     input.copy = std::make_unique<TempFile>();
-    writeWholeFile(input.copy->path(), input.bytes);
-  } else {
-    input.bytes = readWholeFile(name);
+    input.path = input.copy->path();
+    copyStandardInputTo(input.path);
   }
+  const std::string start = readFileStart(input.path, kRecognitionBytes);
+  if (from) {
+    input.format = *from;
+    return input;
+  }
+  const auto format = recogniseFormat(start);
+  if (!format) {
+    throw FileError(input.name + " is not a native array, host array, CSV, INI or JSON file");
+  }
+  input.format = *format;
   return input;
 }
 
-// A one-dimensional instance takes a file as the file says; the CSV and native loads
-// set their own dimensions.
-std::unique_ptr<Instance> loadInto(const Module& module, ArrayFormat format,
-                                   const std::string& path) {
+// A native file made by the command, loaded by a fresh one-dimensional instance (the
+// load sets the dimensions the file holds).
+std::unique_ptr<Instance> loadBuilt(const Module& module, NativeFileBuilder& builder) {
+  const TempFile built;
+  if (!builder.save(built.path())) throw FileError("cannot write " + built.path());
   SetupFields setup;
   setup.dims = 1;
   auto instance = std::make_unique<Instance>(module, setup);
-  instance->callAction(actionCodeOfName(formatInfo(format).loadAction).value(), {text(path)});
+  fileAction(module, *instance, formatInfo(ArrayFormat::Native).loadAction, built.path(),
+             built.path());
   return instance;
 }
 
-// The element types, taken from a native snapshot of the instance.
-std::vector<ElementTypes> snapshotTypes(Instance& instance) {
-  try {
-    const TempFile snapshot;
-    instance.callAction(actionCodeOfName(formatInfo(ArrayFormat::Native).saveAction).value(),
-                        {text(snapshot.path())});
-    return readNativeElementTypes(snapshot.path());
-  } catch (const FileError&) {
-    return {};
-  }
+std::string problemText(const std::string& name, const TextProblem& problem) {
+  return name + ':' + std::to_string(problem.line) + ": " + problem.what;
 }
 
-// Everything the expressions tell of an instance, read once.
-struct ArrayContents {
-  int32_t dims = 0;
-  int32_t size = 0;
-  std::vector<int32_t> boundaries;               // of dimensions 1..max(dims, 1)
-  std::vector<std::string> labels;               // of columns 0..X-1, empty when unlabelled
-  std::vector<ElementTypes> types;               // per element
-  std::vector<std::string> texts;                // per element
-  std::vector<std::optional<std::string>> keys;  // per element, none without a key
-  int32_t columns() const { return boundaries.empty() ? 0 : boundaries[0]; }
+// A broken text file is an error, or with --lenient a warning and what came before.
+void reportProblem(const std::string& name, const std::optional<TextProblem>& problem, bool lenient,
+                   const char* kept) {
+  if (!problem) return;
+  if (!lenient) throw FileError(problemText(name, *problem) + " (--lenient keeps " + kept + ")");
+  warn(problemText(name, *problem) + "; " + kept + " kept");
+}
+
+// The first table row becomes the labels: the array is rebuilt without it.
+std::unique_ptr<Instance> takeHeaderRow(const Module& module, Instance& instance) {
+  const Snapshot snapshot(instance);
+  const ByteBuffer bytes = readBytes(snapshot.file.path());
+  NativeHeader header;
+  NativeFileBuilder builder;
+  std::vector<std::optional<std::string>> labels;
+  walkNativeFile(bytes.view(), header, [&](const NativeHalf& value, const NativeHalf& key) {
+    if (labels.size() < static_cast<size_t>(std::max(header.columns(), 0))) {
+      labels.emplace_back(textOf(value));
+    } else {
+      builder.append(value, key);
+    }
+    return true;
+  });
+  builder.setShape(header.dimensions, header.boundaries);
+  builder.setLabels(labels);
+  return loadBuilt(module, builder);
+}
+
+struct LoadOptions {
+  bool header = false;
+  bool lenient = false;
 };
 
-ArrayContents readContents(Instance& instance) {
-  ArrayContents a;
-  a.dims = askNumber(instance, kDim);
-  a.size = askNumber(instance, kSize);
-  for (int32_t d = 1; d <= std::max(a.dims, 1); ++d) {
-    a.boundaries.push_back(askNumber(instance, kBoundary, {number(d)}));
-  }
-  for (int32_t c = 0; c < a.columns() && a.dims >= 2; ++c) {
-    a.labels.push_back(askText(instance, kGetLabel, {number(c)}).value_or(""));
-  }
-  a.types = snapshotTypes(instance);
-  a.types.resize(static_cast<size_t>(std::max(a.size, 0)));
-  for (int32_t i = 0; i < a.size; ++i) {
-    a.texts.push_back(askText(instance, kGetString, {number(i)}).value_or(""));
-    if (a.types[i].keyType == 0) {
-      a.keys.emplace_back();
+std::unique_ptr<Instance> loadInput(const Module& module, const Input& input,
+                                    const LoadOptions& options) {
+  if (input.format == ArrayFormat::CsvRfc4180 || input.format == ArrayFormat::Json) {
+    const std::string bytes = readWholeFile(input.path);
+    NativeFileBuilder builder;
+    if (input.format == ArrayFormat::CsvRfc4180) {
+      const Rfc4180Read read = readRfc4180(bytes);
+      reportProblem(input.name, read.problem, options.lenient, "the records before it");
+      buildFromRecords(builder, read.rows, options.header);
     } else {
-      a.keys.push_back(askText(instance, kKeyString, {number(i)}).value_or(""));
+      const JsonRead read = readJson(bytes);
+      if (read.problem) throw FileError(problemText(input.name, *read.problem));
+      try {
+        buildFromJson(builder, read.value);
+      } catch (const JsonMistake& mistake) {
+        throw FileError(input.name + ": " + mistake.what());
+      }
+    }
+    return loadBuilt(module, builder);
+  }
+  SetupFields setup;
+  setup.dims = 1;
+  auto instance = std::make_unique<Instance>(module, setup);
+  fileAction(module, *instance, formatInfo(input.format).loadAction, input.path, input.name);
+  if (options.header && input.format == ArrayFormat::Csv) return takeHeaderRow(module, *instance);
+  return instance;
+}
+
+// ---------------------------------------------------------------------------------
+// Damage: a native or host array file that ends inside an element (a cell) or goes on
+// after its last one, as the loader's own reader finds it.
+
+void warnAboutDamage(const std::string& name, const std::string& path, ArrayFormat format) {
+  const ByteBuffer read = readBytes(path);
+  const std::string_view bytes = read.view();
+  NativeHeader header;
+  const FileExtent extent =
+      format == ArrayFormat::Host
+          ? measureHostFile(bytes)
+          : walkNativeFile(bytes, header,
+                           [](const NativeHalf&, const NativeHalf&) { return true; });
+  const char* record = format == ArrayFormat::Host ? "cell" : "element";
+  if (!extent.usable) return;
+  if (extent.endsInsideRecord) {
+    warn(name + " ends inside " + record + ' ' + std::to_string(extent.read - 1) +
+         " (which starts at byte " + std::to_string(extent.lastRecordStart) + ", the file has " +
+         plural(static_cast<int64_t>(bytes.size()), "byte") + "); it declares " +
+         plural(extent.declared, record));
+  } else if (extent.read < extent.declared) {
+    warn(name + " ends at byte " + std::to_string(extent.end) + " after " +
+         plural(extent.read, record) + "; it declares " + std::to_string(extent.declared));
+  } else if (extent.end < bytes.size()) {
+    warn(name + " has " + plural(static_cast<int64_t>(bytes.size() - extent.end), "byte") +
+         " after its last " + record + ", from byte " + std::to_string(extent.end));
+  }
+}
+
+// ---------------------------------------------------------------------------------
+// Output: a file or standard output, written in large pieces.
+
+class Output {
+ public:
+  explicit Output(const std::string& path) : name_(path == "-" ? "standard output" : path) {
+    if (path != "-") {
+      file_.open(path, std::ios::binary | std::ios::trunc);
+      if (!file_) throw FileError("cannot write " + path + ": " + std::strerror(errno));
     }
   }
-  return a;
-}
-
-// Plain text stays as it is; anything a reader could mistake is quoted.
-std::string displayText(const std::string& value, size_t width) {
-  const bool plain =
-      !value.empty() && value.front() != ' ' && value.back() != ' ' && value.front() != '"' &&
-      std::all_of(value.begin(), value.end(), [](char c) { return c >= 0x20 && c <= 0x7E; });
-  return cutToWidth(plain ? value : quoteText(value), width);
-}
-
-void printRows(const std::vector<std::vector<std::string>>& rows, std::ostream& out) {
-  std::vector<size_t> widths;
-  for (const auto& row : rows) {
-    widths.resize(std::max(widths.size(), row.size()), 0);
-    for (size_t c = 0; c < row.size(); ++c) widths[c] = std::max(widths[c], printedWidth(row[c]));
-  }
-  for (const auto& row : rows) {
-    std::string line = " ";
-    for (size_t c = 0; c < row.size(); ++c) {
-      line += ' ' + row[c];
-      if (c + 1 < row.size()) line += std::string(widths[c] - printedWidth(row[c]), ' ');
-    }
-    line.erase(line.find_last_not_of(' ') + 1);
-    out << line << '\n';
-  }
-}
-
-// head + tail by appending: GCC 12 at -O3 reports a false -Wrestrict overlap in
-// "literal" + std::string&& (its insert-at-front path), which -Werror turns fatal.
-std::string joined(const char* head, const std::string& tail) {
-  std::string text = head;
-  text += tail;
-  return text;
-}
-
-std::string plural(int64_t count, const char* noun) {
-  return std::to_string(count) + ' ' + noun + (count == 1 ? "" : "s");
-}
-
-int32_t limit(int32_t count, int32_t most) {
-  return most < 0 ? count : std::min(count, most);
-}
-
-void printTable(Instance& instance, int32_t size, int32_t columns, const ViewOptions& view,
-                std::ostream& out) {
-  const int32_t rows = size / columns + (size % columns ? 1 : 0);
-  const int32_t shownColumns = limit(columns, view.all ? -1 : kMaxTableColumns);
-  const int32_t shownRows = limit(rows, view.all ? -1 : view.rows.value_or(20));
-  out << "table       " << plural(rows, "row") << " x " << plural(columns, "column") << '\n';
-  std::vector<std::vector<std::string>> lines(1, {"row"});
-  for (int32_t c = 0; c < shownColumns; ++c) {
-    const auto label = askText(instance, kGetLabel, {number(c)});
-    lines[0].push_back(label && !label->empty() ? displayText(*label, view.width)
-                                                : joined("#", std::to_string(c)));
-  }
-  for (int32_t r = 0; r < shownRows; ++r) {
-    lines.push_back({std::to_string(r)});
-    for (int32_t c = 0; c < shownColumns; ++c) {
-      const int32_t index = r * columns + c;
-      const auto cell =
-          index < size ? askText(instance, kGetString, {number(index)}) : std::nullopt;
-      lines.back().push_back(cell ? displayText(*cell, view.width) : "");
+  void write(std::string_view bytes) {
+    if (file_.is_open()) {
+      file_.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
+    } else {
+      writeStandardOutput(bytes);
     }
   }
-  printRows(lines, out);
-  if (rows > shownRows) out << "  ... " << plural(rows - shownRows, "more row") << " not shown\n";
-  if (columns > shownColumns) {
-    out << "  ... " << plural(columns - shownColumns, "more column") << " not shown\n";
+  // Writes `pending` once it has grown large, and empties it.
+  void drain(std::string& pending, bool force = false) {
+    if (!force && pending.size() < (size_t{1} << 20)) return;
+    write(pending);
+    pending.clear();
   }
-}
+  void copyFrom(const std::string& path) {
+    std::ifstream in(path, std::ios::binary);
+    std::string chunk(size_t{1} << 20, '\0');
+    while (in.read(chunk.data(), static_cast<std::streamsize>(chunk.size())) || in.gcount() > 0) {
+      write(std::string_view(chunk.data(), static_cast<size_t>(in.gcount())));
+    }
+  }
+  void finish() {
+    if (file_.is_open() && !file_.flush()) throw FileError("cannot write " + name_);
+  }
 
-void printList(Instance& instance, int32_t size, const ViewOptions& view, std::ostream& out) {
-  const auto types = snapshotTypes(instance);
-  const int32_t shown = limit(size, view.all ? -1 : view.rows.value_or(40));
-  std::vector<std::vector<std::string>> lines(1, {"index", "type", "key", "text"});
-  for (int32_t i = 0; i < shown; ++i) {
-    const ElementTypes element = i < static_cast<int32_t>(types.size()) ? types[i] : ElementTypes{};
-    const auto key = askText(instance, kKeyString, {number(i)});
-    const auto value = askText(instance, kGetString, {number(i)});
-    std::string shownText = value ? displayText(*value, view.width) : "";
-    if (element.type == 3) shownText = joined("(", plural(element.size, "byte")) + ")";
-    lines.push_back({std::to_string(i), elementTypeName(element.type),
-                     key ? displayText(*key, view.width) : "-", shownText});
-  }
-  printRows(lines, out);
-  if (size > shown) out << "  ... " << plural(size - shown, "more element") << " not shown\n";
-}
+ private:
+  std::string name_;
+  std::ofstream file_;
+};
 
 // ---------------------------------------------------------------------------------
 // Loss warnings: what the target format cannot carry, said once per kind.
 
 // Whether an INI line written for this key and text reads back as the same entry.
-bool iniKeepsEntry(const std::optional<std::string>& key, const std::string& value) {
-  const std::string k = key.value_or("");
+bool iniKeepsEntry(std::string_view k, std::string_view value) {
   if (k.size() + 1 + value.size() < 2) return false;  // a one-character line is skipped
-  if (k.find_first_of("=\r\n") != std::string::npos) return false;
-  if (value.find_first_of("\r\n") != std::string::npos) return false;
+  if (k.find_first_of("=\r\n") != std::string_view::npos) return false;
+  if (value.find_first_of("\r\n") != std::string_view::npos) return false;
   const size_t start = k.find_first_not_of(" \t");
-  if (start != 0 && !(k.empty() && start == std::string::npos)) return false;
-  return !(k.rfind("[", 0) == 0 || k.rfind("//", 0) == 0);
+  if (start != 0 && !(k.empty() && start == std::string_view::npos)) return false;
+  return !(k.starts_with("[") || k.starts_with("//"));
 }
 
-// `quoted`: CSV written by the RFC 4180 writer, which keeps commas and line breaks.
-void warnLosses(const ArrayContents& a, ArrayFormat target, bool quoted, std::ostream& err) {
-  if (target == ArrayFormat::Native) return;
-  const char* name = formatInfo(target).description;
-  auto warn = [&](const std::string& what) { err << "quorrel: warning: " << what << '\n'; };
-
-  const auto labelled = std::count_if(a.labels.begin(), a.labels.end(),
-                                      [](const std::string& l) { return !l.empty(); });
-  if (labelled > 0) warn(plural(labelled, "column label") + " dropped: the " + name + " has none");
-
-  if (target != ArrayFormat::Ini) {
-    const auto keyed = std::count_if(a.keys.begin(), a.keys.end(),
-                                     [](const auto& key) { return key.has_value(); });
-    if (keyed > 0) warn(plural(keyed, "key") + " dropped: the " + name + " has none");
-  }
-
-  int64_t values = 0, files = 0;
-  for (const auto& t : a.types) {
-    values += t.type == 1;
-    files += t.type == 3;
-  }
-  int64_t valueKeys = 0;
-  for (const auto& t : a.types) valueKeys += target == ArrayFormat::Ini && t.keyType == 1;
-  if (values > 0) warn(plural(values, "value element") + " will read back as text");
-  if (files > 0) warn(plural(files, "file element") + " written as empty text");
-  if (valueKeys > 0) warn(plural(valueKeys, "value key") + " will read back as text");
-
-  const int32_t x = std::max(a.columns(), 1);
-  if (target == ArrayFormat::Host) {
-    const int32_t y = a.boundaries.size() > 1 ? std::max(a.boundaries[1], 1) : 1;
-    const int64_t cells = int64_t{x} * y * (a.size / (int64_t{x} * y) + 1);
-    if (a.dims != 3 || cells != a.size) {
-      warn(std::to_string(a.dims) + "-D array of " + plural(a.size, "element") + " becomes 3-D " +
-           std::to_string(x) + " x " + std::to_string(y) + " x " +
-           std::to_string(cells / (int64_t{x} * y)) + " (" + plural(cells, "cell") + ")");
+// What the walk of a snapshot counts for the warnings about `target`.
+struct Tally {
+  ArrayFormat target;
+  int64_t elements = 0, keys = 0, values = 0, files = 0, valueKeys = 0, split = 0, iniLost = 0;
+  void count(const NativeHalf& value, const NativeHalf& key) {
+    ++elements;
+    keys += key.type != 0;
+    values += value.type == kValueType;
+    files += value.type == kFileType;
+    valueKeys += key.type == kValueType;
+    if (target == ArrayFormat::Csv && value.type == kStringType) {
+      split += textBytes(value).find_first_of(",\r\n") != std::string_view::npos;
     }
-  } else if (target == ArrayFormat::Csv) {
-    const int32_t columns = a.dims > 1 && a.columns() > 0 ? a.columns() : a.size;
-    const bool padded = columns > 0 && a.size % columns != 0;
-    const int64_t rows = columns > 0 ? (a.size + columns - 1) / columns : 0;
-    if (a.dims != 2) {
-      warn(std::to_string(a.dims) + "-D array becomes 2-D: " + plural(rows, "row") + " x " +
+    if (target == ArrayFormat::Ini) {
+      iniLost += !iniKeepsEntry(key.type ? textOf(key) : std::string(), textOf(value));
+    }
+  }
+};
+
+int32_t csvColumns(const NativeHeader& h, int64_t size) {
+  return h.dimensions > 1 && h.columns() > 0 ? h.columns() : static_cast<int32_t>(size);
+}
+
+void warnHostShape(const NativeHeader& h, int64_t size) {
+  const int64_t x = std::max(h.columns(), 1);
+  const int64_t y = h.boundaries.size() > 1 ? std::max(h.boundaries[1], 1) : 1;
+  const int64_t z = size / (x * y) + 1;
+  if (h.dimensions == 3 && x * y * z == size) return;
+  std::string what = std::to_string(h.dimensions) + "-D array of " + plural(size, "element") +
+                     " becomes 3-D " + std::to_string(x) + " x " + std::to_string(y) + " x " +
+                     std::to_string(z) + " (" + plural(x * y * z, "cell") + ")";
+  // The format's rule: one layer more than the elements fill, even a full last one.
+  if (size % (x * y) == 0) {
+    what += ": the host array format always adds a layer, which reads back as " +
+            plural(x * y, "empty element");
+  }
+  warn(what);
+}
+
+void warnLosses(const NativeHeader& h, const Tally& t, ArrayFormat target, bool header) {
+  if (target == ArrayFormat::Native || target == ArrayFormat::Json) return;  // both keep all
+  const char* name = formatInfo(target).description;
+  const bool csv = target == ArrayFormat::Csv || target == ArrayFormat::CsvRfc4180;
+  const auto labelled = std::count_if(h.labels.begin(), h.labels.end(),
+                                      [](const auto& l) { return l && !l->empty(); });
+  if (labelled > 0 && !(csv && header)) {
+    warn(plural(labelled, "column label") + " dropped: the " + name + " has none" +
+         (csv ? " (--header writes them as a first row)" : ""));
+  }
+  if (target != ArrayFormat::Ini && t.keys > 0) {
+    warn(plural(t.keys, "key") + " dropped: the " + name + " has none");
+  }
+  if (t.values > 0) warn(plural(t.values, "value element") + " will read back as text");
+  if (t.files > 0) warn(plural(t.files, "file element") + " written as empty text");
+  if (target == ArrayFormat::Ini && t.valueKeys > 0) {
+    warn(plural(t.valueKeys, "value key") + " will read back as text");
+  }
+  if (target == ArrayFormat::Host) warnHostShape(h, t.elements);
+  if (csv) {
+    const int64_t columns = csvColumns(h, t.elements);
+    const int64_t rows = columns > 0 ? (t.elements + columns - 1) / columns : 0;
+    if (h.dimensions != 2) {
+      warn(std::to_string(h.dimensions) + "-D array becomes 2-D: " + plural(rows, "row") + " x " +
            plural(columns, "column"));
-    } else if (padded) {
-      warn("the last row is padded: " + plural(a.size, "element") + " become " +
+    } else if (columns > 0 && t.elements % columns != 0) {
+      warn("the last row is padded: " + plural(t.elements, "element") + " become " +
            plural(rows * columns, "cell"));
     }
-    const auto split = std::count_if(a.texts.begin(), a.texts.end(), [](const std::string& t) {
-      return t.find_first_of(",\r\n") != std::string::npos;
-    });
-    if (split > 0 && !quoted) {
-      warn(plural(split, "cell") + " holding a comma, CR or LF will read back split into more " +
+    if (t.split > 0 && target == ArrayFormat::Csv) {
+      warn(plural(t.split, "cell") + " holding a comma, CR or LF will read back split into more " +
            "cells or rows (--to csv-rfc4180 quotes them)");
     }
-  } else if (target == ArrayFormat::Ini) {
-    if (a.dims > 1) {
-      warn(std::to_string(a.dims) + "-D array becomes a list: the INI file keeps no dimensions");
+  }
+  if (target == ArrayFormat::Ini) {
+    if (h.dimensions > 1) {
+      warn(std::to_string(h.dimensions) +
+           "-D array becomes a list: the INI file keeps no dimensions");
     }
-    int64_t lost = 0;
-    for (int32_t i = 0; i < a.size; ++i) lost += !iniKeepsEntry(a.keys[i], a.texts[i]);
-    if (lost > 0) {
-      warn(plural(lost, "element") +
+    if (t.iniLost > 0) {
+      warn(plural(t.iniLost, "element") +
            " will not read back as written (an empty entry, a key with =, [ or //, a line break)");
     }
   }
 }
 
-// The instance's cells as CSV rows, laid out as the extension's CSV save lays them out.
-CsvRows rowsOf(const ArrayContents& a) {
-  const int32_t columns = a.dims > 1 && a.columns() > 0 ? a.columns() : a.size;
-  CsvRows rows;
-  if (columns <= 0) return rows;
-  for (int32_t i = 0; i < a.size; i += columns) {
-    rows.emplace_back();
-    for (int32_t c = 0; c < columns; ++c) {
-      rows.back().push_back(i + c < a.size ? a.texts[i + c] : std::string{});
-    }
+// ---------------------------------------------------------------------------------
+// Writing the formats the command makes itself while walking a snapshot.
+
+std::vector<std::string> labelRow(const NativeHeader& h, int32_t columns) {
+  std::vector<std::string> row;
+  for (int32_t c = 0; c < columns; ++c) {
+    const auto& label = static_cast<size_t>(c) < h.labels.size() ? h.labels[c] : std::nullopt;
+    row.push_back(label.value_or(""));
   }
-  return rows;
+  return row;
 }
 
-std::string toJson(Instance& instance, const ArrayContents& a) {
-  std::string out = "{\n  \"dimensions\": " + std::to_string(a.dims) + ",\n  \"boundaries\": [";
-  for (size_t d = 0; d < a.boundaries.size(); ++d) {
-    out += (d ? ", " : "") + std::to_string(a.boundaries[d]);
+// A label row as the extension's own CSV writes a row: no quoting, "" for empty cells.
+std::string plainCsvRow(const std::vector<std::string>& row) {
+  std::string line;
+  for (size_t c = 0; c < row.size(); ++c) {
+    if (c) line += ',';
+    line += row[c].empty() ? "\"\"" : row[c];
   }
-  out += "],\n  \"labels\": [";
-  for (size_t c = 0; c < a.labels.size(); ++c) out += (c ? ", " : "") + jsonString(a.labels[c]);
-  out += "],\n  \"elements\": [";
-  for (int32_t i = 0; i < a.size; ++i) {
-    const ElementTypes& t = a.types[i];
-    out += i ? ",\n    " : "\n    ";
-    out += "{\"type\": \"" + std::string(elementTypeName(t.type)) + '"';
-    if (t.type == 1) {
-      out += ", \"value\": " + std::to_string(askNumber(instance, kGetValue, {number(i)}));
-    } else if (t.type == 2) {
-      out += ", \"text\": " + jsonString(a.texts[i]);
-    } else if (t.type == 3) {
-      out += ", \"bytes\": " + std::to_string(t.size);
-    }
-    if (t.keyType == 1) {
-      out += ", \"key\": " + std::to_string(askNumber(instance, kKeyValue, {number(i)}));
-    } else if (a.keys[i]) {
-      out += ", \"key\": " + jsonString(*a.keys[i]);
-    }
-    out += '}';
-  }
-  out += a.size ? "\n  ]\n}\n" : "]\n}\n";
-  return out;
+  return line + "\r\n";
 }
 
-// An RFC 4180 file read into a two-dimensional instance of string cells.
-std::unique_ptr<Instance> loadRfc4180(const Module& module, std::string_view bytes) {
-  const CsvRows rows = readRfc4180(bytes);
-  SetupFields setup;
-  setup.dims = 2;
-  setup.x = 0;
-  for (const auto& row : rows) setup.x = std::max(setup.x, static_cast<int32_t>(row.size()));
-  auto instance = std::make_unique<Instance>(module, setup);
-  for (const auto& row : rows) {
-    for (int32_t c = 0; c < setup.x; ++c) {
-      const std::string cell = c < static_cast<int32_t>(row.size()) ? row[c] : std::string{};
-      // The extension takes texts up to their first zero byte.
-      instance->callAction(kAppendString, {text(cell.substr(0, cell.find('\0')))});
+struct ConvertPlan {
+  ArrayFormat target;
+  bool header;
+  int32_t elements;  // as the instance counted them
+  Output* out;       // for the formats the command writes; null otherwise
+};
+
+// Walks the snapshot once: counts for the warnings, and the command's own formats.
+Tally writeFromSnapshot(std::string_view snapshot, const ConvertPlan& plan, NativeHeader& h) {
+  Tally tally{plan.target};
+  std::string pending;
+  std::vector<std::string> record;  // of RFC 4180 CSV; a one-dimensional array is one
+  bool begun = false;
+  const auto begin = [&] {
+    begun = true;
+    if (plan.target == ArrayFormat::Json) appendJsonHeader(pending, h);
+    if (plan.target == ArrayFormat::CsvRfc4180 && plan.header) {
+      appendRfc4180Record(labelRow(h, csvColumns(h, plan.elements)), pending);
     }
+  };
+  walkNativeFile(snapshot, h, [&](const NativeHalf& value, const NativeHalf& key) {
+    if (!begun) begin();
+    tally.count(value, key);
+    if (plan.target == ArrayFormat::Json) {
+      pending += tally.elements > 1 ? ",\n    " : "\n    ";
+      appendJsonElement(pending, value, key);
+    } else if (plan.target == ArrayFormat::CsvRfc4180) {
+      record.push_back(textOf(value));
+      if (static_cast<int32_t>(record.size()) == csvColumns(h, plan.elements)) {
+        appendRfc4180Record(record, pending);
+        record.clear();
+      }
+    }
+    if (plan.out) plan.out->drain(pending);
+    return true;
+  });
+  if (!begun) begin();
+  if (plan.target == ArrayFormat::Json) appendJsonEnd(pending, tally.elements > 0);
+  if (plan.target == ArrayFormat::CsvRfc4180 && !record.empty()) {
+    // The last row padded, as the extension's CSV save pads it.
+    record.resize(static_cast<size_t>(csvColumns(h, plan.elements)));
+    appendRfc4180Record(record, pending);
   }
-  return instance;
+  if (plan.out) plan.out->drain(pending, true);
+  return tally;
 }
 
 bool sameFile(const std::string& a, const std::string& b) {
@@ -369,90 +448,87 @@ bool sameFile(const std::string& a, const std::string& b) {
 
 }  // namespace
 
-void printArray(Instance& instance, const ViewOptions& view, std::ostream& out) {
-  const int32_t dims = askNumber(instance, kDim);
-  const int32_t size = askNumber(instance, kSize);
-  out << "dimensions  " << dims << '\n';
-  out << "boundaries ";
-  static constexpr const char* kAxes[] = {"X", "Y", "Z"};
-  for (int32_t d = 1; d <= std::max(dims, 1); ++d) {
-    const std::string axis = d <= 3 ? kAxes[d - 1] : joined("D", std::to_string(d));
-    out << ' ' << axis << ' ' << askNumber(instance, kBoundary, {number(d)});
+int inspectCommand(const Module& module, const std::string& path, const InspectOptions& options) {
+  const ProgressNote progress("inspecting " + path);
+  std::optional<TempFile> converted;
+  if (options.to) {
+    // What the array becomes in that format: converted, then inspected as such.
+    converted.emplace();
+    convertCommand(module, {path, converted->path(), options.to, options.from, options.header,
+                            options.lenient, true, false});
   }
-  out << '\n';
-  out << "elements    " << size << '\n';
-  const int32_t columns = askNumber(instance, kBoundary, {number(1)});
-  if (dims == 2 && columns > 0 && size > 0) {
-    printTable(instance, size, columns, view, out);
-  } else if (size > 0) {
-    printList(instance, size, view, out);
-  }
-}
-
-int inspectCommand(const Module& module, const std::string& path, const ViewOptions& view) {
-  const Input input = readInput(path);
-  const ArrayFormat format = recogniseOrFail(input.name, input.bytes);
-  auto instance = loadInto(module, format, input.path());
+  Input input =
+      openInput(converted ? converted->path() : path, converted ? options.to : options.from);
+  if (converted) input.name = path + " as " + formatInfo(input.format).name;
+  auto instance = loadInput(module, input, {options.header, options.lenient});
   std::cout << "file        " << input.name << '\n';
-  std::cout << "format      " << formatInfo(format).description << " (" << input.bytes.size()
-            << " bytes)\n";
-  printArray(*instance, view, std::cout);
+  std::cout << "format      " << formatInfo(input.format).description << " ("
+            << std::filesystem::file_size(input.path) << " bytes)\n";
+  printArray(*instance, options.view, std::cout);
+  std::cout.flush();
+  instance.reset();
+  if (formatInfo(input.format).binary) warnAboutDamage(input.name, input.path, input.format);
   return 0;
 }
 
-int convertCommand(const Module& module, const ConvertOptions& options) {
+// The format of OUT, once it is clear that OUT may be written.
+ArrayFormat checkedTarget(const ConvertOptions& options) {
   const std::string& out = options.out;
-  if (out != "-" && options.in != "-" && !options.force && sameFile(options.in, out)) {
+  const bool toStdout = out == "-";
+  if (!toStdout && options.in != "-" && !options.force && sameFile(options.in, out)) {
     throw UsageError("convert would overwrite its input " + out + "; add --force to do so");
   }
-  if (out != "-" && std::filesystem::is_directory(out)) {
+  if (!toStdout && std::filesystem::is_directory(out)) {
     throw FileError("cannot write " + out + ": it is a directory");
   }
-  const Input input = readInput(options.in);
-  std::unique_ptr<Instance> instance;
-  std::string fromName;
-  if (options.from == "csv-rfc4180") {
-    instance = loadRfc4180(module, input.bytes);
-    fromName = options.from;
-  } else {
-    const ArrayFormat from = recogniseOrFail(input.name, input.bytes);
-    instance = loadInto(module, from, input.path());
-    fromName = formatInfo(from).name;
+  const ArrayFormat target = options.to ? *options.to : formatOfExtension(out).value();
+  if (toStdout && formatInfo(target).binary && !options.force && isTerminal(stdout)) {
+    throw UsageError(std::string("convert will not write a ") + formatInfo(target).description +
+                     " to a terminal; redirect it or add --force");
   }
+  return target;
+}
 
-  std::string toName = options.to;
-  std::string bytes;
-  const ArrayContents contents = readContents(*instance);
-  if (toName == "csv-rfc4180") {
-    bytes = writeRfc4180(rowsOf(contents));
-    warnLosses(contents, ArrayFormat::Csv, true, std::cerr);
-  } else if (toName == "json") {
-    bytes = toJson(*instance, contents);
-    const auto files = std::count_if(contents.types.begin(), contents.types.end(),
-                                     [](const ElementTypes& t) { return t.type == 3; });
-    if (files > 0) {
-      std::cerr << "quorrel: warning: " << plural(files, "file element")
-                << " written as a byte count only\n";
-    }
-  } else {
-    const ArrayFormat target =
-        toName.empty() ? formatOfOutputPath(out == "-" ? "" : out) : *formatOfName(toName);
-    toName = formatInfo(target).name;
-    warnLosses(contents, target, false, std::cerr);
-    // The save action reports nothing: make sure beforehand that the file can be written.
-    const TempFile staging;
-    instance->callAction(actionCodeOfName(formatInfo(target).saveAction).value(),
-                         {text(staging.path())});
-    bytes = readWholeFile(staging.path());
+int convertCommand(const Module& module, const ConvertOptions& options) {
+  const ArrayFormat target = checkedTarget(options);
+  const std::string& out = options.out;
+  const bool toStdout = out == "-";
+  const ProgressNote progress("converting " + options.in);
+  const Input input = openInput(options.in, options.from);
+  auto instance = loadInput(module, input, {options.header, options.lenient});
+  const int32_t elements = askNumber(*instance, kSize);
+
+  // The extension writes its own formats, into OUT when nothing goes before them.
+  const bool ownFormat = formatInfo(target).saveAction != nullptr;
+  const bool direct = ownFormat && !toStdout && !(target == ArrayFormat::Csv && options.header);
+  std::optional<TempFile> staging;
+  if (ownFormat && !direct) staging.emplace();
+  const std::string written = direct ? out : staging ? staging->path() : std::string();
+  if (ownFormat) fileAction(module, *instance, formatInfo(target).saveAction, written, out);
+  // A native file loses nothing, so it needs no walk; every other target does.
+  std::optional<Snapshot> snapshot;
+  if (target != ArrayFormat::Native) snapshot.emplace(*instance);
+  instance.reset();  // the module's copy goes before the snapshot is read
+
+  std::optional<Output> output;
+  if (!direct) output.emplace(out);
+  NativeHeader header;
+  if (snapshot) {
+    const ByteBuffer bytes = readBytes(snapshot->file.path());
+    const Tally tally = writeFromSnapshot(
+        bytes.view(), {target, options.header, elements, ownFormat ? nullptr : &*output}, header);
+    warnLosses(header, tally, target, options.header);
   }
-  if (out == "-") {
-    writeStandardOutput(bytes);
-  } else {
-    writeWholeFile(out, bytes);
+  if (output && ownFormat) {
+    if (options.header) output->write(plainCsvRow(labelRow(header, csvColumns(header, elements))));
+    output->copyFrom(written);
   }
-  (out == "-" ? std::cerr : std::cout)
-      << input.name << " (" << fromName << ") -> " << (out == "-" ? "<stdout>" : out) << " ("
-      << toName << "): " << plural(contents.size, "element") << '\n';
+  if (output) output->finish();
+  if (!options.report) return 0;
+  (toStdout ? std::cerr : std::cout)
+      << input.name << " (" << formatInfo(input.format).name << ") -> "
+      << (toStdout ? "<stdout>" : out) << " (" << formatInfo(target).name
+      << "): " << plural(elements, "element") << '\n';
   return 0;
 }
 

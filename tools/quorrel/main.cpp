@@ -23,7 +23,7 @@ it only through its exported entry points.
 Commands:
   run FILE            run a script (FILE - reads standard input)
   shell               type script commands interactively
-  inspect FILE        show what a native array, host array, CSV or INI file holds
+  inspect FILE        show what an array file holds (native, host, CSV, INI, JSON)
   convert IN OUT      convert an array file to another format
   list [WHAT]         list actions and expressions, or describe one (a name, A12, E12)
   menu KIND           print the editor menu tree: actions, expressions or conditions
@@ -94,34 +94,56 @@ help, help NAME|CODE, list, show (the current array), quit or exit. Ctrl-C
 clears the line, Ctrl-D ends. File warnings are on; --no-warn-files turns them off.
 )"},
     {"inspect", R"(Usage: quorrel inspect FILE
-       quorrel inspect [--rows N | --all] [--width N] FILE
+       quorrel inspect [--rows N | --all] [--width N] [--keys]
+                       [--from KIND] [--to KIND] [--header] [--lenient] FILE
 
-Recognises a native array file, a host array file, a CSV or an INI file, loads it
-into a fresh instance and prints its format, dimensions, boundaries, labels and
-elements. FILE - reads standard input. Exits with status 1 when FILE cannot be
-read.
+Recognises a native array, host array, CSV, INI or JSON file (or reads it as
+--from says), loads it into a fresh instance and prints its format, dimensions,
+boundaries, labels and elements. FILE - reads standard input. A native file that
+ends inside an element, or has bytes after its last one, is named in a warning
+with the byte offset. Exits with status 1 when FILE cannot be read.
 
-  --rows N     show at most N table rows or list elements (default 20 and 40)
-  --all        show every row, column and element
-  --width N    cut cells at N characters, N at least 4 (default 24; 0 never
-               cuts); a cut cell ends in ...
+  --rows N      show at most N table rows or list elements (default 20 and 40)
+  --all         show every row, column and element
+  --width N     cut cells at N characters, N at least 4 (default 24; 0 never
+                cuts); a cut cell ends in ...
+  --keys        list every element with its type and its key's type and key: a
+                text is quoted ("" is an empty text), an empty element is blank
+  --from KIND   read FILE as KIND (below) instead of recognising it
+  --to KIND     show the array as it comes back from KIND, with convert's warnings
+  --header      a CSV file's first row holds the column labels
+  --lenient     broken RFC 4180 CSV: a warning and the records before the fault
+
+KIND is native, host, csv, ini, csv-rfc4180 or json, in any case.
 )"},
-    {"convert", R"(Usage: quorrel convert IN OUT [--to native|host|csv|ini]
-       quorrel convert [--from KIND] [--to KIND] [--force] IN OUT
+    {"convert", R"(Usage: quorrel convert IN OUT
+       quorrel convert [--from KIND] [--to KIND] [--header] [--lenient] [--force]
+                       [--] IN OUT
 
-Loads IN (its format recognised as by inspect) and saves it as OUT. Without --to
-the format follows OUT's extension: .csv, .ini, anything else native. The host
-array format needs --to host. IN - reads standard input, OUT - writes standard
-output. Exits with status 1 when IN cannot be read or OUT cannot be written.
+Loads IN (its format recognised as by inspect, or as --from says) and saves it as
+OUT in the format --to names, or else OUT's extension: .arr native, .mmf host,
+.csv, .ini, .json (any case); another extension needs --to. IN - reads standard
+input, OUT - writes standard output (with --to). Exits with status 1 when IN
+cannot be read or OUT cannot be written, 2 on misuse.
 
-  --to csv-rfc4180   CSV whose cells are quoted when they hold a comma, a quote
-                     or a line break, so that they read back whole
-  --to json          dimensions, boundaries, labels, and each element's type,
-                     value or text and key
-  --from csv-rfc4180 read IN as such CSV (quotes, doubled quotes, line breaks)
-  --force            allow OUT to be IN itself
+  --to KIND, --from KIND
+               native, host, csv, ini, csv-rfc4180 or json, in any case
+               csv-rfc4180: cells quoted when they hold a comma, a quote or a
+               line break, so that they read back whole; broken quoting in IN is
+               an error that names its line
+               json: dimensions, boundaries, labels, and each element as null
+               (empty), a number, a string, {"base64": ...} (text that is not
+               UTF-8) or {"file": ...} (bytes), with {"element": ..., "key": ...}
+               for a keyed one; it reads back exactly
+  --header     write the column labels as a first CSV row; read a first row as
+               the labels
+  --lenient    broken RFC 4180 CSV: a warning and the records before the fault
+  --force      allow OUT to be IN itself, and binary output to a terminal
+  --           ends the options (for a file whose name starts with -)
 
 A warning on standard error names each kind of content the target format loses.
+A command that runs longer than 2 seconds shows its progress on standard error
+when that is a terminal.
 )"},
     {"list", R"(Usage: quorrel list [actions|expressions|NAME|CODE|WORD]
 
@@ -152,35 +174,31 @@ Prints one line per code: CODE "display string or name" "title".
 struct Options {
   std::string module;
   quorrel::tool::ConvertOptions convert;
-  quorrel::tool::ViewOptions view;
+  quorrel::tool::InspectOptions inspect;
   quorrel::tool::RunOptions run;
   bool noWarnFiles = false;
   bool help = false, version = false;
   bool ascii = false;
-  std::vector<std::pair<std::string, std::string>> owned;  // option, the command it needs
+  std::vector<std::pair<std::string, std::string>> owned;  // option, the commands it needs
   std::vector<std::string> words;                          // the command and its operands
   std::string mistake;  // the first misuse found, reported once all is read
 };
 
-int32_t countOf(const std::string& option, const std::string& value) {
-  if (!quorrel::tool::looksLikeInteger(value) || value[0] == '-' || value.size() > 9) {
-    throw UsageError(option + " needs a count, not '" + value + "'");
-  }
-  return std::stoi(value);
-}
+constexpr const char* kFileCommands = "inspect and convert";
 
-size_t widthOf(int32_t count) {
-  const size_t width = static_cast<size_t>(count);
-  if (width != 0 && width < quorrel::tool::kMinimumCutWidth) {
-    throw UsageError("--width needs 0 (never cut) or at least " +
-                     std::to_string(quorrel::tool::kMinimumCutWidth) +
-                     ": a cut cell keeps a character and ends in ...");
+std::optional<quorrel::tool::ArrayFormat> formatOption(const std::string& option,
+                                                       const std::string& name) {
+  const auto format = quorrel::tool::formatOfName(name);
+  if (!format) {
+    throw UsageError("unknown format '" + name + "' for " + option + " (one of " +
+                     quorrel::tool::formatNames() + ")");
   }
-  return width;
+  return format;
 }
 
 Options parseOptions(int argc, char** argv) {
   Options options;
+  bool operandsOnly = false;
   for (int i = 1; i < argc; ++i) {
     const std::string arg = argv[i];
     const std::string name = arg.substr(0, arg.find('='));
@@ -191,7 +209,19 @@ Options parseOptions(int argc, char** argv) {
       return {};
     };
     auto belongs = [&](const char* command) { options.owned.emplace_back(name, command); };
-    if (arg == "--help" || arg == "-h") {
+    // Misuse is reported once all is read, so that --help still answers.
+    auto noting = [&](auto&& take) {
+      try {
+        take();
+      } catch (const UsageError& error) {
+        if (options.mistake.empty()) options.mistake = error.what();
+      }
+    };
+    if (operandsOnly || arg == "-" || arg.empty() || arg[0] != '-') {
+      options.words.push_back(arg);
+    } else if (arg == "--") {
+      operandsOnly = true;
+    } else if (arg == "--help" || arg == "-h") {
       options.help = true;
     } else if (arg == "--version") {
       options.version = true;
@@ -199,29 +229,27 @@ Options parseOptions(int argc, char** argv) {
       options.ascii = true;
     } else if (name == "--module") {
       options.module = value();
-    } else if (name == "--to") {
-      options.convert.to = value();
-      belongs("convert");
-    } else if (name == "--from") {
-      options.convert.from = value();
-      belongs("convert");
+    } else if (name == "--to" || name == "--from") {
+      const std::string kind = value();
+      noting([&] {
+        auto& format = name == "--to" ? options.convert.to : options.convert.from;
+        if (!kind.empty()) format = formatOption(name, kind);
+      });
+      belongs(kFileCommands);
+    } else if (arg == "--header" || arg == "--lenient") {
+      (arg == "--header" ? options.convert.header : options.convert.lenient) = true;
+      belongs(kFileCommands);
     } else if (arg == "--force") {
       options.convert.force = true;
       belongs("convert");
-    } else if (name == "--rows" || name == "--width") {
-      const std::string text = value();
-      if (options.mistake.empty() && !text.empty()) {
-        try {
-          const int32_t count = countOf(name, text);
-          if (name == "--rows") options.view.rows = count;
-          if (name == "--width") options.view.width = widthOf(count);
-        } catch (const UsageError& error) {
-          options.mistake = error.what();
-        }
-      }
-      belongs("inspect");
-    } else if (arg == "--all") {
-      options.view.all = true;
+    } else if (name == "--rows" || name == "--width" || arg == "--all" || arg == "--keys") {
+      noting([&] {
+        const auto next = [&]() -> std::optional<std::string> {
+          if (i + 1 < argc) return std::string(argv[++i]);
+          return std::nullopt;
+        };
+        quorrel::tool::takeViewOption(arg, next, options.inspect.view);
+      });
       belongs("inspect");
     } else if (arg == "--echo") {
       options.run.echo = true;
@@ -234,12 +262,14 @@ Options parseOptions(int argc, char** argv) {
     } else if (arg == "--no-warn-files") {
       options.noWarnFiles = true;
       belongs("run");
-    } else if (arg.size() > 1 && arg[0] == '-') {
-      if (options.mistake.empty()) options.mistake = "unknown option " + arg;
-    } else {
-      options.words.push_back(arg);
+    } else if (options.mistake.empty()) {
+      options.mistake = "unknown option " + arg + " (-- ends the options, for a file named so)";
     }
   }
+  options.inspect.from = options.convert.from;
+  options.inspect.to = options.convert.to;
+  options.inspect.header = options.convert.header;
+  options.inspect.lenient = options.convert.lenient;
   return options;
 }
 
@@ -257,11 +287,26 @@ void expectKind(const std::string& kind, std::initializer_list<const char*> allo
   throw UsageError("unknown kind " + kind);
 }
 
+// Without --to, OUT's extension names the format.
+void expectOutputFormat(const quorrel::tool::ConvertOptions& convert) {
+  if (convert.to) return;
+  if (convert.out == "-") {
+    throw UsageError("--to is needed to write standard output (one of " +
+                     quorrel::tool::formatNames() + ")");
+  }
+  if (!quorrel::tool::formatOfExtension(convert.out)) {
+    throw UsageError("cannot tell the format of " + convert.out +
+                     " from its extension (.arr, .mmf, .csv, .ini, .json); add --to with one of " +
+                     quorrel::tool::formatNames());
+  }
+}
+
 int dispatch(Options options) {
   const std::string& command = options.words[0];
   for (const auto& [option, owner] : options.owned) {
     // --echo and the file warnings' options serve the shell as well as run.
-    const bool shared = owner == "run" && command == "shell";
+    const bool shared = (owner == "run" && command == "shell") ||
+                        (owner == kFileCommands && (command == "inspect" || command == "convert"));
     if (owner != command && !shared) {
       throw UsageError(option + " belongs to " + (owner == "run" ? "run and shell" : owner));
     }
@@ -273,16 +318,11 @@ int dispatch(Options options) {
     expectOperands(options, 0, "no operands");
   } else if (command == "inspect") {
     expectOperands(options, 1, "a file");
-    if (options.view.all && options.view.rows)
-      throw UsageError("--rows and --all exclude each other");
   } else if (command == "convert") {
     expectOperands(options, 2, "an input and an output file");
-    for (const auto& [option, owner] : options.owned) {
-      if (option == "--to") {
-        expectKind(options.convert.to, {"native", "host", "csv", "ini", "csv-rfc4180", "json"});
-      }
-      if (option == "--from") expectKind(options.convert.from, {"csv-rfc4180"});
-    }
+    options.convert.in = options.words[1];
+    options.convert.out = options.words[2];
+    expectOutputFormat(options.convert);
   } else if (command == "list") {
     if (options.words.size() > 2) throw UsageError("list takes at most one name or code");
   } else if (command == "menu") {
@@ -302,28 +342,23 @@ int dispatch(Options options) {
   if (command == "run") return quorrel::tool::runCommand(loader, words[1], options.run);
   if (command == "shell") return quorrel::tool::shellCommand(loader, options.run);
   const auto& module = loader.get();
-  if (command == "inspect") return quorrel::tool::inspectCommand(module, words[1], options.view);
-  if (command == "convert") {
-    options.convert.in = words[1];
-    options.convert.out = words[2];
-    return quorrel::tool::convertCommand(module, options.convert);
-  }
+  if (command == "inspect") return quorrel::tool::inspectCommand(module, words[1], options.inspect);
+  if (command == "convert") return quorrel::tool::convertCommand(module, options.convert);
   if (command == "list")
     return quorrel::tool::listCommand(module, words.size() > 1 ? words[1] : "");
   if (command == "menu") return quorrel::tool::menuCommand(module, words[1]);
   return quorrel::tool::stringsCommand(module, words[1]);
 }
 
-// What was printed must have reached standard output: a full disk is an error. A reader
-// that went away (EPIPE) is not worth a word.
+// What was printed must have reached standard output: a full disk is an error. A
+// reader that went away (a closed pipe) is not.
 int checkedOutput(int status) {
+  std::cout.flush();
   errno = 0;
-  const bool written = std::cout.flush().good() && std::fflush(stdout) == 0;
-  if (written) return status;
-  if (errno != EPIPE) {
-    std::cerr << "quorrel: cannot write standard output"
-              << (errno != 0 ? std::string(": ") + std::strerror(errno) : std::string()) << '\n';
-  }
+  if (std::cout.good() && std::fflush(stdout) == 0 && !std::ferror(stdout)) return status;
+  if (errno == EPIPE) return status;
+  std::cerr << "quorrel: cannot write standard output"
+            << (errno ? std::string(": ") + std::strerror(errno) : std::string()) << '\n';
   return status == 0 ? 1 : status;
 }
 

@@ -7,6 +7,7 @@
 #include <fstream>
 #include <iostream>
 #include <optional>
+#include <tuple>
 
 #include "catalog.h"
 #include "commands.h"
@@ -23,7 +24,9 @@ constexpr const char* kShellHelp = R"(Commands, one per line:
                          autoselect, delimiter="...")
   A NAME|CODE [ARG...]   call an action, e.g. A appendString "ann"
   E NAME|CODE [ARG...]   call an expression and print its result, e.g. E size(
-  show                   print the current array as inspect does
+  show [--rows N | --all] [--width N] [--keys]
+                         print the current array as inspect does, the selected
+                         rows marked *
   list [actions|expressions]   every action and expression with its parameters
   help NAME|CODE         what one action or expression does (A12 or E12 for one kind)
   quit, exit             end the shell (so does Ctrl-D); Ctrl-C clears the line
@@ -77,6 +80,30 @@ std::pair<std::string_view, std::string_view> firstWord(std::string_view line) {
   return {line.substr(0, end), rest};
 }
 
+// show takes inspect's view options and marks the selected rows.
+ViewOptions showOptions(std::string_view rest) {
+  std::vector<std::string> words;
+  for (auto [word, more] = firstWord(rest); !word.empty(); std::tie(word, more) = firstWord(more)) {
+    words.emplace_back(word);
+  }
+  ViewOptions view;
+  view.selection = true;
+  for (size_t i = 0; i < words.size(); ++i) {
+    const auto next = [&]() -> std::optional<std::string> {
+      if (i + 1 < words.size()) return words[++i];
+      return std::nullopt;
+    };
+    try {
+      if (!takeViewOption(words[i], next, view)) {
+        throw ScriptError("show takes --rows N, --width N, --all and --keys, not " + words[i]);
+      }
+    } catch (const UsageError& error) {
+      throw ScriptError(error.what());
+    }
+  }
+  return view;
+}
+
 }  // namespace
 
 int runCommand(const ModuleLoader& module, const std::string& path, const RunOptions& options) {
@@ -120,7 +147,7 @@ int shellCommand(const ModuleLoader& module, const RunOptions& options) {
       } else if (word == "list") {
         printCatalog(module.get(), rest, std::cout);
       } else if (word == "show") {
-        printArray(session.instance(), ViewOptions{}, std::cout);
+        printArray(session.instance(), showOptions(rest), std::cout);
       } else {
         session.execute(parseLine(*line), std::cout, {"<shell>", lineNumber, *line});
       }

@@ -125,6 +125,11 @@ constexpr const char* kFailedSteps[] = {"",
                                         "wrote nothing (no such element, or more cells "
                                         "than the format holds)"};
 
+const char* failedFileStep(int32_t step) {
+  const auto index = static_cast<size_t>(step);
+  return step > 0 && index < std::size(kFailedSteps) ? kFailedSteps[index] : "failed";
+}
+
 void Session::checkFileAction(int32_t code, const std::vector<Argument>& args, const Where& where) {
   const ActionEntry& entry = actionEntry(code);
   if (entry.file == FileUse::None) return;
@@ -132,10 +137,8 @@ void Session::checkFileAction(int32_t code, const std::vector<Argument>& args, c
   if (!status || status->first == 0) return;
   fileActionFailed_ = true;
   if (!options_.warnFiles || !warnings_) return;
-  const auto step = static_cast<size_t>(status->first);
   *warnings_ << where.file << ':' << where.line << ": warning: " << entry.name << ' '
-             << quoteText(args[entry.pathParam].text) << ": "
-             << (step < std::size(kFailedSteps) ? kFailedSteps[step] : "failed");
+             << quoteText(args[entry.pathParam].text) << ": " << failedFileStep(status->first);
   if (status->second != 0) *warnings_ << " (" << std::strerror(status->second) << ')';
   *warnings_ << '\n';
 }

@@ -60,6 +60,10 @@ class Session {
 int runScript(const ModuleLoader& module, std::istream& in, const std::string& name,
               std::ostream& out, std::ostream& err, const RunOptions& options = {});
 
+// What the failed step of a file action (as the module's QuorrelFileStatus numbers
+// it) means: "could not open it", ...
+const char* failedFileStep(int32_t step);
+
 // The reason an action that uses `path` as `use` says cannot open it, or nothing.
 std::optional<std::string> fileProblem(const std::string& path, FileUse use);
 

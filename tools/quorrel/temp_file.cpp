@@ -9,6 +9,12 @@
 #include <iterator>
 #include <random>
 
+#ifdef _WIN32
+#include <io.h>
+#else
+#include <unistd.h>
+#endif
+
 #include "commands.h"
 
 namespace quorrel::tool {
@@ -37,7 +43,9 @@ TempFile::~TempFile() {
   fs::remove(path_, error);
 }
 
-std::string readWholeFile(const std::string& path) {
+namespace {
+
+std::ifstream openRegular(const std::string& path) {
   std::error_code error;
   const auto status = fs::status(path, error);
   if (fs::is_directory(status)) throw FileError("cannot read " + path + ": it is a directory");
@@ -46,28 +54,57 @@ std::string readWholeFile(const std::string& path) {
   }
   std::ifstream in(path, std::ios::binary);
   if (!in) throw FileError("cannot read " + path + ": " + std::strerror(errno));
-  std::string bytes(std::istreambuf_iterator<char>(in), {});
+  return in;
+}
+
+}  // namespace
+
+std::string readWholeFile(const std::string& path) {
+  std::ifstream in = openRegular(path);
+  std::error_code error;
+  const auto size = fs::file_size(path, error);
+  std::string bytes(error ? 0 : static_cast<size_t>(size), '\0');
+  in.read(bytes.data(), static_cast<std::streamsize>(bytes.size()));
+  bytes.resize(static_cast<size_t>(in.gcount()));
+  // A file that grew meanwhile: the rest too.
+  if (in) bytes.append(std::istreambuf_iterator<char>(in), {});
   if (in.bad()) throw FileError("cannot read " + path);
   return bytes;
 }
 
-void writeWholeFile(const std::string& path, std::string_view bytes) {
-  std::ofstream out(path, std::ios::binary | std::ios::trunc);
-  if (!out) throw FileError("cannot write " + path + ": " + std::strerror(errno));
-  out.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
-  if (!out.flush()) throw FileError("cannot write " + path);
+std::string readFileStart(const std::string& path, size_t count) {
+  std::ifstream in = openRegular(path);
+  std::string bytes(count, '\0');
+  in.read(bytes.data(), static_cast<std::streamsize>(count));
+  if (in.bad()) throw FileError("cannot read " + path);
+  bytes.resize(static_cast<size_t>(in.gcount()));
+  return bytes;
 }
 
 // main() made the standard streams binary on every system.
-std::string readStandardInput() {
-  std::string bytes(std::istreambuf_iterator<char>(std::cin), {});
-  return bytes;
+void copyStandardInputTo(const std::string& path) {
+  std::ofstream out(path, std::ios::binary | std::ios::trunc);
+  std::string chunk(size_t{1} << 20, '\0');
+  while (std::cin.read(chunk.data(), static_cast<std::streamsize>(chunk.size())) ||
+         std::cin.gcount() > 0) {
+    out.write(chunk.data(), std::cin.gcount());
+  }
+  if (!out.flush()) throw FileError("cannot copy standard input to " + path);
 }
 
 void writeStandardOutput(std::string_view bytes) {
   std::cout.flush();
-  std::fwrite(bytes.data(), 1, bytes.size(), stdout);
-  std::fflush(stdout);
+  if (std::fwrite(bytes.data(), 1, bytes.size(), stdout) != bytes.size() || std::fflush(stdout)) {
+    throw FileError(std::string("cannot write standard output: ") + std::strerror(errno));
+  }
+}
+
+bool isTerminal(std::FILE* stream) {
+#ifdef _WIN32
+  return _isatty(_fileno(stream)) != 0;
+#else
+  return isatty(fileno(stream)) != 0;
+#endif
 }
 
 }  // namespace quorrel::tool

@@ -3,6 +3,7 @@
 // pass through one of these.
 #pragma once
 
+#include <cstdio>
 #include <string>
 #include <string_view>
 
@@ -22,12 +23,18 @@ class TempFile {
   std::string path_;
 };
 
-// Whole-file helpers shared by the file commands. Both throw FileError with the reason.
+// Whole-file helpers shared by the file commands; they throw FileError with the reason.
 std::string readWholeFile(const std::string& path);
-void writeWholeFile(const std::string& path, std::string_view bytes);
 
-// Standard input or output as bytes, unchanged on every platform.
-std::string readStandardInput();
+// At most `count` bytes from the start of a regular file; throws FileError when it
+// cannot be read (a folder or a device too).
+std::string readFileStart(const std::string& path, size_t count);
+
+// Standard input or output as bytes, unchanged on every platform. A failed write to
+// standard output throws FileError.
+void copyStandardInputTo(const std::string& path);
 void writeStandardOutput(std::string_view bytes);
+
+bool isTerminal(std::FILE* stream);
 
 }  // namespace quorrel::tool

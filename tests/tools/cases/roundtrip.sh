@@ -25,11 +25,10 @@ q convert scores.ini scores.mmf --to host
 q inspect scores.mmf
 q convert scores.mmf back.arr
 q inspect back.arr
-# The extension decides the format unless --to does; anything unknown is native.
+# The extension decides the format unless --to does; an unknown one needs --to.
 q convert back.arr upper.INI
 head -n 1 upper.INI | od -An -c
 q convert scores.csv scores.dat
-head -c 8 scores.dat; echo
 q convert scores.csv native.csv --to native
 head -c 8 native.csv; echo
 q convert scores.csv no-such-dir/x.arr

@@ -1,0 +1,49 @@
+# Every format both ways: types and keys shown, damaged files named, JSON read back
+# byte for byte, labels as a CSV header, broken RFC 4180 CSV, output chosen by intent.
+q() { "$QUORREL" "$@"; echo "status $?"; }
+printf 'xyz' >three.bin
+cat >make.qs <<'QS'
+new x=3
+A setLabel "name" 0
+A appendString "ann"
+A appendValue 120
+A appendString "120"
+A appendString ""
+A appendValue 0
+A appendFile "three.bin"
+A appendString "caf\xe9"
+A setKeyStringAt "k" 0
+A setKeyValueAt 7 1
+A saveToFile "t.arr"
+QS
+q run make.qs
+# 120 and "120", "" and an empty element differ; a cut file and trailing bytes are named.
+q inspect --keys t.arr
+head -c 60 t.arr >cut.arr
+q inspect cut.arr --rows 1
+cat t.arr three.bin >long.arr
+q inspect long.arr --rows 0
+q convert t.arr t.mmf 2>/dev/null
+head -c 40 t.mmf >cut.mmf
+q inspect cut.mmf --rows 0
+# JSON by extension, and back: the same bytes. Kinds in any case; a wrong one lists them.
+q convert t.arr t.json
+q convert --from JSON t.json back.arr --to Native
+cmp t.arr back.arr && echo same bytes
+q convert t.arr t.out --to xml
+q convert t.arr t.out
+q convert t.arr -
+# Labels as the first CSV row, written and read; INI after ; comments.
+q convert t.arr t.csv --header
+head -n 2 t.csv
+q inspect t.csv --header --rows 1
+q inspect t.arr --to csv-rfc4180 --header --rows 1
+printf '; saved by hand\n;\n[s]\nk=v\n' >c.ini
+q inspect c.ini
+# Broken RFC 4180 CSV: an error naming the line, or a warning and the records before.
+printf 'x,y\r\na,"unterminated\r\nb,2\r\n' >bad.csv
+q convert bad.csv bad.arr --from csv-rfc4180
+q convert bad.csv bad.arr --from csv-rfc4180 --lenient
+# -- ends the options.
+cp t.csv ./-x.csv
+q convert -- -x.csv x.json

@@ -1,0 +1,44 @@
+#include "instance_reads.h"
+
+#include <cstring>
+
+#include "array_files.h"
+#include "catalog.h"
+#include "commands.h"
+
+namespace quorrel::tool {
+
+int32_t askNumber(Instance& instance, int32_t code, std::vector<Argument> args) {
+  const ExpressionResult result = instance.callExpression(code, args);
+  return result.isText ? 0 : result.number;
+}
+
+std::optional<std::string> askText(Instance& instance, int32_t code, std::vector<Argument> args) {
+  ExpressionResult result = instance.callExpression(code, args);
+  if (!result.isText) return std::nullopt;
+  return std::move(result.text);
+}
+
+Snapshot::Snapshot(Instance& instance) {
+  instance.callAction(actionCodeOfName(formatInfo(ArrayFormat::Native).saveAction).value(),
+                      {Argument(file.path())});
+}
+
+ByteBuffer readBytes(const std::string& path) {
+  FileStatus status;
+  std::optional<ByteBuffer> bytes = readFileBytes(path.c_str(), 0, status);
+  if (!bytes) throw FileError("cannot read " + path + ": " + std::strerror(status.error));
+  return std::move(*bytes);
+}
+
+std::string plural(int64_t count, const char* noun) {
+  return std::to_string(count) + ' ' + noun + (count == 1 ? "" : "s");
+}
+
+std::string joined(const char* head, const std::string& tail) {
+  std::string text = head;
+  text += tail;
+  return text;
+}
+
+}  // namespace quorrel::tool
