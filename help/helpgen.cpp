@@ -252,9 +252,11 @@ int main(int argc, char** argv) {
     const auto module = quorrel::hostsim::Module::open(args["--module"]);
     const Descriptions descriptions = readDescriptions(args["--descriptions"]);
     const Generated actions =
-        render({'A', "a", 25000, quorrel::abi::kActionCount}, *module, descriptions);
+        render({'A', "a", quorrel::abi::kActionCommandBase, quorrel::abi::kActionCount}, *module,
+               descriptions);
     const Generated expressions =
-        render({'E', "e", 27000, quorrel::abi::kExpressionCount}, *module, descriptions);
+        render({'E', "e", quorrel::abi::kExpressionCommandBase, quorrel::abi::kExpressionCount},
+               *module, descriptions);
     std::string page = readFile(args["--template"]);
     replace(page, "@@VERSION@@", args.count("--version") ? args["--version"] : "");
     replace(page, "@@TOC_ACTIONS@@", actions.toc);

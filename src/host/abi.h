@@ -76,6 +76,18 @@ inline constexpr int kExpressionCount = 0
 #include "host/table.inc"
     ;
 
+// Resource ids the host asks for: the three menus, each item's command id (base plus
+// the row's code), and the display strings and expression names (base plus code).
+inline constexpr int kActionMenuId = 20000;
+inline constexpr int kConditionMenuId = 20001;
+inline constexpr int kExpressionMenuId = 20002;
+inline constexpr int kActionCommandBase = 25000;
+inline constexpr int kConditionCommandBase = 26000;
+inline constexpr int kExpressionCommandBase = 27000;
+inline constexpr int kConditionStringBase = 28000;
+inline constexpr int kActionStringBase = 28200;
+inline constexpr int kExpressionStringBase = 28400;
+
 // Parameter types in the information entries.
 inline constexpr uint16_t kActionParamNumber = 22;
 inline constexpr uint16_t kActionParamText = 45;

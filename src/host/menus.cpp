@@ -15,17 +15,15 @@ namespace host = quorrel::host;
 
 namespace {
 
-constexpr int kActionMenuId = 20000;
-constexpr int kConditionMenuId = 20001;
-constexpr int kExpressionMenuId = 20002;
-
-constexpr int kActionCommandBase = 25000;
-constexpr int kConditionCommandBase = 26000;
-constexpr int kExpressionCommandBase = 27000;
-
-constexpr UINT kConditionStringBase = 28000;
-constexpr UINT kActionStringBase = 28200;
-constexpr UINT kExpressionStringBase = 28400;
+using abi::kActionCommandBase;
+using abi::kActionMenuId;
+using abi::kConditionCommandBase;
+using abi::kConditionMenuId;
+using abi::kExpressionCommandBase;
+using abi::kExpressionMenuId;
+constexpr UINT kConditionStringBase = abi::kConditionStringBase;
+constexpr UINT kActionStringBase = abi::kActionStringBase;
+constexpr UINT kExpressionStringBase = abi::kExpressionStringBase;
 
 // One text buffer per menu level while copying.
 constexpr int kItemTextSize = 80;

@@ -24,7 +24,7 @@ class Library {
   static std::optional<Library> systemMenus();
 
   Library(Library&& other) noexcept;
-  Library& operator=(Library&& other) noexcept;
+  Library& operator=(Library&& other) = delete;
   Library(const Library&) = delete;
   Library& operator=(const Library&) = delete;
   ~Library();

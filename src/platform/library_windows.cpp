@@ -42,11 +42,6 @@ std::optional<Library> Library::systemMenus() {
 
 Library::Library(Library&& other) noexcept : handle_(std::exchange(other.handle_, nullptr)) {}
 
-Library& Library::operator=(Library&& other) noexcept {
-  std::swap(handle_, other.handle_);
-  return *this;
-}
-
 Library::~Library() {
   if (handle_) FreeLibrary(static_cast<HMODULE>(handle_));
 }

@@ -67,6 +67,12 @@ TEST_F(ElementFile, ReadsWholeFilesOfAnySize) {
     a.appendFile({block->data(), static_cast<int32_t>(block->size())});
     EXPECT_TRUE(saveElementToFile(a, 0, path("out.bin").c_str(), FileModeTruncate).ok());
     EXPECT_TRUE(readBytes(path("out.bin")) == bytes);
+    // And through a native file, whose writer passes a block beyond its buffer whole.
+    EXPECT_TRUE(saveNativeFile(a, path("a.arr").c_str(), FileModeTruncate).ok());
+    ElementArray back;
+    EXPECT_TRUE(loadNativeFile(back, path("a.arr").c_str(), LoadReplace).ok());
+    EXPECT_TRUE(saveElementToFile(back, 0, path("back.bin").c_str(), FileModeTruncate).ok());
+    EXPECT_TRUE(readBytes(path("back.bin")) == bytes);
   }
   // A file that cannot be read gives nothing, and says which step failed and why (a
   // missing file and a folder: the file_unusable case).

@@ -50,6 +50,13 @@ if command -v script >/dev/null; then
     echo "binary output to a terminal: $err"
     fail=1
   fi
+  # A long command notes its progress on a terminal (at once here, not after 2 s).
+  err=$(script -qec "(sleep 1; cat t.qs) | QUORREL_PROGRESS_AFTER=0 $quorrel convert --from csv - p.arr" \
+    /dev/null | tr -d '\r')
+  if [[ $err != *"quorrel: converting"*"s"* ]]; then
+    echo "no progress note: $err"
+    fail=1
+  fi
 fi
 if [[ $(id -u) != 0 ]]; then
   printf 'a,b\r\n' >locked.csv && chmod 000 locked.csv

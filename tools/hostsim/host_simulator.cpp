@@ -97,7 +97,7 @@ constexpr EntryOrdinal kEntryOrdinals[] = {
 std::unique_ptr<Module> Module::open(const std::string& path) {
   std::optional<platform::Library> library;
   try {
-    library = platform::Library::open(path);
+    library.emplace(platform::Library::open(path));
   } catch (const std::runtime_error& error) {
     throw ModuleError(std::string("cannot load module: ") + error.what());
   }

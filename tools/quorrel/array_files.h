@@ -13,14 +13,18 @@
 #include <string_view>
 #include <vector>
 
+#include "array/element.h"
 #include "io/native_file.h"
 
 namespace quorrel::tool {
 
 enum class ArrayFormat { Native, Host, Csv, Ini, CsvRfc4180, Json };
 
-// The element type codes of a native file's records (0 is an empty element, or no key).
-inline constexpr uint16_t kValueType = 1, kStringType = 2, kFileType = 3;
+// The element type codes of a native file's records (0 is an empty element, or no key):
+// the core's own.
+inline constexpr uint16_t kValueType = static_cast<uint16_t>(ElementType::Value);
+inline constexpr uint16_t kStringType = static_cast<uint16_t>(ElementType::String);
+inline constexpr uint16_t kFileType = static_cast<uint16_t>(ElementType::File);
 
 struct FormatInfo {
   const char* name;         // as --from and --to take it

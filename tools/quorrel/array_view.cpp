@@ -22,12 +22,17 @@ int32_t limit(int32_t count, int32_t most) {
   return most < 0 ? count : std::min(count, most);
 }
 
-// Plain text stays as it is; anything a reader could mistake is quoted.
+// Plain text stays as it is: text that quoteText prints byte for byte (valid UTF-8 under
+// a UTF-8 locale included; its quotes and backslashes aside), without blanks at its ends
+// or a leading quote. Anything a reader could mistake is quoted.
 std::string displayText(const std::string& value, size_t width) {
-  const bool plain =
-      !value.empty() && value.front() != ' ' && value.back() != ' ' && value.front() != '"' &&
-      std::all_of(value.begin(), value.end(), [](char c) { return c >= 0x20 && c <= 0x7E; });
-  return cutToWidth(plain ? value : quoteText(value), width);
+  const std::string quoted = quoteText(value);
+  const auto escapedAnyway =
+      std::count_if(value.begin(), value.end(), [](char c) { return c == '"' || c == '\\'; });
+  const bool plain = !value.empty() && value.front() != ' ' && value.back() != ' ' &&
+                     value.front() != '"' &&
+                     quoted.size() == value.size() + 2 + static_cast<size_t>(escapedAnyway);
+  return cutToWidth(plain ? value : quoted, width);
 }
 
 void printRows(const std::vector<std::vector<std::string>>& rows, std::ostream& out) {

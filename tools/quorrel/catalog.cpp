@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cctype>
 #include <numeric>
+#include <stdexcept>
 
 #include "host/abi.h"
 
@@ -134,6 +135,13 @@ std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed) {
     if (comparable(nameOf(action, code)) == wanted) return code;
   }
   return std::nullopt;
+}
+
+int32_t expressionCode(std::string_view name) {
+  for (int32_t code = 0; code < abi::kExpressionCount; ++code) {
+    if (name == kExpressionNames[code]) return code;
+  }
+  throw std::logic_error("no expression " + std::string(name));
 }
 
 std::vector<std::string> nearestNames(std::string_view typed) {

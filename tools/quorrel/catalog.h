@@ -39,6 +39,10 @@ std::string_view nameOf(bool action, int32_t code);
 // a "()" after it. Exact names are found first.
 std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed);
 
+// The code of the expression with exactly this name; throws std::logic_error when the
+// table has none (a mistake in the command itself).
+int32_t expressionCode(std::string_view name);
+
 // The names of either kind nearest to `typed` by edit distance, nearest first; only
 // those near enough to be a slip of the keys, at most three.
 std::vector<std::string> nearestNames(std::string_view typed);

@@ -54,7 +54,9 @@ class ProgressNote {
     if (!isTerminal(stderr)) return;
     ticker_ = std::thread([this] { tick(); });
   }
-  ~ProgressNote() {
+  ~ProgressNote() { stop(); }
+  // Ends the note, clearing its line, before the command prints anything of its own.
+  void stop() {
     if (!ticker_.joinable()) return;
     {
       const std::lock_guard lock(mutex_);
@@ -67,12 +69,17 @@ class ProgressNote {
   ProgressNote& operator=(const ProgressNote&) = delete;
 
  private:
-  static constexpr auto kQuiet = std::chrono::seconds(2);
+  // Two seconds of quiet; QUORREL_PROGRESS_AFTER (whole seconds) lets a test see the note
+  // without waiting.
+  static std::chrono::seconds quietTime() {
+    const char* after = std::getenv("QUORREL_PROGRESS_AFTER");
+    return std::chrono::seconds(after && looksLikeInteger(after) ? std::atoi(after) : 2);
+  }
 
   void tick() {
     std::unique_lock lock(mutex_);
     const auto start = std::chrono::steady_clock::now();
-    if (wake_.wait_for(lock, kQuiet, [this] { return done_; })) return;
+    if (wake_.wait_for(lock, quietTime(), [this] { return done_; })) return;
     bool shown = false;
     do {
       const auto seconds =
@@ -449,7 +456,7 @@ bool sameFile(const std::string& a, const std::string& b) {
 }  // namespace
 
 int inspectCommand(const Module& module, const std::string& path, const InspectOptions& options) {
-  const ProgressNote progress("inspecting " + path);
+  ProgressNote progress("inspecting " + path);
   std::optional<TempFile> converted;
   if (options.to) {
     // What the array becomes in that format: converted, then inspected as such.
@@ -461,6 +468,7 @@ int inspectCommand(const Module& module, const std::string& path, const InspectO
       openInput(converted ? converted->path() : path, converted ? options.to : options.from);
   if (converted) input.name = path + " as " + formatInfo(input.format).name;
   auto instance = loadInput(module, input, {options.header, options.lenient});
+  progress.stop();
   std::cout << "file        " << input.name << '\n';
   std::cout << "format      " << formatInfo(input.format).description << " ("
             << std::filesystem::file_size(input.path) << " bytes)\n";
@@ -493,7 +501,7 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
   const ArrayFormat target = checkedTarget(options);
   const std::string& out = options.out;
   const bool toStdout = out == "-";
-  const ProgressNote progress("converting " + options.in);
+  ProgressNote progress("converting " + options.in);
   const Input input = openInput(options.in, options.from);
   auto instance = loadInput(module, input, {options.header, options.lenient});
   const int32_t elements = askNumber(*instance, kSize);
@@ -517,6 +525,7 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
     const ByteBuffer bytes = readBytes(snapshot->file.path());
     const Tally tally = writeFromSnapshot(
         bytes.view(), {target, options.header, elements, ownFormat ? nullptr : &*output}, header);
+    progress.stop();
     warnLosses(header, tally, target, options.header);
   }
   if (output && ownFormat) {
@@ -524,6 +533,7 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
     output->copyFrom(written);
   }
   if (output) output->finish();
+  progress.stop();
   if (!options.report) return 0;
   (toStdout ? std::cerr : std::cout)
       << input.name << " (" << formatInfo(input.format).name << ") -> "

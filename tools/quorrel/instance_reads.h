@@ -9,21 +9,22 @@
 #include <string>
 #include <vector>
 
+#include "catalog.h"
 #include "io/file_handle.h"
 #include "module.h"
 #include "temp_file.h"
 
 namespace quorrel::tool {
 
-// Expression codes the views and conversions read.
-inline constexpr int32_t kSize = 0;
-inline constexpr int32_t kGetString = 2;
-inline constexpr int32_t kDim = 26;
-inline constexpr int32_t kBoundary = 27;
-inline constexpr int32_t kNumberOfRows = 40;
-inline constexpr int32_t kRowList = 41;
-inline constexpr int32_t kGetLabel = 43;
-inline constexpr int32_t kDelimiter = 51;
+// The expressions the views and conversions read, by the table's names.
+inline const int32_t kSize = expressionCode("size(");
+inline const int32_t kGetString = expressionCode("get$(");
+inline const int32_t kDim = expressionCode("dim(");
+inline const int32_t kBoundary = expressionCode("boundary(");
+inline const int32_t kNumberOfRows = expressionCode("numberOfRows(");
+inline const int32_t kRowList = expressionCode("rowList$(");
+inline const int32_t kGetLabel = expressionCode("getLabel$(");
+inline const int32_t kDelimiter = expressionCode("delimiter$(");
 
 // A number answer (0 for a text), or a text answer (none for a number).
 int32_t askNumber(Instance& instance, int32_t code, std::vector<Argument> args = {});

@@ -11,9 +11,8 @@
 namespace quorrel::tool {
 namespace {
 
-// Command ids of the resource script's menus: the base plus the code.
-constexpr int32_t kActionMenuBase = 25000;
-constexpr int32_t kExpressionMenuBase = 27000;
+constexpr int32_t kActionMenuBase = abi::kActionCommandBase;
+constexpr int32_t kExpressionMenuBase = abi::kExpressionCommandBase;
 
 // Code -> "Top > Sub > Item", read from the menu tree as the editor receives it.
 void addMenuPaths(const std::vector<MenuItem>& items, const std::string& prefix, int32_t base,

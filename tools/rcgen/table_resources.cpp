@@ -6,16 +6,17 @@
 #include <string_view>
 #include <vector>
 
+#include "host/abi.h"
+
 namespace rcgen {
 namespace {
 
-// The command ids and string ids the host expects: a base plus the row's code.
-constexpr int kActionMenuId = 20000;
-constexpr int kExpressionMenuId = 20002;
-constexpr int kActionCommandBase = 25000;
-constexpr int kExpressionCommandBase = 27000;
-constexpr int kActionDisplayBase = 28200;
-constexpr int kExpressionNameBase = 28400;
+using quorrel::abi::kActionCommandBase;
+using quorrel::abi::kActionMenuId;
+using quorrel::abi::kExpressionCommandBase;
+using quorrel::abi::kExpressionMenuId;
+constexpr int kActionDisplayBase = quorrel::abi::kActionStringBase;
+constexpr int kExpressionNameBase = quorrel::abi::kExpressionStringBase;
 
 struct Row {
   int code;

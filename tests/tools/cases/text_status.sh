@@ -8,6 +8,9 @@ LC_ALL=C q run --echo t.qs 2>/dev/null
 q --ascii run t.qs 2>/dev/null
 q inspect --width 12 t.arr | tail -3
 q inspect --width 3 t.arr
+# In a table, valid UTF-8 is plain text; an invalid byte makes a cell quoted.
+printf 'Zo\xc3\xab,\xc3\x91and\xc3\xba\nb\xff,x\n' >u.csv
+q inspect u.csv | tail -3
 printf '\xff\xfeA\0' | q run -
 # A failed file action is a warning, and status 1 with --strict.
 printf 'A loadFromCsv "none.csv"\n' >f.qs
