@@ -277,7 +277,7 @@ class JsonReader {
       if (pos_ >= text_.size() || text_[pos_] != '"') return fail("a member name is missing");
       std::string name = string();
       if (!take(':')) return fail("a colon is missing");
-      v.members.emplace_back(std::move(name), value(depth + 1));
+      v.members.push_back({std::move(name), value(depth + 1)});
     } while (!problem_ && take(','));
     if (!take('}')) fail("a closing brace is missing");
   }

@@ -48,6 +48,7 @@ std::string base64(std::string_view bytes);
 std::optional<std::string> fromBase64(std::string_view text);
 
 // A JSON document read whole. Numbers keep an exact integer when they are one.
+struct JsonMember;
 struct JsonValue {
   enum class Kind { Null, Boolean, Number, String, Array, Object };
   Kind kind = Kind::Null;
@@ -55,9 +56,13 @@ struct JsonValue {
   std::optional<int64_t> integer;  // a number without fraction or exponent, in range
   std::string text;
   std::vector<JsonValue> items;
-  std::vector<std::pair<std::string, JsonValue>> members;
+  std::vector<JsonMember> members;  // an object's, in the document's order
   // The member called `name` of an object, or null.
   const JsonValue* find(std::string_view name) const;
+};
+struct JsonMember {
+  std::string name;
+  JsonValue value;
 };
 
 struct JsonRead {
