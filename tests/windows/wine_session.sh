@@ -5,9 +5,20 @@
 #                            returns 1 (and says why) without wine64
 # Sets WINE64 and WINESERVER, and WINE32 (a command running a 32-bit program in the
 # 32-bit prefix, through scripts/wine32) where 32-bit Wine is set up; WINE32_WHY otherwise.
+#   each_build RUN BUILD64 BUILD32 [TEST...]   RUN WINE BUILD LABEL for win64, then win32
+# The drivers share absolute, skip (exit 77 with the reason) and need_build too.
 
 wine_session_repo=$(cd "$(dirname "${BASH_SOURCE[0]}")/../.." && pwd)
 wine32_home=${QUORREL_WINE32_HOME:-/var/lib/quorrel-wine32}
+absolute() { [[ $1 == /* ]] && echo "$1" || echo "$PWD/$1"; }
+skip() { echo "SKIPPED: $*"; exit 77; }
+need_build() {  # build file...: skips unless the cross build holds every file
+  local f
+  for f in "${@:2}"; do
+    [[ -f $1/$f ]] ||
+      skip "$1/$f is missing (build it: cmake --preset mingw64 && cmake --build --preset mingw64)"
+  done
+}
 
 wine_session_stop() {
   [[ -n ${WINESERVER:-} ]] && "$WINESERVER" -k >/dev/null 2>&1
@@ -71,4 +82,16 @@ wine32_runs() {
   "$WINE32" "$@" >/dev/null 2>&1 </dev/null && return 0
   WINE32_WHY="32-bit programs do not start under this Wine"
   return 1
+}
+
+# The 64-bit build always runs; the 32-bit one (the shipped DLL) where 32-bit Wine starts
+# its quorrel.exe and TEST (which sets WINE32_WHY when it fails), if given, passes.
+each_build() {  # run build64 build32 [test...]
+  "$1" "$WINE64" "$2" win64
+  if wine32_runs "$3/quorrel.exe" --module "$3/quorrel.dll" menu actions &&
+    { (($# < 4)) || "${@:4}"; }; then
+    "$1" "$WINE32" "$3" win32
+  else
+    echo "win32: not run ($WINE32_WHY)"
+  fi
 }
