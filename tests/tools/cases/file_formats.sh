@@ -1,6 +1,5 @@
 # Every format both ways: types and keys shown, damaged files named, JSON read back
 # byte for byte, labels as a CSV header, broken RFC 4180 CSV, output chosen by intent.
-q() { "$QUORREL" "$@"; echo "status $?"; }
 printf 'xyz' >three.bin
 cat >make.qs <<'QS'
 new x=3
