@@ -1,10 +1,8 @@
 # Actions by name, the list of every action and expression, one entry's description,
 # --echo and --warn-files, and the shell's own commands with piped input.
-q list
-q list setLabel
-q list 17
-q list labSum
-q list lunchbox
+for line in list 'list setLabel' 'list 17' 'list labSum' 'list lunchbox'; do
+  q $line
+done
 cat >named.qs <<'QS'
 new x=2 autoselect=1
 A setLabel "qty" 1
