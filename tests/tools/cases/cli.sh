@@ -1,7 +1,7 @@
 # The command line: misuse exits 2, unreadable files and modules exit 1.
 echo 'E 0' >ok.qs
 for line in '' frobnicate run 'run a.qs b.qs' 'shell extra' inspect 'convert only-one' \
-  'convert a b --to xml' 'run x.qs --to csv' 'menu widgets' 'strings conditions' \
+  'run x.qs --to csv' 'menu widgets' 'strings conditions' \
   '--bogus run x.qs' 'run x.qs --module' 'run missing.qs' 'run .' \
   '--module ./no-such-module.so run ok.qs' 'run ok.qs --module=./no-such-module.so'; do
   q $line

@@ -18,8 +18,6 @@ E size(
 QS
 q run named.qs
 q run --echo --warn-files named.qs
-printf 'A appendStrng "x"\n' | q run -
-printf 'A x1\n' | q run -
 printf 'help\nhelp E0\nA appendValue 5\nshow\nA loadFromCsv "none.csv"\nE size(\nquit\nE size(\n' |
   q shell
 printf 'A loadFromCsv "none.csv"\n' | q shell --no-warn-files
