@@ -11,7 +11,6 @@ printf '\xff\xfeA\0' | q run -
 # A failed file action is a warning, and status 1 with --strict.
 printf 'A loadFromCsv "none.csv"\n' >f.qs
 q run --strict --no-warn-files f.qs
-q run .
 # Texts read as numbers as atol reads them in the C locale: blanks, one sign, then
 # digits up to the first other character, saturating at the int32 limits; 0xA0 is not a
 # blank. Each line: the number read, then the text.
