@@ -26,7 +26,7 @@ linux=$(absolute "$linux") build64=$(absolute "$build64") build32=$(absolute "$b
 work=$(absolute "$work")
 [[ -x $linux ]] || skip "no Linux quorrel at $linux (cmake --build --preset release)"
 command -v python3 >/dev/null || skip "python3 is not installed: no scripts to run"
-wine_session_start "$work" || exit 77
+wine_session_start "$work"
 
 # The seed files: the fuzz corpora's own saves in every format, and raw element files.
 rm -rf "$work/seed" "$work/scripts" "$work/runs"

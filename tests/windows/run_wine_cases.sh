@@ -11,7 +11,7 @@ here=$(cd "$(dirname "$0")" && pwd)
 source "$here/wine_session.sh"
 build64=$(absolute "$1") build32=$(absolute "$2") cases=$(absolute "$3")
 examples=$(absolute "$4") work=$(absolute "$5")
-wine_session_start "$work" || exit 77
+wine_session_start "$work"
 need_build "$build64" quorrel.exe quorrel.dll
 
 total_fail=0

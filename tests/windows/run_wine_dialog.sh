@@ -14,7 +14,7 @@ dialog needs a display"
   QUORREL_UNDER_XVFB=1 exec xvfb-run -a bash "$0" "$build64" "$build32" "$work"
 fi
 
-wine_session_start "$work" || exit 77
+wine_session_start "$work"
 # Windows in a Wine desktop of their own: with no window manager on the display, every
 # dialog that closes would wait two seconds for one to acknowledge it (the first 32-bit
 # run took a minute without it). Each prefix keeps the setting once it has it.

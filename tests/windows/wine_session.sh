@@ -2,7 +2,7 @@
 # prefix for every program the script runs (a Wine start then costs a fraction of a
 # second).
 #   wine_session_start DIR   64-bit prefix in DIR/prefix, 32-bit one in DIR/prefix32;
-#                            returns 1 (and says why) without wine64
+#                            skips (exit 77, saying why) without wine64
 # Sets WINE64 and WINESERVER, and WINE32 (a command running a 32-bit program in the
 # 32-bit prefix, through scripts/wine32) where 32-bit Wine is set up; WINE32_WHY otherwise.
 #   each_build RUN BUILD64 BUILD32 [TEST...]   RUN WINE BUILD LABEL for win64, then win32
@@ -55,11 +55,8 @@ wine_session_start() {
   local dir=$1
   WINE64=$(command -v wine64 || ls /usr/lib/wine/wine64 2>/dev/null || true)
   WINESERVER=$(command -v wineserver || ls /usr/lib/wine/wineserver 2>/dev/null || true)
-  if [[ -z $WINE64 || -z $WINESERVER ]]; then
-    echo "SKIPPED: wine64 is not installed (scripts/install-wine installs it); the Windows"
-    echo "programs did not run"
-    return 1
-  fi
+  [[ -n $WINE64 && -n $WINESERVER ]] || skip "wine64 is not installed (scripts/install-wine installs it); the Windows
+programs did not run"
   WINE32_WHY=
   mkdir -p "$dir/prefix"
   export WINEPREFIX=$dir/prefix WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml="
@@ -68,30 +65,21 @@ wine_session_start() {
   # The first start of a new prefix sets it up; do it once, outside any measured case.
   "$WINE64" cmd /c exit >/dev/null 2>&1 </dev/null
   wine32_start "$dir"
-  return 0
-}
-
-# Succeeds when 32-bit Wine runs the 32-bit program EXE (given its arguments);
-# otherwise sets WINE32_WHY.
-wine32_runs() {
-  [[ -n $WINE32 ]] || return 1
-  if [[ ! -f $1 ]]; then
-    WINE32_WHY="no $1"
-    return 1
-  fi
-  "$WINE32" "$@" >/dev/null 2>&1 </dev/null && return 0
-  WINE32_WHY="32-bit programs do not start under this Wine"
-  return 1
 }
 
 # The 64-bit build always runs; the 32-bit one (the shipped DLL) where 32-bit Wine starts
 # its quorrel.exe and TEST (which sets WINE32_WHY when it fails), if given, passes.
 each_build() {  # run build64 build32 [test...]
   "$1" "$WINE64" "$2" win64
-  if wine32_runs "$3/quorrel.exe" --module "$3/quorrel.dll" menu actions &&
-    { (($# < 4)) || "${@:4}"; }; then
+  if [[ -z $WINE32 ]]; then
+    :  # WINE32_WHY says why
+  elif [[ ! -f $3/quorrel.exe ]]; then
+    WINE32_WHY="no $3/quorrel.exe"
+  elif ! "$WINE32" "$3/quorrel.exe" --module "$3/quorrel.dll" menu actions >/dev/null 2>&1 </dev/null; then
+    WINE32_WHY="32-bit programs do not start under this Wine"
+  elif (($# < 4)) || "${@:4}"; then
     "$1" "$WINE32" "$3" win32
-  else
-    echo "win32: not run ($WINE32_WHY)"
+    return
   fi
+  echo "win32: not run ($WINE32_WHY)"
 }
