@@ -19,7 +19,6 @@ E getLabel$( 1
 E getCol( "LEVEL"
 E getCol( "nope"
 E columnList$( 1
-E columnList$( 3
 E getFromColumnRow( 1 2
 E getFromColumnRow$( 0 1
 E getFromLabelRow( "level" 2
