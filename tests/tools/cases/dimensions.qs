@@ -91,7 +91,6 @@ E dimIndexOfIndex$( 2 5
 E indexOfXY( 5 3
 # Coordinate lists split at every delimiter character, and runs of them count as one.
 new
-E indexOfDimIndex( ",,3,,,2,,"
 E indexOfDimIndex( " 3, -2"
 E indexOfDimIndex( "x,2"
 E indexOfDimIndex( ",,,"
