@@ -30,7 +30,6 @@ q convert t.arr t.json
 q convert --from JSON t.json back.arr --to Native
 cmp t.arr back.arr && echo same bytes
 q convert t.arr t.out --to xml
-q convert t.arr t.out
 q convert t.arr -
 # Labels as the first CSV row, written and read; INI after ; comments.
 q convert t.arr t.csv --header
