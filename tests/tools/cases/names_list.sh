@@ -21,5 +21,4 @@ q run --echo --warn-files named.qs
 printf 'help\nhelp E0\nA appendValue 5\nshow\nA loadFromCsv "none.csv"\nE size(\nquit\nE size(\n' |
   q shell
 printf 'A loadFromCsv "none.csv"\n' | q shell --no-warn-files
-q run --no-warn-files named.qs
 q inspect --echo ok.arr
