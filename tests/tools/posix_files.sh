@@ -5,16 +5,14 @@ set -u
 quorrel=$1 work=$2
 rm -rf "$work" && mkdir -p "$work" && cd "$work" || exit 1
 fail=0
-check() {  # expected-status expected-stderr command...
-  local status=$1 expected=$2
+check() {  # expected-status expected-stderr (a pattern) command...; stdout to $out
+  local status=$1 expected=$2 err got
   shift 2
-  local err
-  err=$("$quorrel" "$@" 2>&1 >/dev/null)
-  local got=$?
-  if [[ $got != "$status" || $err != "$expected" ]]; then
-    echo "quorrel $*: status $got, stderr '$err'; expected $status, '$expected'"
-    fail=1
-  fi
+  err=$("$quorrel" "$@" 2>&1 >"${out:-/dev/null}")
+  got=$?
+  [[ $got == "$status" && $err == $expected ]] && return
+  echo "quorrel $*${out:+ >$out}: status $got, stderr '$err'; expected $status, '$expected'"
+  fail=1
 }
 check 1 "quorrel: cannot read /dev/null: it is not a regular file" inspect /dev/null
 check 1 "quorrel: cannot read /dev/zero: it is not a regular file" convert /dev/zero o.arr
@@ -24,20 +22,10 @@ check 0 't.qs:2: warning: saveToFile "/dev/null/x.arr": could not open it (Not a
 t.qs:3: warning: saveToFile "/dev/full": could not write it (No space left on device)' run t.qs
 # Output that cannot be written is an error, whether found while running or at the end;
 # binary output to a terminal needs --force.
-check_full() {  # command...
-  local err
-  err=$("$quorrel" "$@" 2>&1 >/dev/full)
-  local got=$?
-  if [[ $got != 1 || $err != "quorrel: cannot write standard output"* ]]; then
-    echo "quorrel $* >/dev/full: status $got, stderr '$err'; expected 1 and a message"
-    fail=1
-  fi
-}
-check_full list
-check_full inspect t.qs --from csv
-check_full convert t.qs - --to json --from csv
 printf 'E size(\n' >size.qs
-check_full run size.qs
+for command in list "inspect t.qs --from csv" "convert t.qs - --to json --from csv" "run size.qs"; do
+  out=/dev/full check 1 "quorrel: cannot write standard output*" $command
+done
 # A command copied away from its module says where it looked and how to name it.
 cp "$quorrel" ./copied
 err=$(./copied list 2>&1 >/dev/null)

@@ -21,11 +21,10 @@ cd "$work" || exit 1
 
 fail=0
 compare() {  # golden actual label
-  if ! diff -u "$1" "$2" >diff.txt 2>&1; then
-    echo "== $3 differs from $(basename "$1"):"
-    cat diff.txt
-    fail=1
-  fi
+  diff -u "$1" "$2" >diff.txt 2>&1 && return
+  echo "== $3 differs from $(basename "$1"):"
+  cat diff.txt
+  fail=1
 }
 
 # q runs the command and prints its exit status; run runs the script on standard
@@ -36,25 +35,19 @@ bad() { printf '%s\n' "$@" >bad.qs; q run bad.qs; }
 dump() { echo "$1: $(wc -c <"$1") bytes"; od -An -tx1 -v "$1"; }
 export -f q run bad dump
 
+expected_status=0
 if [[ $name == *.qs ]]; then
   "$quorrel" run --echo "$name" >stdout.txt 2>stderr.txt
   status=$?
-  expected_status=0
-  err_golden=/dev/null
-  if [[ -f $dir/$stem.err ]]; then
-    grep -q ': error: ' "$dir/$stem.err" && expected_status=2
-    err_golden=$dir/$stem.err
-  fi
+  err_golden=$dir/$stem.err
+  [[ -f $err_golden ]] || err_golden=/dev/null
+  grep -q ': error: ' "$err_golden" && expected_status=2
   compare "$dir/$stem.out" stdout.txt stdout
   compare "$err_golden" stderr.txt stderr
 else
   QUORREL=$quorrel QUORREL_EXAMPLES=$examples bash "$name" >stdout.txt 2>&1
   status=$?
-  expected_status=0
   compare "$dir/$stem.out" stdout.txt output
 fi
-if [[ $status != "$expected_status" ]]; then
-  echo "== exit status $status, expected $expected_status"
-  fail=1
-fi
+[[ $status == "$expected_status" ]] || { echo "== exit status $status, expected $expected_status"; fail=1; }
 exit $fail

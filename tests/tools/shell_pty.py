@@ -94,27 +94,27 @@ class Shell:
         failures.append(f"{what}: shell did not end")
 
 
+def steps(shell, *pairs):
+    """Sends each (keys, text to expect, what it shows); no keys: only waits for the text."""
+    for keys, text, what in pairs:
+        if keys:
+            shell.send(keys)
+        shell.expect(text, what)
+
+
 with tempfile.TemporaryDirectory() as home:
     shell = Shell(home)
-    shell.expect("quorrel> ", "first prompt")
-    shell.send("help\r")
-    shell.expect("Ctrl-C clears the line", "help")
-    shell.send("help appendString\r")
-    shell.expect("Adds a string element at the end of the array.", "help NAME")
-    # Tab completes an action name after A, and an expression name after E.
-    shell.send('A appendStr\t"x"\r')
-    shell.expect("quorrel> ", "completed action")
-    shell.send("E siz\t\r")
-    shell.expect("1\r\n", "completed expression")
-    # Ctrl-C abandons the half-typed line; the shell goes on.
-    shell.send("A appendString")
-    shell.expect("appendString", "echo before Ctrl-C")
+    steps(shell, (None, "quorrel> ", "first prompt"),
+          ("help\r", "Ctrl-C clears the line", "help"),
+          ("help appendString\r", "Adds a string element at the end of the array.", "help NAME"),
+          # Tab completes an action name after A, and an expression name after E.
+          ('A appendStr\t"x"\r', "quorrel> ", "completed action"),
+          ("E siz\t\r", "1\r\n", "completed expression"),
+          # Ctrl-C abandons the half-typed line; the shell goes on.
+          ("A appendString", "appendString", "echo before Ctrl-C"))
     shell.send_control("\x03", "Ctrl-C")
-    shell.expect("quorrel> ", "prompt after Ctrl-C")
-    shell.send("E size(\r")
-    shell.expect("1\r\n", "line after Ctrl-C")
-    shell.send("show\r")
-    shell.expect("elements    1", "show")
+    steps(shell, (None, "quorrel> ", "prompt after Ctrl-C"), ("E size(\r", "1\r\n", "line after Ctrl-C"),
+          ("show\r", "elements    1", "show"))
     shell.send("quit\r")
     shell.finish("quit")
     if not os.path.exists(os.path.join(home, ".quorrel_history")):
@@ -123,29 +123,21 @@ with tempfile.TemporaryDirectory() as home:
     # The second session recalls the first one's lines: Up three times passes quit
     # and show.
     shell = Shell(home)
-    shell.expect("quorrel> ", "second prompt")
-    shell.send("\x1b[A\x1b[A\x1b[A\r")
-    shell.expect("E size(", "recalled line")
-    shell.expect("0\r\n", "recalled line's result in a fresh instance")
-    shell.expect("quorrel> ", "prompt before show")
+    steps(shell, (None, "quorrel> ", "second prompt"), ("\x1b[A\x1b[A\x1b[A\r", "E size(", "recalled line"),
+          (None, "0\r\n", "recalled line's result in a fresh instance"),
+          (None, "quorrel> ", "prompt before show"))
     # show marks the selected rows, shows all ten columns of a default-width table
     # and takes inspect's view options.
     rows = [f'A appendRowFromList "r{row},b,c,d,e,f,g,h,i,j{row}"' for row in range(3)]
-    for line in ["new autoselect=1", *rows, "A invertSelection",
-                 'A selectWhereContainingByColumn 0 "r1"']:
-        shell.send(line + "\r")
-        shell.expect("quorrel> ", line)
-    shell.send("show\r")
-    shell.expect("selected    1 of 3 rows (marked *)", "show's selection")
-    shell.expect("#8 #9\r\n", "show's tenth column")
-    shell.expect("  0   r0", "show's unselected row")
-    shell.expect("  *1  r1", "show's selected row")
-    shell.send("show --keys --rows 1\r")
-    shell.expect('0     string "r0"', "show --keys")
-    shell.expect("29 more elements not shown", "show --rows")
-    shell.send("show --bogus\r")
-    shell.expect("not --bogus", "show's unknown option")
-    shell.expect("quorrel> ", "prompt before Ctrl-D")
+    steps(shell, *[(line + "\r", "quorrel> ", line) for line in
+                   ["new autoselect=1", *rows, "A invertSelection", 'A selectWhereContainingByColumn 0 "r1"']])
+    steps(shell, ("show\r", "selected    1 of 3 rows (marked *)", "show's selection"),
+          (None, "#8 #9\r\n", "show's tenth column"), (None, "  0   r0", "show's unselected row"),
+          (None, "  *1  r1", "show's selected row"),
+          ("show --keys --rows 1\r", '0     string "r0"', "show --keys"),
+          (None, "29 more elements not shown", "show --rows"),
+          ("show --bogus\r", "not --bogus", "show's unknown option"),
+          (None, "quorrel> ", "prompt before Ctrl-D"))
     shell.send_control("\x04", "Ctrl-D")
     shell.finish("Ctrl-D")
 

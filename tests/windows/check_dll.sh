@@ -11,10 +11,7 @@
 set -uo pipefail
 dll=$1 entry_points=$2 script=$3 resource_dir=$4 objdump=$5 windres=$6
 for tool in "$objdump" "$windres"; do
-  if ! command -v "$tool" >/dev/null; then
-    echo "skipped: $tool is not installed (binutils-mingw-w64-i686)"
-    exit 77
-  fi
+  command -v "$tool" >/dev/null || { echo "skipped: $tool is not installed (binutils-mingw-w64-i686)"; exit 77; }
 done
 [[ -f $dll ]] || { echo "no DLL at $dll (build it with scripts/build-dll)"; exit 1; }
 

@@ -15,10 +15,7 @@ negative or at/past the array's cap (refused); boundaries are at most 16 (a wide
 makes row indexes wrap in 32 bits and land anywhere below the cap); and a script reads
 at most kMaxReads files, since reading back what it saved doubles the array each time.
 """
-import argparse
-import os
-import random
-import re
+import argparse, os, random, re
 
 INT32_MIN, INT32_MAX = -(2**31), 2**31 - 1
 CAP = 67108864  # the array's element cap: an index at or past it is refused
@@ -60,19 +57,9 @@ def catalog(path):
 
 def quote(text):
     """The script's string syntax; lone surrogates stand for raw bytes."""
-    raw = text.encode("utf-8", "surrogateescape")
-    out = []
-    for b in raw:
-        c = chr(b)
-        if c in '"\\':
-            out.append("\\" + c)
-        elif c in "\n\r\t":
-            out.append({"\n": "\\n", "\r": "\\r", "\t": "\\t"}[c])
-        elif b < 0x20 or b >= 0x7F:
-            out.append("\\x%02x" % b)
-        else:
-            out.append(c)
-    return '"' + "".join(out) + '"'
+    escapes = {'"': '\\"', "\\": "\\\\", "\n": "\\n", "\r": "\\r", "\t": "\\t"}
+    return '"' + "".join(escapes.get(chr(b)) or (chr(b) if 0x20 <= b < 0x7F else "\\x%02x" % b)
+                         for b in text.encode("utf-8", "surrogateescape")) + '"'
 
 
 def swapcase(text):
@@ -183,9 +170,8 @@ def script(seed, k, entries, seeds):
 
 def main():
     parser = argparse.ArgumentParser(description=__doc__.split("\n")[0])
-    parser.add_argument("catalog")
-    parser.add_argument("seeddir")
-    parser.add_argument("outdir")
+    for name in ("catalog", "seeddir", "outdir"):
+        parser.add_argument(name)
     parser.add_argument("--seed", type=int, default=1)
     parser.add_argument("--count", type=int, default=100)
     args = parser.parse_args()

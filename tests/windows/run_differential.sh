@@ -21,15 +21,12 @@ while (($#)); do
   esac
   shift 2
 done
-absolute() { [[ $1 == /* ]] && echo "$1" || echo "$PWD/$1"; }
+source "$here/wine_session.sh"
 linux=$(absolute "$linux") build64=$(absolute "$build64") build32=$(absolute "$build32")
 work=$(absolute "$work")
-source "$here/wine_session.sh"
-
-skip() { echo "SKIPPED: $*"; exit 77; }
 [[ -x $linux ]] || skip "no Linux quorrel at $linux (cmake --build --preset release)"
 command -v python3 >/dev/null || skip "python3 is not installed: no scripts to run"
-wine_session_start "$work" || exit 77
+wine_session_start "$work"
 
 # The seed files: the fuzz corpora's own saves in every format, and raw element files.
 rm -rf "$work/seed" "$work/scripts" "$work/runs"
@@ -70,15 +67,19 @@ for ((k = 0; k < count; k++)); do run_one linux "$k" "$linux"; done
 echo "linux: $count scripts ($((SECONDS - start)) s)"
 
 compared=0 differences=0 labels=
-check_build() {  # label command...
-  local label=$1 k bad=0 start=$SECONDS
-  for ((k = 0; k < count; k++)); do run_one "$label" "$k" "${@:2}"; done
+check_build() {  # wine build label
+  local label=$3 k bad=0 start=$SECONDS
+  if [[ ! -f $2/quorrel.exe || ! -f $2/quorrel.dll ]]; then
+    echo "$label: skipped (no quorrel.exe and quorrel.dll in $2: cmake --build --preset mingw64)"
+    return
+  fi
+  for ((k = 0; k < count; k++)); do run_one "$label" "$k" "$1" "$2/quorrel.exe"; done
   for ((k = 0; k < count; k++)); do
     same "$label" "$k" && continue
     # Wine itself now and then loses a run (see run_wine_cases.sh): a second run decides,
     # and a first run that differed alone is shown too.
     rm -rf "$work/runs/$label/$k.first" && mv "$work/runs/$label/$k" "$work/runs/$label/$k.first"
-    run_one "$label" "$k" "${@:2}"
+    run_one "$label" "$k" "$1" "$2/quorrel.exe"
     if same "$label" "$k"; then
       echo "== $label: script $k matched only on a second run; the first run:"
       show "$label" "$k" "$work/runs/$label/$k.first" | sed 1d
@@ -91,16 +92,7 @@ check_build() {  # label command...
   compared=$((compared + count)) differences=$((differences + bad)) labels+=" $label"
 }
 
-if [[ -f $build64/quorrel.exe && -f $build64/quorrel.dll ]]; then
-  check_build win64 "$WINE64" "$build64/quorrel.exe"
-else
-  echo "win64: skipped (no quorrel.exe and quorrel.dll in $build64: cmake --build --preset mingw64)"
-fi
-if wine32_runs "$build32/quorrel.exe" --module "$build32/quorrel.dll" menu actions; then
-  check_build win32 "$WINE32" "$build32/quorrel.exe"
-else
-  echo "win32: skipped ($WINE32_WHY)"
-fi
+each_build check_build "$build64" "$build32"
 ((compared > 0)) || skip "no Windows build could run"
 echo "differential: $compared scripts, $differences differences (${labels# } against linux)"
 ((differences == 0))

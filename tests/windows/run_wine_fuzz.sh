@@ -10,27 +10,23 @@
 # take (default 300; one takes about a second, the 32-bit qemu route about four times
 # longer).
 set -u
-here=$(cd "$(dirname "$0")" && pwd)
-absolute() { [[ $1 == /* ]] && echo "$1" || echo "$PWD/$1"; }
+source "$(dirname "$0")/wine_session.sh"
 build64=$(absolute "$1") build32=$(absolute "$2") source=$(cd "$3" && pwd) work=$(absolute "$4")
 limit=${QUORREL_WINE_FUZZ_TIMEOUT:-300}
-source "$here/wine_session.sh"
 
 # Every target of fuzz/targets; a build that made none of them predates the Windows
 # replay programs.
 targets=()
 for target in "$source"/fuzz/targets/*.cpp; do targets+=("$(basename "$target" .cpp)"); done
-built() {  # build: how many of the replay programs it holds
-  local n=0 name
-  for name in "${targets[@]}"; do [[ -f $1/fuzz_$name.exe ]] && n=$((n + 1)); done
-  echo "$n"
+built() {  # build: whether it holds any of the replay programs
+  local name
+  for name in "${targets[@]}"; do [[ -f $1/fuzz_$name.exe ]] && return 0; done
+  return 1
 }
 
-wine_session_start "$work" || exit 77
-if [[ $(built "$build64") == 0 ]]; then
-  echo "SKIPPED: $build64 has no fuzz replay programs (build it: cmake --preset mingw64 && cmake --build --preset mingw64)"
-  exit 77
-fi
+wine_session_start "$work"
+built "$build64" ||
+  skip "$build64 has no fuzz replay programs (build it: cmake --preset mingw64 && cmake --build --preset mingw64)"
 # The programs trap when anything appears in their working folder; ctest's is shared
 # with the other Wine tests' work folders.
 mkdir -p "$work/cwd" && cd "$work/cwd" || exit 1
@@ -70,11 +66,7 @@ replay_all() {  # wine build label
   local wine=$1 build=$2 label=$3 start=$SECONDS total=0 bad=0 name program expected count
   for name in "${targets[@]}"; do
     program=$build/fuzz_$name.exe
-    if [[ ! -f $program ]]; then
-      echo "== $label: $name failed: $program was not built"
-      bad=$((bad + 1))
-      continue
-    fi
+    [[ -f $program ]] || { echo "== $label: $name failed: $program was not built"; bad=$((bad + 1)); continue; }
     mapfile -t dirs < <(corpora "$name")
     expected=$(find "${dirs[@]}" -type f | wc -l)
     replay "$wine" "$program" "${dirs[@]}"
@@ -100,12 +92,6 @@ replay_all() {  # wine build label
   failed=$((failed + bad))
 }
 
-replay_all "$WINE64" "$build64" win64
-if ! wine32_runs "$build32/quorrel.exe" --module "$build32/quorrel.dll" menu actions; then
-  echo "win32: not run ($WINE32_WHY)"
-elif [[ $(built "$build32") == 0 ]]; then
-  echo "win32: not run ($build32 has no fuzz replay programs: run scripts/build-dll)"
-else
-  replay_all "$WINE32" "$build32" win32
-fi
+built32() { built "$build32" || { WINE32_WHY="$build32 has no fuzz replay programs: run scripts/build-dll"; return 1; }; }
+each_build replay_all "$build64" "$build32" built32
 exit $((failed > 0))

@@ -2,12 +2,23 @@
 # prefix for every program the script runs (a Wine start then costs a fraction of a
 # second).
 #   wine_session_start DIR   64-bit prefix in DIR/prefix, 32-bit one in DIR/prefix32;
-#                            returns 1 (and says why) without wine64
+#                            skips (exit 77, saying why) without wine64
 # Sets WINE64 and WINESERVER, and WINE32 (a command running a 32-bit program in the
 # 32-bit prefix, through scripts/wine32) where 32-bit Wine is set up; WINE32_WHY otherwise.
+#   each_build RUN BUILD64 BUILD32 [TEST...]   RUN WINE BUILD LABEL for win64, then win32
+# The drivers share absolute, skip (exit 77 with the reason) and need_build too.
 
 wine_session_repo=$(cd "$(dirname "${BASH_SOURCE[0]}")/../.." && pwd)
 wine32_home=${QUORREL_WINE32_HOME:-/var/lib/quorrel-wine32}
+absolute() { [[ $1 == /* ]] && echo "$1" || echo "$PWD/$1"; }
+skip() { echo "SKIPPED: $*"; exit 77; }
+need_build() {  # build file...: skips unless the cross build holds every file
+  local f
+  for f in "${@:2}"; do
+    [[ -f $1/$f ]] ||
+      skip "$1/$f is missing (build it: cmake --preset mingw64 && cmake --build --preset mingw64)"
+  done
+}
 
 wine_session_stop() {
   [[ -n ${WINESERVER:-} ]] && "$WINESERVER" -k >/dev/null 2>&1
@@ -44,11 +55,8 @@ wine_session_start() {
   local dir=$1
   WINE64=$(command -v wine64 || ls /usr/lib/wine/wine64 2>/dev/null || true)
   WINESERVER=$(command -v wineserver || ls /usr/lib/wine/wineserver 2>/dev/null || true)
-  if [[ -z $WINE64 || -z $WINESERVER ]]; then
-    echo "SKIPPED: wine64 is not installed (scripts/install-wine installs it); the Windows"
-    echo "programs did not run"
-    return 1
-  fi
+  [[ -n $WINE64 && -n $WINESERVER ]] || skip "wine64 is not installed (scripts/install-wine installs it); the Windows
+programs did not run"
   WINE32_WHY=
   mkdir -p "$dir/prefix"
   export WINEPREFIX=$dir/prefix WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml="
@@ -57,18 +65,21 @@ wine_session_start() {
   # The first start of a new prefix sets it up; do it once, outside any measured case.
   "$WINE64" cmd /c exit >/dev/null 2>&1 </dev/null
   wine32_start "$dir"
-  return 0
 }
 
-# Succeeds when 32-bit Wine runs the 32-bit program EXE (given its arguments);
-# otherwise sets WINE32_WHY.
-wine32_runs() {
-  [[ -n $WINE32 ]] || return 1
-  if [[ ! -f $1 ]]; then
-    WINE32_WHY="no $1"
-    return 1
+# The 64-bit build always runs; the 32-bit one (the shipped DLL) where 32-bit Wine starts
+# its quorrel.exe and TEST (which sets WINE32_WHY when it fails), if given, passes.
+each_build() {  # run build64 build32 [test...]
+  "$1" "$WINE64" "$2" win64
+  if [[ -z $WINE32 ]]; then
+    :  # WINE32_WHY says why
+  elif [[ ! -f $3/quorrel.exe ]]; then
+    WINE32_WHY="no $3/quorrel.exe"
+  elif ! "$WINE32" "$3/quorrel.exe" --module "$3/quorrel.dll" menu actions >/dev/null 2>&1 </dev/null; then
+    WINE32_WHY="32-bit programs do not start under this Wine"
+  elif (($# < 4)) || "${@:4}"; then
+    "$1" "$WINE32" "$3" win32
+    return
   fi
-  "$WINE32" "$@" >/dev/null 2>&1 </dev/null && return 0
-  WINE32_WHY="32-bit programs do not start under this Wine"
-  return 1
+  echo "win32: not run ($WINE32_WHY)"
 }

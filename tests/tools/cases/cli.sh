@@ -1,22 +1,11 @@
 # The command line: misuse exits 2, unreadable files and modules exit 1.
-q
-q frobnicate
-q run
-q run a.qs b.qs
-q shell extra
-q inspect
-q convert only-one
-q convert a b --to xml
-q run x.qs --to csv
-q menu widgets
-q strings conditions
-q --bogus run x.qs
-q run x.qs --module
-q run missing.qs
-q run .
 echo 'E 0' >ok.qs
-q --module ./no-such-module.so run ok.qs
-q run ok.qs --module=./no-such-module.so
+for line in '' frobnicate run 'run a.qs b.qs' 'shell extra' inspect 'convert only-one' \
+  'run x.qs --to csv' 'menu widgets' 'strings conditions' \
+  '--bogus run x.qs' 'run x.qs --module' 'run missing.qs' 'run .' \
+  '--module ./no-such-module.so run ok.qs' 'run ok.qs --module=./no-such-module.so'; do
+  q $line
+done
 # Help goes to standard output with status 0, for the command and each subcommand.
 for c in "" run shell inspect convert menu strings; do
   "$QUORREL" $c --help | head -n 1

@@ -51,15 +51,9 @@ E boundaryX(
 E XOfIndex( -1
 E YOfIndex( -1
 # Resizing keeps the coordinates of complete rows: k l m / n o p / q r.
-new x=3
-A appendString "k"
-A appendString "l"
-A appendString "m"
-A appendString "n"
-A appendString "o"
-A appendString "p"
-A appendString "q"
-A appendString "r"
+new x=8
+A appendRowFromList "k,l,m,n,o,p,q,r"
+A setDimensionBoundary 1 3
 A resizeDimensionBoundary 1 5
 E size(
 E get$( 3
@@ -97,7 +91,6 @@ E dimIndexOfIndex$( 2 5
 E indexOfXY( 5 3
 # Coordinate lists split at every delimiter character, and runs of them count as one.
 new
-E indexOfDimIndex( ",,3,,,2,,"
 E indexOfDimIndex( " 3, -2"
 E indexOfDimIndex( "x,2"
 E indexOfDimIndex( ",,,"
@@ -122,15 +115,9 @@ E indexOfDimIndex( "1,2,3"
 A setArrayDimension 1
 E indexOfDimIndex( "1,2,3"
 # Resizing X to 1 keeps the first element of each complete row: k l m / n o p / q r.
-new x=3
-A appendString "k"
-A appendString "l"
-A appendString "m"
-A appendString "n"
-A appendString "o"
-A appendString "p"
-A appendString "q"
-A appendString "r"
+new x=8
+A appendRowFromList "k,l,m,n,o,p,q,r"
+A setDimensionBoundary 1 3
 A resizeDimensionBoundary 1 1
 E list$( "|"
 E boundaryX(

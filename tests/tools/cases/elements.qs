@@ -46,48 +46,6 @@ E get$( 7
 A deleteAll
 E size(
 E capacity(
-# Texts read as numbers as atol reads them in the C locale: blanks, one sign, then
-# digits up to the first other character, saturating at the int32 limits; 0xA0 is
-# not a blank.
-new dims=1
-A appendString "0042"
-E get( 0
-A appendString "  9 apples"
-E get( 1
-A appendString "-"
-E get( 2
-A appendString " -7"
-E get( 3
-A appendString "12abc"
-E get( 4
-A appendString "abc"
-E get( 5
-A appendString "+5"
-E get( 6
-A appendString "\t\n\x0b\x0c\r8"
-E get( 7
-A appendString "+-3"
-E get( 8
-A appendString "- 3"
-E get( 9
-A appendString "3 4"
-E get( 10
-A appendString "\xa05"
-E get( 11
-A appendString "2147483647"
-E get( 12
-A appendString "2147483648"
-E get( 13
-A appendString "99999999999999999999999"
-E get( 14
-A appendString "-2147483648"
-E get( 15
-A appendString "-2147483649"
-E get( 16
-A appendString "-99999999999999999999999"
-E get( 17
-A appendString "000000000000000000000000012"
-E get( 18
 # Reads outside give nothing; a set past the end fills with empty elements, and so does
 # a set of 0; negative and unreachable indexes change nothing.
 new dims=1

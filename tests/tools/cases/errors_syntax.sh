@@ -3,33 +3,13 @@
 bad '# a comment' '' 'frobnicate 1'
 bad 'a 1'
 bad '   ' 'A'
-bad 'E'
-bad 'A 79'
-bad 'A -1'
-bad 'E 60'
-bad 'A x1'
-bad 'A 9 2147483648'
-bad 'A 9 -2147483649'
-bad 'A 9 1e3'
-bad 'A 9 --1'
-bad 'A 9 +'
-bad 'A 9 99999999999999999999999'
-bad 'A 9 0x10'
-bad 'A 8 "abc'
-bad 'A 8 "abc\"'
-bad 'A 8 "a\qb"'
-bad 'A 8 "a\x4"'
-bad 'A 8 "a\xg0"'
-bad 'A 8 "a\x00b"'
-bad 'A 8 "ab"c'
-bad 'A 8 ab"c"'
-bad 'new dims=3 size=4'
-bad 'new dims'
-bad 'new =3'
-bad 'new x="4"'
-bad 'new y=4z'
-bad 'new delimiter=;'
-bad 'new delimiter="a' 
+for line in 'E' 'A 79' 'A -1' 'E 60' 'A x1' 'A 9 2147483648' 'A 9 -2147483649' 'A 9 1e3' \
+  'A 9 --1' 'A 9 +' 'A 9 99999999999999999999999' 'A 9 0x10' 'A 8 "abc' 'A 8 "abc\"' \
+  'A 8 "a\qb"' 'A 8 "a\x4"' 'A 8 "a\xg0"' 'A 8 "a\x00b"' 'A 8 "ab"c' 'A 8 ab"c"' \
+  'new dims=3 size=4' 'new dims' 'new =3' 'new x="4"' 'new y=4z' 'new delimiter=;' \
+  'new delimiter="a'; do
+  bad "$line"
+done
 bad "new delimiter=\"$(printf '%01024d' 0)\""
 printf 'A 8 "a\0b"\n' >bad.qs; q run bad.qs
 # Integers span exactly int32 with an optional sign and leading zeros; strings take

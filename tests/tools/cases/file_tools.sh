@@ -28,12 +28,11 @@ QS
 printf 'xyz' >three.bin
 q run make.qs
 # Each lossy target names what it loses; native keeps everything.
-q convert t.arr t.csv
-q convert t.arr t.ini
-q convert t.arr t.mmf --to host
-q convert t.arr copy.arr
-q convert list.arr list.ini
-q convert list.arr - --to json
+for line in 'convert t.arr t.csv' 'convert t.arr t.ini' \
+  'convert t.arr t.mmf --to host' 'convert t.arr copy.arr' 'convert list.arr list.ini' \
+  'convert list.arr - --to json'; do
+  q $line
+done
 # The input is never overwritten by mistake.
 q convert t.csv t.csv
 q convert t.csv ./t.csv --to native --force

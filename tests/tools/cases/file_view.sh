@@ -26,11 +26,9 @@ A appendString "bob"
 A appendString "95"
 A saveToFile "part.arr"
 QS
-q run make.qs
-q inspect list.arr
-q inspect part.arr
-q inspect wide.arr
-q inspect long.arr
-q inspect missing.arr
+for line in 'run make.qs' 'inspect list.arr' 'inspect part.arr' 'inspect wide.arr' \
+  'inspect long.arr' 'inspect missing.arr'; do
+  q $line
+done
 printf 'ZUB\0' >junk.bin
 q inspect junk.bin

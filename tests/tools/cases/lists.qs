@@ -43,6 +43,8 @@ E keyList$( ","
 A caseSensitive
 A sortStringsAscending
 E list$( ","
+A sortStringsDescending
+E list$( ","
 A deleteAll
 A appendValue 3
 A appendValue 1
@@ -95,13 +97,6 @@ E min(
 E sum(
 E avg(
 # Element sorts: ties, None, leading numbers and '_' against both cases.
-new dims=1
-A appendString "b"
-A appendString "A"
-A appendString "a"
-A caseSensitive
-A sortStringsDescending
-E list$( ","
 # 9, 10, "10" by text: pivot 10 (slot 1); 9 swaps with "10", then the left part
 # ["10", 10] is already in place. Keys 1, 2, 3 show which 10 is which.
 new dims=1

@@ -1,10 +1,8 @@
 # Actions by name, the list of every action and expression, one entry's description,
 # --echo and --warn-files, and the shell's own commands with piped input.
-q list
-q list setLabel
-q list 17
-q list labSum
-q list lunchbox
+for line in list 'list setLabel' 'list 17' 'list labSum' 'list lunchbox'; do
+  q $line
+done
 cat >named.qs <<'QS'
 new x=2 autoselect=1
 A setLabel "qty" 1
@@ -20,10 +18,7 @@ E size(
 QS
 q run named.qs
 q run --echo --warn-files named.qs
-printf 'A appendStrng "x"\n' | q run -
-printf 'A x1\n' | q run -
 printf 'help\nhelp E0\nA appendValue 5\nshow\nA loadFromCsv "none.csv"\nE size(\nquit\nE size(\n' |
   q shell
 printf 'A loadFromCsv "none.csv"\n' | q shell --no-warn-files
-q run --no-warn-files named.qs
 q inspect --echo ok.arr

@@ -1,6 +1,5 @@
 # Names as people type them: any case, with or without "(", with "()" or an argument
 # list in parentheses; left-out unused arguments; near misses; list searching.
-q() { "$QUORREL" "$@"; echo "status $?"; }
 cat >typed.qs <<'QS'
 new x=2 autoselect=1
 A setlabel("qty", 1)

@@ -9,17 +9,13 @@ E numberOfRows(
 E rowList$( 0
 E size(
 E getLabel$( 0
-E labelList$(
 A setLabel "name" 0
 A setLabel "score" 1
 A setLabel "level" 2
 A setLabel "nowhere" 3
 E labelList$(
 E getLabel$( 1
-E getCol( "LEVEL"
-E getCol( "nope"
 E columnList$( 1
-E columnList$( 3
 E getFromColumnRow( 1 2
 E getFromColumnRow$( 0 1
 E getFromLabelRow( "level" 2

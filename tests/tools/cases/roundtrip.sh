@@ -15,16 +15,12 @@ A setLabel "level" 2
 A setKeyStringAt "top" 0
 A saveToFile "scores.arr"
 QS
-q run make.qs
-q inspect scores.arr
-q convert scores.arr scores.csv
-q inspect scores.csv
-q convert scores.csv scores.ini
-q inspect scores.ini
-q convert scores.ini scores.mmf --to host
-q inspect scores.mmf
-q convert scores.mmf back.arr
-q inspect back.arr
+for line in 'run make.qs' 'inspect scores.arr' 'convert scores.arr scores.csv' \
+  'inspect scores.csv' 'convert scores.csv scores.ini' 'inspect scores.ini' \
+  'convert scores.ini scores.mmf --to host' 'inspect scores.mmf' \
+  'convert scores.mmf back.arr' 'inspect back.arr'; do
+  q $line
+done
 # The extension decides the format unless --to does; an unknown one needs --to.
 q convert back.arr upper.INI
 head -n 1 upper.INI | od -An -c

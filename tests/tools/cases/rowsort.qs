@@ -24,7 +24,6 @@ E columnList$( 0
 A sortRowsByLabelValueAscending "num"
 E columnList$( 0
 A sortRowsByLabelValueAscending "missing"
-A sortRowsByColumnStringAscending 2
 E columnList$( 0
 # Text order of values: 10 before 9; value order: 9 before 10.
 new x=1 autoselect=1

@@ -1,10 +1,10 @@
-# The setup record fields of new, and the instance made before any new.
-E dim(
-E boundaryX(
+# The setup record fields of new.
 new dims=3 x=4 y=5
 E dim(
 E boundaryX(
 E boundaryY(
+# The last dimension has no boundary.
+E boundary( 2
 new dims=7
 E dim(
 new dims=2 x=0
@@ -43,12 +43,9 @@ new dims=-1
 E dim(
 new dims=1
 E dim(
-# The last dimension has no boundary.
 new x=6 y=9
 E boundaryX(
 E boundaryY(
-new dims=3 x=4 y=5
-E boundary( 2
 new dims=3 x=-2 y=0
 E boundaryX(
 E boundaryY(
@@ -59,6 +56,3 @@ E findStr( "a*" 0
 new
 A appendString "Abc"
 E findStr( "a*" 0
-new case=7
-A appendString "Abc"
-E findStr( "Abc" 0

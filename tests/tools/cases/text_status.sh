@@ -1,6 +1,5 @@
 # Texts print as UTF-8 under a UTF-8 locale and escaped otherwise; cells are cut by
 # characters; a byte-order mark is read past; exit statuses for files and --strict.
-q() { "$QUORREL" "$@"; echo "status $?"; }
 printf '\xef\xbb\xbfnew dims=1\nA appendString "Zo\xc3\xab \xc3\x91and\xc3\xba \xe2\x82\xac9"\n' >t.qs
 printf 'A appendString "bad \xff\xc3\x01"\nA saveToFile "t.arr"\nE get$( 0\n' >>t.qs
 q run --echo t.qs
@@ -15,4 +14,11 @@ printf '\xff\xfeA\0' | q run -
 # A failed file action is a warning, and status 1 with --strict.
 printf 'A loadFromCsv "none.csv"\n' >f.qs
 q run --strict --no-warn-files f.qs
-q run .
+# Texts read as numbers as atol reads them in the C locale: blanks, one sign, then
+# digits up to the first other character, saturating at the int32 limits; 0xA0 is not a
+# blank. Each line: the number read, then the text.
+texts=(0042 '  9 apples' - ' -7' 12abc abc +5 '\t\n\x0b\x0c\r8' +-3 '- 3' '3 4' '\xa05'
+  2147483647 2147483648 99999999999999999999999 -2147483648 -2147483649
+  -99999999999999999999999 000000000000000000000000012)
+printf 'new dims=1\nA appendString "%s"\nE get( 0\n' "${texts[@]}" | "$QUORREL" run - |
+  paste -d' ' - <(printf '"%s"\n' "${texts[@]}")
