@@ -3,7 +3,7 @@
 mkdir adir
 q inspect adir
 q convert adir o.csv
-q convert x.arr adir
+q convert --to csv x.arr adir
 cat >make.qs <<'QS'
 new x=3
 A setLabel "name" 0
