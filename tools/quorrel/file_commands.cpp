@@ -113,6 +113,19 @@ struct Input {
   std::unique_ptr<TempFile> copy;
 };
 
+constexpr std::string_view kUtf8ByteOrderMark = "\xEF\xBB\xBF";
+
+// A text file saved with a byte-order mark: the loaders get the text after it, which
+// would otherwise begin the first cell, and the person is told.
+void readPastByteOrderMark(Input& input) {
+  auto copy = std::make_unique<TempFile>();
+  copyFileFrom(input.path, kUtf8ByteOrderMark.size(), copy->path());
+  input.copy = std::move(copy);
+  input.path = input.copy->path();
+  std::cerr << "quorrel: note: " << input.name
+            << " begins with a UTF-8 byte-order mark, read past\n";
+}
+
 Input openInput(const std::string& operand, std::optional<ArrayFormat> from) {
   Input input{operand, operand, ArrayFormat::Native, nullptr};
   if (operand == "-") {
@@ -121,16 +134,17 @@ Input openInput(const std::string& operand, std::optional<ArrayFormat> from) {
     input.path = input.copy->path();
     copyStandardInputTo(input.path);
   }
-  const std::string start = readFileStart(input.path, kRecognitionBytes);
-  if (from) {
-    input.format = *from;
-    return input;
-  }
-  const auto format = recogniseFormat(start);
+  std::string_view start;
+  const std::string head = readFileStart(input.path, kRecognitionBytes);
+  start = head;
+  const bool marked = start.starts_with(kUtf8ByteOrderMark);
+  if (marked) start.remove_prefix(kUtf8ByteOrderMark.size());
+  const auto format = from ? from : recogniseFormat(start);
   if (!format) {
     throw FileError(input.name + " is not a native array, host array, CSV, INI or JSON file");
   }
   input.format = *format;
+  if (marked && !formatInfo(input.format).binary) readPastByteOrderMark(input);
   return input;
 }
 

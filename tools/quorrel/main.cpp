@@ -101,7 +101,8 @@ Recognises a native array, host array, CSV, INI or JSON file (or reads it as
 --from says), loads it into a fresh instance and prints its format, dimensions,
 boundaries, labels and elements. FILE - reads standard input. A native file that
 ends inside an element, or has bytes after its last one, is named in a warning
-with the byte offset. Exits with status 1 when FILE cannot be read.
+with the byte offset. A text file's UTF-8 byte-order mark is read past, with a
+note. Exits with status 1 when FILE cannot be read.
 
   --rows N      show at most N table rows or list elements (default 20 and 40)
   --all         show every row, column and element

@@ -92,6 +92,19 @@ void copyStandardInputTo(const std::string& path) {
   if (!out.flush()) throw FileError("cannot copy standard input to " + path);
 }
 
+void copyFileFrom(const std::string& from, size_t skip, const std::string& to) {
+  std::ifstream in(from, std::ios::binary);
+  in.seekg(static_cast<std::streamoff>(skip));
+  std::ofstream out(to, std::ios::binary | std::ios::trunc);
+  std::string chunk(size_t{1} << 20, '\0');
+  while (in.read(chunk.data(), static_cast<std::streamsize>(chunk.size())) || in.gcount() > 0) {
+    out.write(chunk.data(), in.gcount());
+  }
+  if (!in.is_open() || in.bad() || !out.flush()) {
+    throw FileError("cannot copy " + from + " to " + to);
+  }
+}
+
 void writeStandardOutput(std::string_view bytes) {
   std::cout.flush();
   if (std::fwrite(bytes.data(), 1, bytes.size(), stdout) != bytes.size() || std::fflush(stdout)) {

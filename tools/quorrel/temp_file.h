@@ -33,6 +33,8 @@ std::string readFileStart(const std::string& path, size_t count);
 // Standard input or output as bytes, unchanged on every platform. A failed write to
 // standard output throws FileError.
 void copyStandardInputTo(const std::string& path);
+// Copies the file `from`, less its first `skip` bytes, to `to`; throws FileError.
+void copyFileFrom(const std::string& from, size_t skip, const std::string& to);
 void writeStandardOutput(std::string_view bytes);
 
 bool isTerminal(std::FILE* stream);

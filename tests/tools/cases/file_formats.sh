@@ -45,3 +45,6 @@ q convert bad.csv bad.arr --from csv-rfc4180 --lenient
 # -- ends the options.
 cp t.csv ./-x.csv
 q convert -- -x.csv x.json
+# A byte-order mark before a text file is read past, and said so.
+printf '\xef\xbb\xbfname,age\nbo,3\n' >bom.csv
+"$QUORREL" convert bom.csv - --to csv | od -An -c
