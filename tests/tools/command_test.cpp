@@ -12,10 +12,10 @@ namespace {
 
 TEST(Catalog, EveryActionNameIsUniqueAndFindsItsCode) {
   for (int32_t code = 0; code < abi::kActionCount; ++code) {
-    EXPECT_EQ(actionCodeOfName(actionEntry(code).name), code) << actionEntry(code).name;
+    EXPECT_EQ(codeOfName(true, actionEntry(code).name), code) << actionEntry(code).name;
   }
-  EXPECT_FALSE(actionCodeOfName("SetLabel"));
-  EXPECT_FALSE(actionCodeOfName(""));
+  EXPECT_FALSE(codeOfName(true, "SetLabel"));
+  EXPECT_FALSE(codeOfName(true, ""));
   EXPECT_FALSE(describe(true, abi::kActionCount));
 }
 

@@ -1,10 +1,10 @@
 #include "array_files.h"
 
-#include <cctype>
 #include <climits>
 #include <cstring>
 
 #include "array/element_array.h"
+#include "ascii_case.h"
 #include "io/host_array_file.h"
 #include "text_formats.h"
 
@@ -30,19 +30,8 @@ constexpr Extension kExtensions[] = {
     {".ini", ArrayFormat::Ini},    {".json", ArrayFormat::Json},
 };
 
-bool startsWith(std::string_view text, std::string_view prefix) {
-  return text.substr(0, prefix.size()) == prefix;
-}
-
 bool sameNoCase(std::string_view a, std::string_view b) {
-  if (a.size() != b.size()) return false;
-  for (size_t i = 0; i < a.size(); ++i) {
-    if (std::tolower(static_cast<unsigned char>(a[i])) !=
-        std::tolower(static_cast<unsigned char>(b[i]))) {
-      return false;
-    }
-  }
-  return true;
+  return lowerCase(a) == lowerCase(b);
 }
 
 // The first line that is neither blank nor a comment (//, ; or #), leading blanks
@@ -55,7 +44,7 @@ std::string_view firstMeaningfulLine(std::string_view text) {
     const size_t start = line.find_first_not_of(" \t");
     if (start == std::string_view::npos) continue;
     line.remove_prefix(start);
-    if (!startsWith(line, "//") && !startsWith(line, ";") && !startsWith(line, "#")) return line;
+    if (!line.starts_with("//") && !line.starts_with(";") && !line.starts_with("#")) return line;
   }
   return {};
 }
@@ -175,13 +164,13 @@ std::string formatNames() {
 }
 
 std::optional<ArrayFormat> recogniseFormat(std::string_view start) {
-  if (startsWith(start, kNativeFileMagic)) return ArrayFormat::Native;
-  if (startsWith(start, kHostFileHeader)) return ArrayFormat::Host;
+  if (start.starts_with(kNativeFileMagic)) return ArrayFormat::Native;
+  if (start.starts_with(kHostFileHeader)) return ArrayFormat::Host;
   if (start.find('\0') != std::string_view::npos) return std::nullopt;
   const size_t first = start.find_first_not_of(" \t\r\n");
   if (first != std::string_view::npos && start[first] == '{') return ArrayFormat::Json;
   const std::string_view line = firstMeaningfulLine(start);
-  if (startsWith(line, "[") && line.find(']') != std::string_view::npos) return ArrayFormat::Ini;
+  if (line.starts_with("[") && line.find(']') != std::string_view::npos) return ArrayFormat::Ini;
   return ArrayFormat::Csv;
 }
 

@@ -1,10 +1,10 @@
 #include "catalog.h"
 
 #include <algorithm>
-#include <cctype>
 #include <numeric>
 #include <stdexcept>
 
+#include "ascii_case.h"
 #include "host/abi.h"
 
 namespace quorrel::tool {
@@ -53,9 +53,7 @@ constexpr std::string_view kUnused = "not used";
 std::string comparable(std::string_view name) {
   if (name.ends_with("()")) name.remove_suffix(2);
   if (name.ends_with('(')) name.remove_suffix(1);
-  std::string out(name);
-  for (char& c : out) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
-  return out;
+  return lowerCase(name);
 }
 
 size_t editDistance(std::string_view a, std::string_view b) {
@@ -78,7 +76,7 @@ int32_t countOf(bool action) {
 }
 
 bool validCode(bool action, int32_t code) {
-  return code >= 0 && code < (action ? abi::kActionCount : abi::kExpressionCount);
+  return code >= 0 && code < countOf(action);
 }
 
 std::string_view nextLine(std::string_view& text) {
@@ -91,12 +89,7 @@ std::string_view nextLine(std::string_view& text) {
 
 // Whether `name` is a row's name, of either kind.
 bool isRowName(std::string_view name) {
-  for (bool action : {true, false}) {
-    for (int32_t code = 0; validCode(action, code); ++code) {
-      if (name == nameOf(action, code)) return true;
-    }
-  }
-  return false;
+  return codeOfName(true, name) || codeOfName(false, name);
 }
 
 void addLine(Description& block, std::string_view line) {
@@ -114,9 +107,9 @@ const ActionEntry& actionEntry(int32_t code) {
   return kActions[code];
 }
 
-std::optional<int32_t> actionCodeOfName(std::string_view name) {
-  for (int32_t code = 0; code < abi::kActionCount; ++code) {
-    if (name == kActions[code].name) return code;
+std::optional<int32_t> codeOfName(bool action, std::string_view name) {
+  for (int32_t code = 0; code < countOf(action); ++code) {
+    if (name == nameOf(action, code)) return code;
   }
   return std::nullopt;
 }
@@ -128,9 +121,7 @@ std::string_view nameOf(bool action, int32_t code) {
 std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed) {
   const std::string wanted = comparable(typed);
   if (wanted.empty()) return std::nullopt;
-  for (int32_t code = 0; code < countOf(action); ++code) {
-    if (nameOf(action, code) == typed) return code;
-  }
+  if (const auto exact = codeOfName(action, typed)) return exact;
   for (int32_t code = 0; code < countOf(action); ++code) {
     if (comparable(nameOf(action, code)) == wanted) return code;
   }
@@ -138,9 +129,7 @@ std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed) {
 }
 
 int32_t expressionCode(std::string_view name) {
-  for (int32_t code = 0; code < abi::kExpressionCount; ++code) {
-    if (name == kExpressionNames[code]) return code;
-  }
+  if (const auto code = codeOfName(false, name)) return *code;
   throw std::logic_error("no expression " + std::string(name));
 }
 

@@ -23,7 +23,8 @@ struct ActionEntry {
 };
 
 const ActionEntry& actionEntry(int32_t code);
-std::optional<int32_t> actionCodeOfName(std::string_view name);
+// The code of the action or expression with exactly this name.
+std::optional<int32_t> codeOfName(bool action, std::string_view name);
 
 // A declared parameter: a number (an integer, to an expression) or a text.
 struct Parameter {

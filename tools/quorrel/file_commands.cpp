@@ -37,7 +37,7 @@ void warn(const std::string& what) {
 // Runs a file action and turns a failure the module reports into a FileError.
 void fileAction(const Module& module, Instance& instance, const char* action,
                 const std::string& path, const std::string& shownPath) {
-  instance.callAction(actionCodeOfName(action).value(), {text(path)});
+  instance.callAction(codeOfName(true, action).value(), {text(path)});
   const auto status = module.fileStatus();
   if (!status || status->first == 0) return;
   const bool load = std::string_view(action).starts_with("load");

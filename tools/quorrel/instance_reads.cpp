@@ -20,7 +20,7 @@ std::optional<std::string> askText(Instance& instance, int32_t code, std::vector
 }
 
 Snapshot::Snapshot(Instance& instance) {
-  instance.callAction(actionCodeOfName(formatInfo(ArrayFormat::Native).saveAction).value(),
+  instance.callAction(codeOfName(true, formatInfo(ArrayFormat::Native).saveAction).value(),
                       {Argument(file.path())});
 }
 

@@ -1,10 +1,10 @@
 // `quorrel list`: every action and expression with its code, name, parameters and menu
 // path, or the help page's description of one of them.
-#include <cctype>
 #include <iostream>
 #include <map>
 #include <sstream>
 
+#include "ascii_case.h"
 #include "catalog.h"
 #include "commands.h"
 
@@ -105,12 +105,6 @@ std::optional<Entry> find(std::string_view what) {
     }
   }
   return std::nullopt;
-}
-
-std::string lowerCase(std::string_view text) {
-  std::string out(text);
-  for (char& c : out) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
-  return out;
 }
 
 // The catalogue line of an action or expression: "A48 setLabel(text: ..., number: ...)  [menu]".

@@ -4,6 +4,8 @@
 #include <charconv>
 #include <cstdlib>
 
+#include "ascii_case.h"
+
 namespace quorrel::tool {
 namespace {
 
@@ -131,8 +133,7 @@ size_t printableUtf8Length(std::string_view bytes) {
 }
 
 bool namesUtf8(std::string_view locale) {
-  std::string lower(locale);
-  for (char& c : lower) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+  const std::string lower = lowerCase(locale);
   return lower.find("utf-8") != std::string::npos || lower.find("utf8") != std::string::npos;
 }
 
