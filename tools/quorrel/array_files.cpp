@@ -195,9 +195,9 @@ FileExtent walkNativeFile(std::string_view bytes, NativeHeader& header,
 }
 
 std::string textOf(const NativeHalf& half) {
-  if (half.type == static_cast<uint16_t>(ElementType::Value)) return std::to_string(half.number);
-  if (half.type != static_cast<uint16_t>(ElementType::String)) return {};
-  return std::string(half.bytes.substr(0, half.bytes.find('\0')));
+  if (half.type == kValueType) return std::to_string(half.number);
+  if (half.type != kStringType) return {};
+  return std::string(textBytes(half));
 }
 
 struct NativeFileBuilder::Parts {
