@@ -48,6 +48,11 @@ extern const char* const kModuleFileName;
 // Standard streams carry bytes unchanged: no CR LF translation.
 void useBinaryStandardStreams();
 
+// Whether standard output failed because its reader went away (a pipe closed by `head`
+// or `more`), which is no fault of the program's; `error` is the errno of the failure.
+// Windows has no EPIPE for it: its C library keeps the system's own reason.
+bool standardOutputReaderGone(int error);
+
 // 32-bit Windows hosts call every routine stdcall: the routine removes its own
 // arguments. callStdcall pushes three words, calls `routine` and tells how many bytes
 // it left on the stack, which a plain C++ call would hide. Defined only where

@@ -1,5 +1,9 @@
 #include <dlfcn.h>
+#include <poll.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
+#include <cerrno>
 #include <filesystem>
 #include <utility>
 
@@ -48,5 +52,15 @@ std::string programPath() {
 }
 
 void useBinaryStandardStreams() {}
+
+bool standardOutputReaderGone(int error) {
+  if (error == EPIPE) return true;
+  // The failed write's errno may have been overwritten since: a pipe without a reader
+  // polls as an error.
+  struct stat status {};
+  if (fstat(STDOUT_FILENO, &status) != 0 || !S_ISFIFO(status.st_mode)) return false;
+  pollfd out{STDOUT_FILENO, 0, 0};
+  return poll(&out, 1, 0) == 1 && (out.revents & POLLERR) != 0;
+}
 
 }  // namespace quorrel::platform

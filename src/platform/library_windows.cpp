@@ -6,6 +6,7 @@
 #include <windows.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <cstdio>
 #include <utility>
 
@@ -64,6 +65,20 @@ std::string programPath() {
 
 void useBinaryStandardStreams() {
   for (FILE* stream : {stdin, stdout, stderr}) _setmode(_fileno(stream), _O_BINARY);
+}
+
+bool standardOutputReaderGone(int error) {
+  if (error == EPIPE) return true;
+  // The C library maps only some of the system's words for a closed pipe to EPIPE (Wine
+  // reports one it leaves as EINVAL), but it keeps the system's code of its last failure.
+  switch (_doserrno) {
+    case ERROR_BROKEN_PIPE:
+    case ERROR_NO_DATA:
+    case ERROR_PIPE_NOT_CONNECTED:
+      return GetFileType(GetStdHandle(STD_OUTPUT_HANDLE)) == FILE_TYPE_PIPE;
+    default:
+      return false;
+  }
 }
 
 }  // namespace quorrel::platform

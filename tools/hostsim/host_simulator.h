@@ -207,6 +207,7 @@ std::string defaultModulePath();
 
 // Standard input, output and error carry bytes as they are (Windows would translate
 // line ends otherwise).
+using platform::standardOutputReaderGone;
 using platform::useBinaryStandardStreams;
 
 }  // namespace quorrel::hostsim

@@ -357,7 +357,7 @@ int checkedOutput(int status) {
   std::cout.flush();
   errno = 0;
   if (std::cout.good() && std::fflush(stdout) == 0 && !std::ferror(stdout)) return status;
-  if (errno == EPIPE) return status;
+  if (quorrel::tool::standardOutputReaderGone(errno)) return status;
   std::cerr << "quorrel: cannot write standard output"
             << (errno ? std::string(": ") + std::strerror(errno) : std::string()) << '\n';
   return status == 0 ? 1 : status;

@@ -15,6 +15,7 @@ using hostsim::Module;
 using hostsim::ModuleError;
 using hostsim::ModuleLoader;
 using hostsim::Signature;
+using hostsim::standardOutputReaderGone;
 using hostsim::useBinaryStandardStreams;
 
 }  // namespace quorrel::tool

@@ -108,6 +108,9 @@ void copyFileFrom(const std::string& from, size_t skip, const std::string& to) {
 void writeStandardOutput(std::string_view bytes) {
   std::cout.flush();
   if (std::fwrite(bytes.data(), 1, bytes.size(), stdout) != bytes.size() || std::fflush(stdout)) {
+    // A reader that stopped reading wanted no more; the stream's error stays for the
+    // final check, which says nothing about a closed pipe either.
+    if (standardOutputReaderGone(errno)) return;
     throw FileError(std::string("cannot write standard output: ") + std::strerror(errno));
   }
 }
