@@ -1,7 +1,8 @@
 # The module's resources. Included from src/host/CMakeLists.txt with quorrel_module
 # defined.
 #  - tools/rcgen, built for the build machine even in a cross build, writes the resource
-#    script: resources/quorrel.rc with the menus and strings of src/host/table.inc.
+#    script build/.../generated/quorrel.rc: the template resources/quorrel.rc with the
+#    menus and strings of src/host/table.inc.
 #  - Windows: the resource compiler builds that script into the DLL (WindowsDll.cmake).
 #  - Elsewhere: rcgen turns the script into constant tables (quorrel_resource_data) that
 #    the portable menu, string and dialog services read, and the module exports those

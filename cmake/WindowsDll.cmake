@@ -3,33 +3,12 @@
 # runtimes linked statically (see toolchain-mingw-i686.cmake). Included from the root
 # CMakeLists.txt on Windows builds after src/ is added.
 
-# The module-definition file comes from the same list as the Linux version script.
-# On 32-bit Windows __stdcall symbols carry an @bytes decoration; the .def names them
-# decorated and --kill-at strips the decoration from the exported names. 64-bit Windows
-# has one calling convention and no decoration.
-set(quorrel_entry_points ${CMAKE_SOURCE_DIR}/src/host/entry_points.txt)
-set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${quorrel_entry_points})
-file(STRINGS ${quorrel_entry_points} quorrel_def_lines REGEX "^[A-Za-z]")
-set(quorrel_def_text "LIBRARY quorrel.dll\nEXPORTS\n")
-foreach(line IN LISTS quorrel_def_lines)
-  if(NOT line MATCHES "^([A-Za-z]+)[ \t]+([0-9]+)[ \t]+([0-9]+)")
-    message(FATAL_ERROR "entry_points.txt: cannot read line '${line}'")
-  endif()
-  if(CMAKE_SIZEOF_VOID_P EQUAL 4)
-    string(APPEND quorrel_def_text "  ${CMAKE_MATCH_1}@${CMAKE_MATCH_3} @${CMAKE_MATCH_2}\n")
-  else()
-    string(APPEND quorrel_def_text "  ${CMAKE_MATCH_1} @${CMAKE_MATCH_2}\n")
-  endif()
-endforeach()
-set(quorrel_def ${CMAKE_BINARY_DIR}/quorrel.def)
-file(CONFIGURE OUTPUT ${quorrel_def} CONTENT "${quorrel_def_text}" @ONLY)
-
+# The module-definition file and --kill-at come from src/host/exports.cmake, with the
+# Linux version script.
 set_target_properties(quorrel_module PROPERTIES
   PREFIX ""
   OUTPUT_NAME quorrel
   RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR})
-target_sources(quorrel_module PRIVATE ${quorrel_def})
-target_link_options(quorrel_module PRIVATE "LINKER:--kill-at")
 
 # The resource script (menus, string tables, the setup dialog, bitmaps, data) written
 # from resources/quorrel.rc and the table (cmake/ModuleResources.cmake); the resource

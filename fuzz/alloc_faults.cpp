@@ -22,8 +22,8 @@
 #include <string>
 #include <vector>
 
-#include "array/allocation.h"
 #include "fuzz_host.h"
+#include "platform/allocation.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size);
 

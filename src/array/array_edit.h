@@ -1,6 +1,8 @@
 // Makes an edit of an array all or nothing. The only failure the core knows is memory
-// running out part-way, and the array must then be left as it was; so every edit of
-// several steps runs under an ArrayEdit. The guard records what the edit can change,
+// running out part-way, and the array must then be left as it was. An edit that can
+// take all its memory before its first change needs no guard (resizeBoundary, the
+// sorts); one that grows as it goes (loads, appends, row inserts) runs under an
+// ArrayEdit. The guard records what the edit can change,
 // the edit works on target(), and commit() keeps the result; a guard that goes without
 // commit() puts the array back. It records only what its kind of edit needs:
 //  - Replacing: the edit fills an empty copy of the array (same settings, dimensions,

@@ -1,6 +1,6 @@
 #include "array/element.h"
 
-#include "array/allocation.h"
+#include "platform/allocation.h"
 
 #include <cstdlib>
 #include <new>

@@ -160,8 +160,10 @@ int32_t ElementArray::stride(int32_t d) const {
 
 // Resizing keeps every element of every complete old block at its coordinates: each
 // complete block of dimension d gains or loses `count` empty positions at its end. The
-// result is built in one pass; the capacity is replayed insert by insert (or delete by
-// delete) because the growth policy makes it depend on the whole sequence.
+// result is built in one pass, in a store and row states sized before the first element
+// moves, so a failed allocation changes nothing and no ArrayEdit is needed; the
+// capacity is replayed insert by insert (or delete by delete) because the growth policy
+// makes it depend on the whole sequence.
 void ElementArray::resizeBoundary(int32_t d, int32_t n) {
   if (n < 1 || d < 0 || d >= dimensions_) return;
   const int32_t old = boundaries_[d];

@@ -1,6 +1,6 @@
 #include "array/element_store.h"
 
-#include "array/allocation.h"
+#include "platform/allocation.h"
 
 #include <algorithm>
 #include <cstdlib>

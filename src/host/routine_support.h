@@ -48,15 +48,19 @@ struct Signature<Answer, First, Param::None, Param::None> {
   using Type = Answer(First);
 };
 
-// --- Actions -------------------------------------------------------------------------
+// A routine's parameter from the host word that carries it, the one decoding for both
+// kinds of routine: an action receives the words as arguments, an expression fetches
+// them. A number is the word's low 32 bits; a text is the word's address.
 template <Param P>
-ParamOf<P> actionParam(HostWord slot) {
+ParamOf<P> paramFrom(HostWord word) {
   if constexpr (P == Param::Text) {
-    return reinterpret_cast<const char*>(slot);
+    return reinterpret_cast<const char*>(word);
   } else {
-    return static_cast<int32_t>(slot);
+    return static_cast<int32_t>(word);
   }
 }
+
+// --- Actions -------------------------------------------------------------------------
 
 // Runs op on the instance's array; no array means nothing to do. Always answers 0.
 template <typename Op>
@@ -85,9 +89,9 @@ auto invokeAction(const Instance& instance, HostWord param1, HostWord param2) {
   if constexpr (P1 == Param::None) {
     return Routine(instance);
   } else if constexpr (P2 == Param::None) {
-    return Routine(instance, actionParam<P1>(param1));
+    return Routine(instance, paramFrom<P1>(param1));
   } else {
-    return Routine(instance, actionParam<P1>(param1), actionParam<P2>(param2));
+    return Routine(instance, paramFrom<P1>(param1), paramFrom<P2>(param2));
   }
 }
 
@@ -111,29 +115,19 @@ int16_t QUORREL_CALL callAction(void* runRecord, [[maybe_unused]] HostWord param
 }
 
 // --- Expression parameters -----------------------------------------------------------
-// Declared parameter kinds of an expression, fetched in order.
-struct Int {
-  using Type = int32_t;
-  static constexpr int32_t kFlag = abi::kFetchInteger;
-  static Type from(HostWord word) { return static_cast<int32_t>(word); }
-};
-struct Text {
-  using Type = const char*;
-  static constexpr int32_t kFlag = abi::kFetchText;
-  static Type from(HostWord word) { return reinterpret_cast<const char*>(word); }
-};
-
+// Fetches an expression's declared parameters in order, telling the host each one's type.
 class ParameterFetcher {
  public:
   ParameterFetcher(void* runRecord, HostWord token) : runRecord_(runRecord), token_(token) {}
 
-  template <typename Kind>
-  typename Kind::Type fetch() {
+  template <Param P>
+  ParamOf<P> fetch() {
     abi::FetchParameterService service =
         fetched_ == 0 ? fetchFirstParameter(runRecord_) : fetchNextParameter(runRecord_);
     ++fetched_;
+    constexpr int32_t flag = P == Param::Text ? abi::kFetchText : abi::kFetchInteger;
     // A host without the service hands over 0 (a null text).
-    return Kind::from(service == nullptr ? 0 : service(runRecord_, Kind::kFlag, token_));
+    return paramFrom<P>(service == nullptr ? 0 : service(runRecord_, flag, token_));
   }
 
  private:
@@ -189,13 +183,13 @@ inline HostWord resultWord(void* runRecord, const Result& result) {
 
 // Fetches the declared parameters in order, then runs op(array, parameters...) and
 // hands its result over. Without an array every expression answers 0.
-template <typename... Kinds, typename Op>
+template <Param... Params, typename Op>
 HostWord runExpression(void* runRecord, HostWord token, Op&& op) noexcept {
   if (runRecord == nullptr) return 0;
   try {
     ParameterFetcher fetcher(runRecord, token);
     // Braced initialisation fetches left to right.
-    std::tuple<typename Kinds::Type...> params{fetcher.fetch<Kinds>()...};
+    std::tuple<ParamOf<Params>...> params{fetcher.fetch<Params>()...};
     ElementArray* array = elementArrayOf(runRecord);
     if (array == nullptr) return 0;
     return std::apply([&](auto... values) { return resultWord(runRecord, op(*array, values...)); },
@@ -205,9 +199,6 @@ HostWord runExpression(void* runRecord, HostWord token, Op&& op) noexcept {
   }
 }
 
-template <Param P>
-using KindOf = std::conditional_t<P == Param::Text, Text, Int>;
-
 // The routine the host calls for an expression: its parameters fetched as declared, then
 // the expression's routine.
 template <auto Routine, Param P1, Param P2>
@@ -215,9 +206,9 @@ HostWord QUORREL_CALL callExpression(void* runRecord, HostWord parameterToken) n
   if constexpr (P1 == Param::None) {
     return runExpression<>(runRecord, parameterToken, Routine);
   } else if constexpr (P2 == Param::None) {
-    return runExpression<KindOf<P1>>(runRecord, parameterToken, Routine);
+    return runExpression<P1>(runRecord, parameterToken, Routine);
   } else {
-    return runExpression<KindOf<P1>, KindOf<P2>>(runRecord, parameterToken, Routine);
+    return runExpression<P1, P2>(runRecord, parameterToken, Routine);
   }
 }
 

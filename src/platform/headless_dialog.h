@@ -7,11 +7,11 @@
 // GetDlgItemTextA, IsWindowEnabled(GetDlgItem(...))). When the script returns and
 // the dialog is still open, Escape is pressed; a dialog that still does not end is
 // given up with -1. Without a script the dialog is therefore cancelled at once.
+// Implemented by the portable stand-ins (portable_dialog.cpp), which only builds
+// without Windows have.
 #pragma once
 
 #include "platform/windows_services.h"
-
-#ifndef _WIN32
 
 extern "C" {
 
@@ -38,5 +38,3 @@ QUORREL_PLATFORM_API BOOL QuorrelDialogKey(HWND dialog, UINT key);
 QUORREL_PLATFORM_API BOOL QuorrelDialogIsOpen(HWND dialog);
 
 }  // extern "C"
-
-#endif

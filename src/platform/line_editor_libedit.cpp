@@ -13,6 +13,7 @@
 #include <utility>
 
 #include "platform/line_editor.h"
+#include "platform/terminal.h"
 
 namespace quorrel {
 namespace {
@@ -97,7 +98,7 @@ LineEditor::LineEditor(std::string prompt, const std::string& historyFile, Candi
     : state_(std::make_unique<State>()) {
   state_->prompt = std::move(prompt);
   state_->candidates = std::move(candidates);
-  state_->interactive = isatty(STDIN_FILENO) != 0;
+  state_->interactive = platform::isTerminal(stdin);
   if (!state_->interactive) return;
   // Set before the first call into the library (reading the history is one), which
   // initialises it: an editor that caught signals itself would redraw the abandoned

@@ -1,9 +1,9 @@
 // Lines read plainly, where the line-editing library is missing (or on Windows).
-#include <unistd.h>
-
+#include <cstdio>
 #include <iostream>
 
 #include "platform/line_editor.h"
+#include "platform/terminal.h"
 
 namespace quorrel {
 
@@ -13,7 +13,7 @@ struct LineEditor::State {
 };
 
 LineEditor::LineEditor(std::string prompt, const std::string&, Candidates)
-    : state_(std::make_unique<State>(State{std::move(prompt), isatty(STDIN_FILENO) != 0})) {}
+    : state_(std::make_unique<State>(State{std::move(prompt), platform::isTerminal(stdin)})) {}
 
 LineEditor::~LineEditor() = default;
 

@@ -3,8 +3,6 @@
 // (headless_dialog.h). Controls keep their texts, check marks and enabled flags;
 // automatic radio buttons uncheck the others of their group; digits-only fields
 // refuse other characters; Enter presses the default button, Escape Cancel.
-#ifndef _WIN32
-
 #include <algorithm>
 #include <charconv>
 #include <cstdio>
@@ -391,5 +389,3 @@ BOOL QuorrelDialogIsOpen(HWND dialog) {
 }
 
 }  // extern "C"
-
-#endif

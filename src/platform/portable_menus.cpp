@@ -1,8 +1,6 @@
 // Menus where Windows has none: loaded from the generated resource tables, built
 // with CreatePopupMenu/AppendMenuA, read by position or by command id, released
 // with DestroyMenu (which takes the submenus along, as on Windows).
-#ifndef _WIN32
-
 #include <algorithm>
 #include <cstring>
 #include <memory>
@@ -235,5 +233,3 @@ BOOL AppendMenuA(HMENU handle, UINT flags, UINT_PTR idOrPopup, LPCSTR text) {
 }
 
 }  // extern "C"
-
-#endif

@@ -1,11 +1,9 @@
 // String resources and local allocations where Windows has none.
-#ifndef _WIN32
-
 #include <algorithm>
 #include <cstdlib>
 #include <cstring>
 
-#include "array/allocation.h"
+#include "platform/allocation.h"
 #include "platform/resource_data.h"
 #include "platform/windows_services.h"
 
@@ -47,5 +45,3 @@ HLOCAL LocalFree(HLOCAL memory) {
 }
 
 }  // extern "C"
-
-#endif

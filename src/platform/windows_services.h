@@ -3,7 +3,8 @@
 //
 // On Windows this is <windows.h>. Elsewhere the module brings its own small
 // implementation of the same functions, with the same names, arguments and
-// results, over the resources of resources/quorrel.rc; the module exports them so
+// results, over the resources of the module's resource script (generated/quorrel.rc,
+// which tools/rcgen writes from resources/quorrel.rc); the module exports them so
 // that a host program (the quorrel command, the tests) can walk the menus the
 // module hands out and drive its dialog (see headless_dialog.h).
 #pragma once

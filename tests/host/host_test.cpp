@@ -10,11 +10,9 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstring>
-#include <fstream>
 #include <functional>
 #include <memory>
 #include <set>
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -61,17 +59,22 @@ std::vector<Arg> argsFor(const quorrel::hostsim::Signature& signature, int32_t n
 }
 
 TEST(ModuleTest, ExportsEveryListedEntryPointWithADistinctOrdinal) {
-  std::ifstream file(QUORREL_ENTRY_POINTS_FILE);
+  struct Row {
+    const char* name;
+    int ordinal;
+    std::string side;
+  };
+  const Row rows[] = {
+#define QUORREL_ENTRY_POINT(name, ordinal, bytes, side, Type) {#name, ordinal, #side},
+#include "host/entry_points.inc"
+#undef QUORREL_ENTRY_POINT
+  };
   std::set<int> ordinals;
   std::set<std::string> hostNames;
-  for (std::string line; std::getline(file, line);) {
-    if (line.empty() || line[0] == '#') continue;
-    std::string name, side;
-    int ordinal = 0, argumentBytes = 0;
-    std::istringstream(line) >> name >> ordinal >> argumentBytes >> side;
-    EXPECT_TRUE(ordinals.insert(ordinal).second) << name;
-    EXPECT_NE(symbol(name.c_str()), nullptr) << name;
-    if (side != "tool") hostNames.insert(name);
+  for (const Row& row : rows) {
+    EXPECT_TRUE(ordinals.insert(row.ordinal).second) << row.name;
+    EXPECT_NE(symbol(row.name), nullptr) << row.name;
+    if (row.side != "tool") hostNames.insert(row.name);
   }
   // The host's 30, and the one the quorrel command asks for file statuses.
   EXPECT_EQ(hostNames.size(), 30u);

@@ -1,19 +1,20 @@
 #!/usr/bin/env bash
-# Every action and every expression of the table must be called by name at least once
-# across the cases (lines "A NAME ..." and "E NAME ..."; an expression's "(" may be left
-# out). Calls by code do not count: the cases are read by people, who read names.
-#   check_coverage.sh CASES TABLE
+# Every action and every expression the command lists (quorrel list) must be called by
+# name at least once across the cases (lines "A NAME ..." and "E NAME ..."; an
+# expression's "(" may be left out). Calls by code do not count: the cases are read by
+# people, who read names.
+#   check_coverage.sh CASES QUORREL
 set -u
-cases=$1 table=$2
+cases=$1 quorrel=$2
 declare -A seen
 while read -r verb name; do
   seen[$verb${name%(}]=1
 done < <(cat "$cases"/*.qs "$cases"/*.sh 2>/dev/null |
   sed -nE 's/^[[:space:]]*([AE])[[:space:]]+([A-Za-z][A-Za-z0-9$]*\(?)([[:space:]].*)?$/\1 \2/p')
 
-rows=$(sed -nE -e 's/^ACTION\([0-9]+, ([A-Za-z0-9]+),.*/A \1/p' \
-  -e 's/^EXPRESSION\([0-9]+, "([^"(]+)\(",.*/E \1/p' "$table")
-[[ -n $rows ]] || { echo "no rows in $table"; exit 1; }
+# The listing's entries: "A12 name(parameters)  [menu]" and "E3 name$(parameters) ...".
+rows=$("$quorrel" list | sed -nE 's/^([AE])[0-9]+ ([A-Za-z][A-Za-z0-9$]*)\(.*/\1 \2/p')
+[[ -n $rows ]] || { echo "quorrel list listed nothing"; exit 1; }
 missing=()
 while read -r verb name; do
   [[ -n ${seen[$verb$name]:-} ]] || missing+=("$verb $name")

@@ -1,9 +1,9 @@
 #!/usr/bin/env bash
 # Reads the built Windows DLL back with binutils and checks it against its sources:
-#   check_dll.sh DLL ENTRY_POINTS_TXT RESOURCE_SCRIPT RESOURCE_DIR OBJDUMP WINDRES
+#   check_dll.sh DLL ENTRY_POINTS_INC RESOURCE_SCRIPT RESOURCE_DIR OBJDUMP WINDRES
 # (RESOURCE_DIR holds the pictures the script names)
 # - a 32-bit x86 DLL (PE32) named quorrel.dll;
-# - exports: exactly the entry points of entry_points.txt, each by its plain name at its
+# - exports: exactly the entry points of entry_points.inc, each by its plain name at its
 #   ordinal, none by ordinal alone, names in byte order (GetProcAddress bisects them);
 # - imports: system DLLs only (the runtimes are linked in statically);
 # - resources: what windres reads out of the DLL is what it reads out of the script.
@@ -43,9 +43,9 @@ awk '
   slots && /^$/ { slots = 0 }
   slots && /Export RVA/ { ++used }
   END { print used > "/dev/stderr" }' "$work/headers" >"$work/exports" 2>"$work/slots"
-awk '/^[A-Za-z]/ { print $1, $2 }' "$entry_points" | LC_ALL=C sort >"$work/expected"
+sed -nE 's/^QUORREL_ENTRY_POINT\(([A-Za-z]+), ([0-9]+),.*/\1 \2/p' "$entry_points" | LC_ALL=C sort >"$work/expected"
 LC_ALL=C sort "$work/exports" >"$work/exports.sorted"
-check "exports equal entry_points.txt" diff "$work/expected" "$work/exports.sorted"
+check "exports equal entry_points.inc" diff "$work/expected" "$work/exports.sorted"
 check "nothing exported by ordinal alone" test "$(cat "$work/slots")" -eq "$(wc -l <"$work/expected")"
 cut -d' ' -f1 "$work/exports" >"$work/names"
 check "export names in byte order" env LC_ALL=C sort -c "$work/names"

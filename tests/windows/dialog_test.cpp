@@ -82,8 +82,8 @@ class WindowsDriver : public Driver {
       const char* name;
       WORD ordinal;
     } kOrdinals[] = {
-#define QUORREL_ENTRY_POINT(name, ordinal) {#name, ordinal},
-#include "entry_point_ordinals.inc"
+#define QUORREL_ENTRY_POINT(name, ordinal, ...) {#name, ordinal},
+#include "host/entry_points.inc"
 #undef QUORREL_ENTRY_POINT
     };
     for (const auto& entry : kOrdinals) {

@@ -82,14 +82,14 @@ Module::Module(std::string path, platform::Library library)
 Module::~Module() = default;
 
 namespace {
-// Every entry point with its ordinal, from entry_points.txt.
+// Every entry point with its ordinal.
 struct EntryOrdinal {
   const char* name;
   uint16_t ordinal;
 };
 constexpr EntryOrdinal kEntryOrdinals[] = {
-#define QUORREL_ENTRY_POINT(name, ordinal) {#name, ordinal},
-#include "entry_point_ordinals.inc"
+#define QUORREL_ENTRY_POINT(name, ordinal, ...) {#name, ordinal},
+#include "host/entry_points.inc"
 #undef QUORREL_ENTRY_POINT
 };
 }  // namespace

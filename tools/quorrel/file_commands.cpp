@@ -20,6 +20,7 @@
 #include "instance_reads.h"
 #include "io/file_handle.h"
 #include "io/host_array_file.h"
+#include "platform/terminal.h"
 #include "temp_file.h"
 #include "text_formats.h"
 
@@ -51,7 +52,7 @@ void fileAction(const Module& module, Instance& instance, const char* action,
 class ProgressNote {
  public:
   explicit ProgressNote(std::string what) : what_(std::move(what)) {
-    if (!isTerminal(stderr)) return;
+    if (!platform::isTerminal(stderr)) return;
     ticker_ = std::thread([this] { tick(); });
   }
   ~ProgressNote() { stop(); }
@@ -504,7 +505,7 @@ ArrayFormat checkedTarget(const ConvertOptions& options) {
     throw FileError("cannot write " + out + ": it is a directory");
   }
   const ArrayFormat target = options.to ? *options.to : formatOfExtension(out).value();
-  if (toStdout && formatInfo(target).binary && !options.force && isTerminal(stdout)) {
+  if (toStdout && formatInfo(target).binary && !options.force && platform::isTerminal(stdout)) {
     throw UsageError(std::string("convert will not write a ") + formatInfo(target).description +
                      " to a terminal; redirect it or add --force");
   }

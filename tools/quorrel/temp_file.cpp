@@ -9,12 +9,6 @@
 #include <iterator>
 #include <random>
 
-#ifdef _WIN32
-#include <io.h>
-#else
-#include <unistd.h>
-#endif
-
 #include "commands.h"
 
 namespace quorrel::tool {
@@ -113,14 +107,6 @@ void writeStandardOutput(std::string_view bytes) {
     if (standardOutputReaderGone(errno)) return;
     throw FileError(std::string("cannot write standard output: ") + std::strerror(errno));
   }
-}
-
-bool isTerminal(std::FILE* stream) {
-#ifdef _WIN32
-  return _isatty(_fileno(stream)) != 0;
-#else
-  return isatty(fileno(stream)) != 0;
-#endif
 }
 
 }  // namespace quorrel::tool

@@ -3,7 +3,6 @@
 // pass through one of these.
 #pragma once
 
-#include <cstdio>
 #include <string>
 #include <string_view>
 
@@ -36,7 +35,5 @@ void copyStandardInputTo(const std::string& path);
 // Copies the file `from`, less its first `skip` bytes, to `to`; throws FileError.
 void copyFileFrom(const std::string& from, size_t skip, const std::string& to);
 void writeStandardOutput(std::string_view bytes);
-
-bool isTerminal(std::FILE* stream);
 
 }  // namespace quorrel::tool
