@@ -10,7 +10,6 @@
 #include <utility>
 #include <vector>
 
-#include "array/array_edit.h"
 #include "array/element_array.h"
 #include "recordset/table.h"
 
@@ -65,16 +64,6 @@ class AppendRun {
   RecordSlab slab_;
   std::vector<Element> pending_;
 };
-
-// Runs a load all or nothing: a replacing load fills an empty copy of the array that
-// is moved in once complete; an appending load that fails part-way is undone. An
-// exception (memory ran out) thus leaves the array as it was, and is passed on.
-template <typename Load>
-void loadAllOrNothing(ElementArray& array, bool replace, Load&& load) {
-  ArrayEdit edit(array, replace ? ArrayEdit::Replacing : ArrayEdit::Growing);
-  load(edit.target());
-  edit.commit();
-}
 
 // setLabel, which leaves the labels of a table past kMaxLabelColumns alone (only a
 // damaged file asks for one that wide).
