@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <cstring>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -63,6 +64,27 @@ class AppendRun {
   ElementArray& array_;
   RecordSlab slab_;
   std::vector<Element> pending_;
+};
+
+// What the binary loaders' sinks share: the array they fill, whether the load replaces
+// it, and the run of elements it appends.
+struct BinaryLoad {
+  BinaryLoad(ElementArray& target, bool replacing)
+      : array(target), replace(replacing), run(target) {}
+
+  ElementArray& array;
+  bool replace;
+  AppendRun run;
+  bool borrowed = false;  // an element points into the file's bytes
+  bool headerSeen = false;
+
+  // Puts the last elements in, keeping the file's bytes when an element borrows them; a
+  // replacing load of a file without a usable header leaves 0 dimensions.
+  void finish(const std::shared_ptr<const void>& bytes) {
+    if (borrowed) array.keepBlock(bytes);
+    run.flush();
+    if (replace && !headerSeen) array.setDimensions(0);
+  }
 };
 
 // setLabel, which leaves the labels of a table past kMaxLabelColumns alone (only a

@@ -144,14 +144,8 @@ FileExtent parseHost(char* data, std::size_t size, Sink& sink) {
 }
 
 // Texts are borrowed from the file's bytes (which the array then keeps).
-struct LoadSink {
-  LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing), run(target) {}
-
-  ElementArray& array;
-  bool replace;
-  io_detail::AppendRun run;
-  bool borrowed = false;
-  bool headerSeen = false;
+struct LoadSink : io_detail::BinaryLoad {
+  using BinaryLoad::BinaryLoad;
 
   void header(int32_t x, int32_t y, int32_t) {
     headerSeen = true;
@@ -220,9 +214,7 @@ FileStatus loadHostArrayFile(ElementArray& array, const char* path, LoadMode mod
                   [&](ElementArray& target, const std::shared_ptr<ByteBuffer>& bytes) {
                     LoadSink sink{target, replace};
                     parseHost(bytes->data(), bytes->size(), sink);
-                    if (sink.borrowed) target.keepBlock(bytes);
-                    sink.run.flush();
-                    if (replace && !sink.headerSeen) target.setDimensions(0);
+                    sink.finish(bytes);
                   });
 }
 

@@ -195,14 +195,9 @@ ElementValue operandOf(uint16_t type, int32_t size, int32_t number, const char* 
 // file's records; labels wait until every element is in place. Every loaded element
 // has a key, even if only a None one. A text with its terminator in the file and no
 // key of its own is borrowed from the file's bytes (which the array then keeps).
-struct LoadSink {
-  LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing), run(target) {}
+struct LoadSink : io_detail::BinaryLoad {
+  using BinaryLoad::BinaryLoad;
 
-  ElementArray& array;
-  bool replace;
-  io_detail::AppendRun run;
-  bool borrowed = false;
-  bool headerSeen = false;
   int32_t labelIndex = 0;
   std::vector<std::pair<int32_t, std::string>> pendingLabels;
   std::vector<std::unique_ptr<char[]>> filled;
@@ -312,9 +307,7 @@ FileStatus loadNativeFile(ElementArray& array, const char* path, LoadMode mode) 
                   [&](ElementArray& target, const std::shared_ptr<ByteBuffer>& bytes) {
                     LoadSink sink{target, replace};
                     parseNative(bytes->view(), sink);
-                    if (sink.borrowed) target.keepBlock(bytes);
-                    sink.run.flush();
-                    if (replace && !sink.headerSeen) target.setDimensions(0);
+                    sink.finish(bytes);
                     for (const auto& [column, text] : sink.pendingLabels) {
                       io_detail::applyLabel(target, text, column);
                     }
