@@ -32,8 +32,7 @@ namespace {
 using quorrel::ElementArray;
 using quorrel::fuzz::CallObserver;
 
-// Everything about the array that an operation may change, as one text. fileMode is
-// left out: a save records its mode before it starts.
+// Everything about the array that an operation may change, as one text.
 std::string describe(const ElementArray& a) {
   std::string s = std::to_string(a.size()) + "/" + std::to_string(a.capacity()) + "/" +
                   std::to_string(a.dimensions()) + "/";

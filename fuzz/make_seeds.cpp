@@ -46,7 +46,7 @@ ElementArray cube() {
 // The array_file target reads its first byte as the format: 0 native, 1 host array,
 // 2 CSV, 3 INI. Saves go to a scratch file that is copied in behind that byte.
 void addArraySeed(const std::filesystem::path& dir, const char* name, char format,
-                  quorrel::FileStatus (*save)(ElementArray&, const char*, quorrel::FileMode),
+                  quorrel::FileStatus (*save)(const ElementArray&, const char*, quorrel::FileMode),
                   ElementArray& array) {
   const std::filesystem::path scratch = dir / ".scratch";
   save(array, scratch.c_str(), quorrel::FileModeTruncate);

@@ -12,14 +12,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static const std::string copy = quorrel::fuzzTempPath("element-copy");
   quorrel::writeFuzzFile(path, data, size);
 
-  quorrel::FileStatus status;
-  auto block = quorrel::readWholeFile(path.c_str(), status);
-  if (!block || block->size() != size) __builtin_trap();
-  if (size > 0 && std::memcmp(block->data(), data, size) != 0) __builtin_trap();
+  const quorrel::FileRead block = quorrel::readFile(path.c_str());
+  if (!block.hasContents() || block.bytes.size() != size) __builtin_trap();
+  if (size > 0 && std::memcmp(block.bytes.data(), data, size) != 0) __builtin_trap();
 
   quorrel::ElementArray array;
   quorrel::fillSample(array);
-  const quorrel::ByteBlock bytes{block->data(), static_cast<int32_t>(block->size())};
+  const quorrel::ByteBlock bytes{block.bytes.data(), static_cast<int32_t>(block.bytes.size())};
   array.setFile(bytes, 1);
   array.insertFile(bytes, 0);
   array.appendFile(bytes);
@@ -27,9 +26,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
 
   // A file element writes back exactly the bytes it was read from.
   quorrel::saveElementToFile(array, array.size() - 1, copy.c_str(), quorrel::FileModeTruncate);
-  auto back = quorrel::readWholeFile(copy.c_str(), status);
-  if (!back || back->size() != size) __builtin_trap();
-  if (size > 0 && std::memcmp(back->data(), data, size) != 0) __builtin_trap();
+  const quorrel::FileRead back = quorrel::readFile(copy.c_str());
+  if (!back.hasContents() || back.bytes.size() != size) __builtin_trap();
+  if (size > 0 && std::memcmp(back.bytes.data(), data, size) != 0) __builtin_trap();
   quorrel::saveElementToFile(array, 0, copy.c_str(), quorrel::FileModeAppend);
   return 0;
 }

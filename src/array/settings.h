@@ -10,7 +10,7 @@ namespace quorrel {
 enum CaseMode : int16_t { CaseInsensitive = 0, CaseSensitive = 1 };
 // Whether a probe text is a pattern ('*' any run, '?' one character) or literal.
 enum SearchMode : int16_t { SearchLiteral = 0, SearchWildcard = 1 };
-// How the last save opened its file: create or truncate, or append to it.
+// How a save opens its file: create or truncate, or append to it.
 enum FileMode : int16_t { FileModeTruncate = 0, FileModeAppend = 1 };
 // OR: a where-test adds the rows that pass; AND: it removes the rows that fail.
 enum SelectionMode : int32_t { SelectAnd = 0, SelectOr = 1 };
@@ -18,7 +18,6 @@ enum SelectionMode : int32_t { SelectAnd = 0, SelectOr = 1 };
 struct ArraySettings {
   CaseMode caseMode = CaseInsensitive;
   SearchMode searchMode = SearchLiteral;
-  FileMode fileMode = FileModeTruncate;
   SelectionMode selectionMode = SelectOr;
   // Rows that a growth adds to the table start selected.
   bool autoSelectNewRows = false;

@@ -1,7 +1,5 @@
 // Routines of the file actions: whole-array saves and loads, element files, and
 // file contents taken into elements.
-#include <optional>
-
 #include "host/routines.h"
 #include "io/csv_file.h"
 #include "io/element_file.h"
@@ -12,14 +10,14 @@
 namespace quorrel::host {
 namespace {
 
-// Hands the whole file to use as a block; a file that cannot be opened leaves the
-// array untouched. The temporary bytes are released on return.
+// Hands the whole file to use as a block; a file that cannot be opened, or that memory
+// cannot hold, leaves the array untouched. The temporary bytes are released on return.
 template <typename Use>
 FileStatus withFileContents(const char* path, Use&& use) {
-  FileStatus status;
-  std::optional<ByteBuffer> contents = readWholeFile(path, status);
-  if (contents) use(ByteBlock{contents->data(), static_cast<int32_t>(contents->size())});
-  return status;
+  const FileRead read = readFile(path);
+  if (read.hasContents())
+    use(ByteBlock{read.bytes.data(), static_cast<int32_t>(read.bytes.size())});
+  return read.status;
 }
 
 }  // namespace

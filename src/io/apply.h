@@ -5,12 +5,12 @@
 #include <algorithm>
 #include <cstdint>
 #include <cstring>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <utility>
 #include <vector>
 
-#include "array/array_edit.h"
 #include "array/element_array.h"
 #include "recordset/table.h"
 
@@ -66,15 +66,26 @@ class AppendRun {
   std::vector<Element> pending_;
 };
 
-// Runs a load all or nothing: a replacing load fills an empty copy of the array that
-// is moved in once complete; an appending load that fails part-way is undone. An
-// exception (memory ran out) thus leaves the array as it was, and is passed on.
-template <typename Load>
-void loadAllOrNothing(ElementArray& array, bool replace, Load&& load) {
-  ArrayEdit edit(array, replace ? ArrayEdit::Replacing : ArrayEdit::Growing);
-  load(edit.target());
-  edit.commit();
-}
+// What the binary loaders' sinks share: the array they fill, whether the load replaces
+// it, and the run of elements it appends.
+struct BinaryLoad {
+  BinaryLoad(ElementArray& target, bool replacing)
+      : array(target), replace(replacing), run(target) {}
+
+  ElementArray& array;
+  bool replace;
+  AppendRun run;
+  bool borrowed = false;  // an element points into the file's bytes
+  bool headerSeen = false;
+
+  // Puts the last elements in, keeping the file's bytes when an element borrows them; a
+  // replacing load of a file without a usable header leaves 0 dimensions.
+  void finish(const std::shared_ptr<const void>& bytes) {
+    if (borrowed) array.keepBlock(bytes);
+    run.flush();
+    if (replace && !headerSeen) array.setDimensions(0);
+  }
+};
 
 // setLabel, which leaves the labels of a table past kMaxLabelColumns alone (only a
 // damaged file asks for one that wide).

@@ -4,10 +4,8 @@
 #include <bit>
 #include <cstring>
 #include <memory>
-#include <new>
 #include <span>
 #include <string_view>
-#include <utility>
 
 #include "io/apply.h"
 #include "io/parsing.h"
@@ -140,32 +138,19 @@ void appendCells(ElementArray& target, std::shared_ptr<ByteBuffer> text, CsvShap
 
 }  // namespace
 
-std::optional<ByteBuffer> readTextFile(const char* path, FileStatus& status) {
-  std::optional<ByteBuffer> text = readFileBytes(path, 1, status);
-  if (!text) return std::nullopt;
-  if (!text->reserve(text->size() + 1)) throw std::bad_alloc();
-  text->data()[text->size()] = '\0';
-  text->setSize(std::strlen(text->data()));
-  return text;
-}
-
-FileStatus saveCsvFile(ElementArray& array, const char* path, FileMode mode) {
-  array.settings.fileMode = mode;
-  try {
-    const int64_t size = array.size();
-    int64_t columns = size;
-    int64_t rows = 1;
-    if (array.dimensions() > 1 && array.boundary(1) >= 1) {
-      columns = array.boundary(1);
-      rows = (size + columns - 1) / columns;
-    }
-    // The last row is padded to X cells; past the array's cap (X = 2147483647, say)
-    // that is gigabytes of empty cells, so such a file is not written at all.
-    if (rows * columns > ElementArray::kMaxSize) return {FileStatus::Refused};
-    SaveFile file(path, mode == FileModeAppend);
-    if (!file.isOpen()) return {FileStatus::Open, errno};
-    BufferedWriter out(file.handle());
-    const std::span<const Element> cells = std::as_const(array).slots();
+FileStatus saveCsvFile(const ElementArray& array, const char* path, FileMode mode) {
+  const int64_t size = array.size();
+  int64_t columns = size;
+  int64_t rows = 1;
+  if (array.dimensions() > 1 && array.boundary(1) >= 1) {
+    columns = array.boundary(1);
+    rows = (size + columns - 1) / columns;
+  }
+  // The last row is padded to X cells; past the array's cap (X = 2147483647, say)
+  // that is gigabytes of empty cells, so such a file is not written at all.
+  const bool fits = rows * columns <= ElementArray::kMaxSize;
+  return saveWith(path, mode, fits, [&](BufferedWriter& out) {
+    const std::span<const Element> cells = array.slots();
     NumberText scratch;
     for (int64_t r = 0; r < rows; ++r) {
       for (int64_t j = 0; j < columns; ++j) {
@@ -175,31 +160,20 @@ FileStatus saveCsvFile(ElementArray& array, const char* path, FileMode mode) {
       }
       out.text(kLineEnd);
     }
-    return out.finish(file);
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
+  });
 }
 
 FileStatus loadCsvFile(ElementArray& array, const char* path, LoadMode mode) {
-  FileStatus status;
-  try {
-    std::optional<ByteBuffer> read = readTextFile(path, status);
-    std::shared_ptr<ByteBuffer> text =
-        read ? std::make_shared<ByteBuffer>(std::move(*read)) : std::make_shared<ByteBuffer>();
-    const CsvShape shape = shapeOf(text->data(), text->size());
-    io_detail::loadAllOrNothing(array, mode == LoadReplace, [&](ElementArray& target) {
-      target.setDimensions(2);
-      target.setBoundary(1, shape.columns);
-      // Appends past the array's size limit change nothing.
-      const int64_t total =
-          std::min(shape.rows * shape.columns, int64_t{ElementArray::kMaxSize} - target.size());
-      if (total > 0) appendCells(target, text, shape, total);
-    });
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
-  return status;
+  return loadWith(array, path, mode, ReadAs::Text,
+                  [](ElementArray& target, const std::shared_ptr<ByteBuffer>& text) {
+                    const CsvShape shape = shapeOf(text->data(), text->size());
+                    target.setDimensions(2);
+                    target.setBoundary(1, shape.columns);
+                    // Appends past the array's size limit change nothing.
+                    const int64_t total = std::min(shape.rows * shape.columns,
+                                                   int64_t{ElementArray::kMaxSize} - target.size());
+                    if (total > 0) appendCells(target, text, shape, total);
+                  });
 }
 
 }  // namespace quorrel

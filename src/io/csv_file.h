@@ -4,7 +4,6 @@
 #pragma once
 
 #include <cstdint>
-#include <optional>
 
 #include "array/element_array.h"
 #include "io/file_handle.h"
@@ -13,15 +12,10 @@ namespace quorrel {
 
 // One line per row of the X boundary's width when the array has two or more
 // dimensions and an X boundary of at least 1; otherwise the whole array on one line.
-FileStatus saveCsvFile(ElementArray& array, const char* path, FileMode mode);
+FileStatus saveCsvFile(const ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array first. Either way the array becomes two-dimensional with
 // the widest line's cell count as X boundary, and every line adds that many String
 // elements (short lines padded with empty texts).
 FileStatus loadCsvFile(ElementArray& array, const char* path, LoadMode mode);
-
-// The file as zero-terminated text: a zero byte inside the file ends the text (size()
-// is the text's length). Nothing when the file cannot be opened; std::bad_alloc when
-// memory runs out.
-std::optional<ByteBuffer> readTextFile(const char* path, FileStatus& status);
 
 }  // namespace quorrel

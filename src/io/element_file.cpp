@@ -1,33 +1,18 @@
 #include "io/element_file.h"
 
-#include <new>
-
 namespace quorrel {
 
 FileStatus saveElementToFile(const ElementArray& array, int32_t index, const char* path,
                              FileMode mode) {
   ByteBlock block;
-  if (!array.getBytes(block, index)) return {FileStatus::Refused};
-  try {
-    SaveFile file(path, mode == FileModeAppend);
-    if (!file.isOpen()) return {FileStatus::Open, errno};
-    bool written = true;
+  const bool there = array.getBytes(block, index);
+  return saveWith(path, mode, there, [&](BufferedWriter& out) {
     if (array.at(index).type() == ElementType::Value) {
-      const auto u = static_cast<uint32_t>(array.at(index).number());
-      const char le[4] = {static_cast<char>(u & 0xFF), static_cast<char>((u >> 8) & 0xFF),
-                          static_cast<char>((u >> 16) & 0xFF), static_cast<char>(u >> 24)};
-      written = file.handle().writeAll(le, sizeof le);
+      out.i32(array.at(index).number());
     } else if (block.bytes != nullptr && block.length > 0) {
-      written = file.handle().writeAll(block.bytes, static_cast<std::size_t>(block.length));
+      out.bytes(block.bytes, static_cast<std::size_t>(block.length));
     }
-    return file.finish(written, written ? 0 : errno);
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
-}
-
-std::optional<ByteBuffer> readWholeFile(const char* path, FileStatus& status) {
-  return readFileBytes(path, 0, status);
+  });
 }
 
 }  // namespace quorrel

@@ -1,9 +1,8 @@
-// Raw element files: one element's bytes written to a file, a whole file read into a
-// block of bytes. No header, length or separator of their own.
+// Raw element files: one element's bytes written to a file (a whole file is read into
+// a block of bytes by readFile). No header, length or separator of their own.
 #pragma once
 
 #include <cstdint>
-#include <optional>
 
 #include "array/element_array.h"
 #include "io/file_handle.h"
@@ -16,10 +15,5 @@ namespace quorrel {
 // touches no file.
 FileStatus saveElementToFile(const ElementArray& array, int32_t index, const char* path,
                              FileMode mode);
-
-// Exactly the file's bytes (no terminator added); nothing when it cannot be opened,
-// std::bad_alloc when memory runs out.
-// A read error ends the reading with what was read so far.
-std::optional<ByteBuffer> readWholeFile(const char* path, FileStatus& status);
 
 }  // namespace quorrel

@@ -4,9 +4,12 @@
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
+#include <memory>
 #include <new>
+#include <utility>
 
-#include "array/allocation.h"
+#include "platform/allocation.h"
+#include "array/array_edit.h"
 #include "platform/files.h"
 
 namespace quorrel {
@@ -67,16 +70,21 @@ FileStatus readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, st
   return {};
 }
 
-std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare, FileStatus& status) {
+FileRead readFile(const char* path, ReadAs as) {
+  FileRead read;
   FileHandle file = FileHandle::openForReading(path);
   if (!file.isOpen()) {
-    status = {FileStatus::Open, errno};
-    return std::nullopt;
+    read.status = {FileStatus::Open, errno};
+    return read;
   }
-  ByteBuffer buffer;
-  status = readToEnd(file, buffer, kMaxFileBytes, spare);
-  if (status.failed == FileStatus::OutOfMemory) throw std::bad_alloc();
-  return buffer;
+  read.status = readToEnd(file, read.bytes, kMaxFileBytes, 1);
+  if (read.status.failed == FileStatus::OutOfMemory) {
+    read.bytes = ByteBuffer();
+  } else if (as == ReadAs::Text) {
+    read.bytes.data()[read.bytes.size()] = '\0';
+    read.bytes.setSize(std::strlen(read.bytes.data()));
+  }
+  return read;
 }
 
 // --- BufferedWriter ------------------------------------------------------------------
@@ -103,6 +111,39 @@ void BufferedWriter::flush() {
     error_ = errno;
   }
   used_ = 0;
+}
+
+// --- The save path and the load path -------------------------------------------------
+// Every save of the formats ends in saveThrough and every read in readFile: the two
+// places where a file's failure is known with its path, step and system error number.
+
+FileStatus io_detail::saveThrough(const char* path, FileMode mode, bool fits, void* body,
+                                  WriteBody write) {
+  if (!fits) return {FileStatus::Refused};
+  try {
+    SaveFile file(path, mode == FileModeAppend);
+    if (!file.isOpen()) return {FileStatus::Open, errno};
+    BufferedWriter out(file.handle());
+    write(body, out);
+    return out.finish(file);
+  } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
+  }
+}
+
+FileStatus io_detail::loadThrough(ElementArray& array, const char* path, LoadMode mode, ReadAs as,
+                                  void* body, LoadBody load) {
+  FileRead read = readFile(path, as);
+  if (read.status.failed == FileStatus::OutOfMemory) return read.status;
+  try {
+    const auto bytes = std::make_shared<ByteBuffer>(std::move(read.bytes));
+    ArrayEdit edit(array, mode == LoadReplace ? ArrayEdit::Replacing : ArrayEdit::Growing);
+    load(body, edit.target(), bytes);
+    edit.commit();
+  } catch (const std::bad_alloc&) {
+    return {FileStatus::OutOfMemory};
+  }
+  return read.status;
 }
 
 }  // namespace quorrel

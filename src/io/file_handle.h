@@ -1,6 +1,6 @@
-// Low-level file access for the file formats: an owned descriptor opened by path,
-// a crash-safe whole-file save, a growable byte buffer, buffered writing and
-// whole-file reading. Files are opened and closed within one operation.
+// Files as the formats see them: a growable byte buffer, buffered writing, and the one
+// save path and the one load path that every format goes through. The handle and the
+// save that puts a new file in place in one step are the system's (platform/files.h).
 #pragma once
 
 #include <cstddef>
@@ -8,9 +8,9 @@
 #include <cstdlib>
 #include <cstring>
 #include <memory>
-#include <optional>
-#include <string>
 #include <string_view>
+#include <type_traits>
+#include <utility>
 
 #include "array/settings.h"
 #include "platform/files.h"
@@ -52,12 +52,24 @@ FileStatus readToEnd(FileHandle& file, ByteBuffer& buffer, std::size_t limit, st
 // The largest file a reader takes in: what a block length can count.
 inline constexpr std::size_t kMaxFileBytes = INT32_MAX;
 
-// Opens the file read only, reads all of it (up to kMaxFileBytes) and closes it;
-// `spare` writable bytes stay past the data. Nothing when the file cannot be opened;
-// `status` tells why, or of a read error after which the bytes read so far are
-// returned. Throws std::bad_alloc when memory runs out, so that no load takes half a
+// How a reader takes a file's bytes.
+enum class ReadAs {
+  Bytes,  // all of them, with one writable byte past them
+  Text,   // up to the first zero byte, which then ends them
+};
+
+// A whole file as read, with how the reading went: Done; Open, with no bytes; Read, with
+// the bytes before the error; OutOfMemory, with no bytes, so that no load takes half a
 // file.
-std::optional<ByteBuffer> readFileBytes(const char* path, std::size_t spare, FileStatus& status);
+struct FileRead {
+  ByteBuffer bytes;
+  FileStatus status;
+  // The file was opened and read, to its end or up to a read error.
+  bool hasContents() const { return status.ok() || status.failed == FileStatus::Read; }
+};
+
+// Opens the file read only, reads all of it (up to kMaxFileBytes) and closes it.
+FileRead readFile(const char* path, ReadAs as = ReadAs::Bytes);
 
 // How far a reader got through the records (elements, cells) of a binary file, for
 // telling a damaged file from a whole one.
@@ -143,5 +155,45 @@ class BufferedWriter {
   bool failed_ = false;
   int error_ = 0;  // the system's reason for the refused write
 };
+
+class ElementArray;
+
+namespace io_detail {
+using WriteBody = void (*)(void* body, BufferedWriter& out);
+using LoadBody = void (*)(void* body, ElementArray& target,
+                          const std::shared_ptr<ByteBuffer>& bytes);
+FileStatus saveThrough(const char* path, FileMode mode, bool fits, void* body, WriteBody write);
+FileStatus loadThrough(ElementArray& array, const char* path, LoadMode mode, ReadAs as, void* body,
+                       LoadBody load);
+}  // namespace io_detail
+
+// Every save: `write` puts the file's bytes into the writer, and the save ends as
+// SaveFile makes it (a new file put in place once whole, or an append). With `fits`
+// false nothing is opened and the save is Refused (an element that is not there, a
+// table too large for its format). Memory running out ends it as OutOfMemory.
+template <class Write>
+FileStatus saveWith(const char* path, FileMode mode, bool fits, Write&& write) {
+  return io_detail::saveThrough(path, mode, fits, &write, [](void* body, BufferedWriter& out) {
+    (*static_cast<std::remove_reference_t<Write>*>(body))(out);
+  });
+}
+template <class Write>
+FileStatus saveWith(const char* path, FileMode mode, Write&& write) {
+  return saveWith(path, mode, true, std::forward<Write>(write));
+}
+
+// Every whole-array load: the file is read whole and `load(target, bytes)` applies it
+// under an ArrayEdit, all or nothing: a replacing load fills an empty copy that is moved
+// in once complete, an appending one that runs out of memory is undone (OutOfMemory,
+// the array as it was). A file that cannot be opened reads as no bytes, so a replacing
+// load still clears the array; the status says why.
+template <class Load>
+FileStatus loadWith(ElementArray& array, const char* path, LoadMode mode, ReadAs as, Load&& load) {
+  return io_detail::loadThrough(
+      array, path, mode, as, &load,
+      [](void* body, ElementArray& target, const std::shared_ptr<ByteBuffer>& bytes) {
+        (*static_cast<std::remove_reference_t<Load>*>(body))(target, bytes);
+      });
+}
 
 }  // namespace quorrel

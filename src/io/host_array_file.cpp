@@ -5,7 +5,6 @@
 #include <algorithm>
 #include <cstring>
 #include <memory>
-#include <new>
 #include <string_view>
 
 #include "array/int32.h"
@@ -55,23 +54,9 @@ void writeCell(BufferedWriter& out, const ElementArray& array, int32_t k, Number
   out.bytes(text, length);
 }
 
-// Writes the header, the sizes (0 written and counted as 1) and every cell (an empty
-// text past the elements). Nothing when X x Y x Z is past ElementArray::kMaxSize.
-FileStatus writeHostFile(const char* path, FileMode mode, const ElementArray& array, int32_t x,
-                         int32_t y, int32_t z) {
-  x = atLeastOne(x);
-  y = atLeastOne(y);
-  z = atLeastOne(z);
-  // More cells than any array can hold (a wide boundary, say) would mean gigabytes of
-  // empty cells: such a file is not written at all.
-  // (X × Y is checked first: with all three near 2^31 the product passes 64 bits.)
-  const int64_t layer = int64_t{x} * y;
-  if (layer > ElementArray::kMaxSize || layer * z > ElementArray::kMaxSize) {
-    return {FileStatus::Refused};
-  }
-  SaveFile file(path, mode == FileModeAppend);
-  if (!file.isOpen()) return {FileStatus::Open, errno};
-  BufferedWriter out(file.handle());
+// Writes the header, the sizes and every cell (an empty text past the elements).
+void writeHostFile(BufferedWriter& out, const ElementArray& array, int32_t x, int32_t y,
+                   int32_t z) {
   out.text(kHostFileHeader);
   out.i32(kVersion);
   out.i32(x);
@@ -85,7 +70,6 @@ FileStatus writeHostFile(const char* path, FileMode mode, const ElementArray& ar
       for (int32_t k1 = 0; k1 < x; ++k1) writeCell(out, array, addWrap(row, k1), scratch);
     }
   }
-  return out.finish(file);
 }
 
 // The number of cells X x Y x Z, or -1 when a size is negative or the product does
@@ -160,14 +144,8 @@ FileExtent parseHost(char* data, std::size_t size, Sink& sink) {
 }
 
 // Texts are borrowed from the file's bytes (which the array then keeps).
-struct LoadSink {
-  LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing), run(target) {}
-
-  ElementArray& array;
-  bool replace;
-  io_detail::AppendRun run;
-  bool borrowed = false;
-  bool headerSeen = false;
+struct LoadSink : io_detail::BinaryLoad {
+  using BinaryLoad::BinaryLoad;
 
   void header(int32_t x, int32_t y, int32_t) {
     headerSeen = true;
@@ -216,35 +194,28 @@ FileExtent measureHostFile(std::string_view file) {
   return parseHost(copy.data(), file.size(), sink);
 }
 
-FileStatus saveHostArrayFile(ElementArray& array, const char* path, FileMode mode) {
-  array.settings.fileMode = mode;
-  try {
-    const int32_t x = array.boundary(1);
-    const int32_t y = array.boundary(2);
-    const int32_t z = addWrap(divTrunc(array.size(), mulWrap(atLeastOne(x), atLeastOne(y))), 1);
-    return writeHostFile(path, mode, array, x, y, z);
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
+FileStatus saveHostArrayFile(const ElementArray& array, const char* path, FileMode mode) {
+  // Sizes of 0 are written and counted as 1.
+  const int32_t x = atLeastOne(array.boundary(1));
+  const int32_t y = atLeastOne(array.boundary(2));
+  const int32_t z = atLeastOne(addWrap(divTrunc(array.size(), mulWrap(x, y)), 1));
+  // More cells than any array can hold (a wide boundary, say) would mean gigabytes of
+  // empty cells: such a file is not written at all.
+  // (X × Y is checked first: with all three near 2^31 the product passes 64 bits.)
+  const int64_t layer = int64_t{x} * y;
+  const bool fits = layer <= ElementArray::kMaxSize && layer * z <= ElementArray::kMaxSize;
+  return saveWith(path, mode, fits,
+                  [&](BufferedWriter& out) { writeHostFile(out, array, x, y, z); });
 }
 
 FileStatus loadHostArrayFile(ElementArray& array, const char* path, LoadMode mode) {
   const bool replace = mode == LoadReplace;
-  FileStatus status;
-  try {
-    std::optional<ByteBuffer> read = readFileBytes(path, 1, status);
-    const auto bytes = read ? std::make_shared<ByteBuffer>(std::move(*read)) : nullptr;
-    io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
-      LoadSink sink{target, replace};
-      if (bytes) parseHost(bytes->data(), bytes->size(), sink);
-      if (sink.borrowed) target.keepBlock(bytes);
-      sink.run.flush();
-      if (replace && !sink.headerSeen) target.setDimensions(0);
-    });
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
-  return status;
+  return loadWith(array, path, mode, ReadAs::Bytes,
+                  [&](ElementArray& target, const std::shared_ptr<ByteBuffer>& bytes) {
+                    LoadSink sink{target, replace};
+                    parseHost(bytes->data(), bytes->size(), sink);
+                    sink.finish(bytes);
+                  });
 }
 
 }  // namespace quorrel

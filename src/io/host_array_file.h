@@ -16,7 +16,7 @@ inline constexpr std::string_view kHostFileHeader{"CNC ARRAY\0", 10};
 
 // Writes every element's text form as a text cell. X and Y are the boundaries of
 // dimensions 1 and 2 (0 counts as 1); Z is size / (X x Y) + 1.
-FileStatus saveHostArrayFile(ElementArray& array, const char* path, FileMode mode);
+FileStatus saveHostArrayFile(const ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array and makes it three-dimensional with the file's X and Y as
 // boundaries 1 and 2 (a file that cannot be used still clears it and sets 0
 // dimensions); otherwise the cells are added at the end and dimensions stay.

@@ -2,11 +2,9 @@
 
 #include <cstring>
 #include <memory>
-#include <new>
 #include <string_view>
 
 #include "io/apply.h"
-#include "io/csv_file.h"
 #include "io/file_handle.h"
 #include "io/parsing.h"
 
@@ -113,12 +111,8 @@ struct LoadSink {
 
 }  // namespace
 
-FileStatus saveIniFile(ElementArray& array, const char* path, FileMode mode) {
-  array.settings.fileMode = mode;
-  try {
-    SaveFile file(path, mode == FileModeAppend);
-    if (!file.isOpen()) return {FileStatus::Open, errno};
-    BufferedWriter out(file.handle());
+FileStatus saveIniFile(const ElementArray& array, const char* path, FileMode mode) {
+  return saveWith(path, mode, [&](BufferedWriter& out) {
     writeSectionLine(out, kSectionName);
     NumberText keyScratch;
     NumberText valueScratch;
@@ -127,29 +121,18 @@ FileStatus saveIniFile(ElementArray& array, const char* path, FileMode mode) {
       writeEntry(out, key, e.asString(valueScratch));
     }
     out.text(kLineEnd);
-    return out.finish(file);
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
+  });
 }
 
 FileStatus loadIniFile(ElementArray& array, const char* path, LoadMode mode) {
-  FileStatus status;
-  try {
-    std::optional<ByteBuffer> read = readTextFile(path, status);
-    const auto text = read ? std::make_shared<ByteBuffer>(std::move(*read)) : nullptr;
-    io_detail::loadAllOrNothing(array, mode == LoadReplace, [&](ElementArray& target) {
-      if (!text) return;
-      io_detail::AppendRun run(target);
-      LoadSink sink{run};
-      parseIni(text->data(), text->size(), sink);
-      if (run.size() > 0) target.keepBlock(text);
-      run.flush();
-    });
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
-  return status;
+  return loadWith(array, path, mode, ReadAs::Text,
+                  [](ElementArray& target, const std::shared_ptr<ByteBuffer>& text) {
+                    io_detail::AppendRun run(target);
+                    LoadSink sink{run};
+                    parseIni(text->data(), text->size(), sink);
+                    if (run.size() > 0) target.keepBlock(text);
+                    run.flush();
+                  });
 }
 
 }  // namespace quorrel

@@ -10,7 +10,7 @@
 
 namespace quorrel {
 
-FileStatus saveIniFile(ElementArray& array, const char* path, FileMode mode);
+FileStatus saveIniFile(const ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array first; dimensions, boundaries and labels stay. Each entry
 // appends its value (none for a line without "=") with its key as a String key.
 FileStatus loadIniFile(ElementArray& array, const char* path, LoadMode mode);

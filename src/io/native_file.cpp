@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <cstring>
 #include <memory>
-#include <new>
 #include <string>
 #include <string_view>
 
@@ -196,14 +195,9 @@ ElementValue operandOf(uint16_t type, int32_t size, int32_t number, const char* 
 // file's records; labels wait until every element is in place. Every loaded element
 // has a key, even if only a None one. A text with its terminator in the file and no
 // key of its own is borrowed from the file's bytes (which the array then keeps).
-struct LoadSink {
-  LoadSink(ElementArray& target, bool replacing) : array(target), replace(replacing), run(target) {}
+struct LoadSink : io_detail::BinaryLoad {
+  using BinaryLoad::BinaryLoad;
 
-  ElementArray& array;
-  bool replace;
-  io_detail::AppendRun run;
-  bool borrowed = false;
-  bool headerSeen = false;
   int32_t labelIndex = 0;
   std::vector<std::pair<int32_t, std::string>> pendingLabels;
   std::vector<std::unique_ptr<char[]>> filled;
@@ -289,12 +283,8 @@ FileExtent scanNativeFile(std::string_view file, NativeFileVisitor& visitor) {
   return parseNative(file, sink);
 }
 
-FileStatus saveNativeFile(ElementArray& array, const char* path, FileMode mode) {
-  array.settings.fileMode = mode;
-  try {
-    SaveFile file(path, mode == FileModeAppend);
-    if (!file.isOpen()) return {FileStatus::Open, errno};
-    BufferedWriter out(file.handle());
+FileStatus saveNativeFile(const ElementArray& array, const char* path, FileMode mode) {
+  return saveWith(path, mode, [&](BufferedWriter& out) {
     int32_t boundaries[kMaxDimensions];
     for (int32_t d = 0; d < kMaxDimensions; ++d) boundaries[d] = array.boundary(d + 1);
     writeHeader(out, array.dimensions(), boundaries);
@@ -308,32 +298,20 @@ FileStatus saveNativeFile(ElementArray& array, const char* path, FileMode mode) 
     }
     out.i32(array.size());
     for (const Element& e : array.slots()) writeRecord(out, halfOf(&e), halfOf(e.key()));
-    return out.finish(file);
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
+  });
 }
 
 FileStatus loadNativeFile(ElementArray& array, const char* path, LoadMode mode) {
   const bool replace = mode == LoadReplace;
-  FileStatus status;
-  try {
-    std::optional<ByteBuffer> read = readFileBytes(path, 0, status);
-    const auto bytes = read ? std::make_shared<const ByteBuffer>(std::move(*read)) : nullptr;
-    io_detail::loadAllOrNothing(array, replace, [&](ElementArray& target) {
-      LoadSink sink{target, replace};
-      if (bytes) parseNative(bytes->view(), sink);
-      if (sink.borrowed) target.keepBlock(bytes);
-      sink.run.flush();
-      if (replace && !sink.headerSeen) target.setDimensions(0);
-      for (const auto& [column, text] : sink.pendingLabels) {
-        io_detail::applyLabel(target, text, column);
-      }
-    });
-  } catch (const std::bad_alloc&) {
-    return {FileStatus::OutOfMemory};
-  }
-  return status;
+  return loadWith(array, path, mode, ReadAs::Bytes,
+                  [&](ElementArray& target, const std::shared_ptr<ByteBuffer>& bytes) {
+                    LoadSink sink{target, replace};
+                    parseNative(bytes->view(), sink);
+                    sink.finish(bytes);
+                    for (const auto& [column, text] : sink.pendingLabels) {
+                      io_detail::applyLabel(target, text, column);
+                    }
+                  });
 }
 
 }  // namespace quorrel

@@ -13,8 +13,8 @@ namespace quorrel {
 // The first bytes of every native array file.
 inline constexpr std::string_view kNativeFileMagic{"ZUBARRAY", 8};
 
-// Writes the whole array; stores `mode` in the settings' fileMode.
-FileStatus saveNativeFile(ElementArray& array, const char* path, FileMode mode);
+// Writes the whole array.
+FileStatus saveNativeFile(const ElementArray& array, const char* path, FileMode mode);
 // Append 0 clears the array and takes the file's dimensions and boundaries (a file
 // that cannot be used still clears it and sets 0 dimensions); otherwise the file's
 // elements are added at the end. Labels of the file replace column labels in both.

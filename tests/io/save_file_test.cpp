@@ -57,14 +57,12 @@ TEST_F(ElementFile, ReadsWholeFilesOfAnySize) {
   for (size_t i = 0; i < big.size(); ++i) big[i] = static_cast<char>((i * 2654435761u) >> 13);
   for (const std::string& bytes : {big, std::string()}) {
     writeBytes(path("in.bin"), bytes);
-    FileStatus status{FileStatus::Read, 1};
-    auto block = readWholeFile(path("in.bin").c_str(), status);
-    ASSERT_TRUE(block.has_value());
-    EXPECT_TRUE(status.ok());
-    EXPECT_TRUE(blockText(*block) == bytes);
+    const FileRead block = readFile(path("in.bin").c_str());
+    EXPECT_TRUE(block.status.ok());
+    EXPECT_TRUE(blockText(block.bytes) == bytes);
     // Passed through a File element, the bytes come out unchanged.
     ElementArray a;
-    a.appendFile({block->data(), static_cast<int32_t>(block->size())});
+    a.appendFile({block.bytes.data(), static_cast<int32_t>(block.bytes.size())});
     EXPECT_TRUE(saveElementToFile(a, 0, path("out.bin").c_str(), FileModeTruncate).ok());
     EXPECT_TRUE(readBytes(path("out.bin")) == bytes);
     // And through a native file, whose writer passes a block beyond its buffer whole.
@@ -76,17 +74,16 @@ TEST_F(ElementFile, ReadsWholeFilesOfAnySize) {
   }
   // A file that cannot be read gives nothing, and says which step failed and why (a
   // missing file and a folder: the file_unusable case).
-  FileStatus failed;
-  EXPECT_FALSE(readWholeFile(nullptr, failed).has_value());
-  EXPECT_EQ(failed.failed, FileStatus::Open);
-  EXPECT_EQ(failed.error, EINVAL);
+  const FileRead failed = readFile(nullptr);
+  EXPECT_FALSE(failed.hasContents());
+  EXPECT_EQ(failed.status.failed, FileStatus::Open);
+  EXPECT_EQ(failed.status.error, EINVAL);
 #ifdef __linux__
   // Files under /proc report size 0, so the buffer has to grow as it reads.
-  FileStatus status;
-  auto maps = readWholeFile("/proc/self/maps", status);
-  ASSERT_TRUE(maps.has_value());
-  ASSERT_GT(maps->size(), 0u);
-  EXPECT_EQ(maps->data()[maps->size() - 1], '\n');
+  const FileRead maps = readFile("/proc/self/maps");
+  ASSERT_TRUE(maps.hasContents());
+  ASSERT_GT(maps.bytes.size(), 0u);
+  EXPECT_EQ(maps.bytes.data()[maps.bytes.size() - 1], '\n');
 #endif
 }
 
@@ -232,13 +229,13 @@ TEST_F(SaveFileTest, ReadOnlyFolderWritesInPlaceAndReadOnlyFileKeepsItsBytes) {
 // wait on a pipe without a writer.
 TEST_F(SaveFileTest, ReadsRefuseDevicesAndDoNotWaitOnPipes) {
   ASSERT_EQ(mkfifo(path("pipe").c_str(), 0600), 0);
-  FileStatus status;
-  const auto pipe = readWholeFile(path("pipe").c_str(), status);
-  ASSERT_TRUE(pipe.has_value());
-  EXPECT_EQ(pipe->size(), 0u);
+  const FileRead pipe = readFile(path("pipe").c_str());
+  ASSERT_TRUE(pipe.hasContents());
+  EXPECT_EQ(pipe.bytes.size(), 0u);
   for (const char* device : {"/dev/zero", "/dev/null"}) {
-    EXPECT_FALSE(readWholeFile(device, status).has_value()) << device;
-    EXPECT_EQ(status.failed, FileStatus::Open) << device;
+    const FileRead refused = readFile(device);
+    EXPECT_FALSE(refused.hasContents()) << device;
+    EXPECT_EQ(refused.status.failed, FileStatus::Open) << device;
   }
 }
 

@@ -1,6 +1,7 @@
 #include "instance_reads.h"
 
 #include <cstring>
+#include <new>
 
 #include "array_files.h"
 #include "catalog.h"
@@ -25,10 +26,12 @@ Snapshot::Snapshot(Instance& instance) {
 }
 
 ByteBuffer readBytes(const std::string& path) {
-  FileStatus status;
-  std::optional<ByteBuffer> bytes = readFileBytes(path.c_str(), 0, status);
-  if (!bytes) throw FileError("cannot read " + path + ": " + std::strerror(status.error));
-  return std::move(*bytes);
+  FileRead read = readFile(path.c_str());
+  if (read.status.failed == FileStatus::OutOfMemory) throw std::bad_alloc();
+  if (!read.hasContents()) {
+    throw FileError("cannot read " + path + ": " + std::strerror(read.status.error));
+  }
+  return std::move(read.bytes);
 }
 
 std::string plural(int64_t count, const char* noun) {
