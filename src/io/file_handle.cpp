@@ -8,8 +8,8 @@
 #include <new>
 #include <utility>
 
-#include "platform/allocation.h"
 #include "array/array_edit.h"
+#include "platform/allocation.h"
 #include "platform/files.h"
 
 namespace quorrel {
