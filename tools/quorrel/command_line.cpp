@@ -33,11 +33,6 @@ constexpr Option kOptions[] = {
 constexpr size_t kLineWidth = 80;
 constexpr size_t kWidestLabelColumn = 24;
 
-// Help and version answer on their own, so no synopsis shows them.
-bool answersAlone(const Option& option) {
-  return option.id == OptionId::Help || option.id == OptionId::Version;
-}
-
 // Where the word at the start of `text` ends: at a blank outside brackets, so that a
 // synopsis keeps "[--rows N]" on one line.
 size_t wordEnd(std::string_view text) {
@@ -71,13 +66,6 @@ std::string wrapped(std::string_view text, size_t indent, size_t column) {
     text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
   }
   return out;
-}
-
-// Every: the options of every command, which come before the command; otherwise the
-// options of the commands in `set`.
-bool selected(const Option& option, CommandSet set) {
-  if (set == Every) return option.commands == Every;
-  return (option.commands & set) && option.commands != Every;
 }
 
 std::string optionRows(CommandSet set) {
@@ -124,6 +112,19 @@ CommandSet setOf(CommandId id) {
   return 1u << static_cast<int>(id);
 }
 
+bool selected(const Option& option, CommandSet set) {
+  if (set == Every) return option.commands == Every;
+  return (option.commands & set) && option.commands != Every;
+}
+
+bool answersAlone(const Option& option) {
+  return option.id == OptionId::Help || option.id == OptionId::Version;
+}
+
+bool repeats(const Option& option) {
+  return option.id == OptionId::Line;
+}
+
 std::string optionLabel(const Option& option) {
   std::string label = option.shortName;
   if (*option.longName) label += (label.empty() ? "" : ", ") + std::string(option.longName);
@@ -150,8 +151,7 @@ std::string synopsisOptions(CommandSet set) {
     if (!selected(option, set) || answersAlone(option)) continue;
     const std::string name = *option.longName ? option.longName : option.shortName;
     text += (text.empty() ? "[" : " [") + name + (*option.value ? " " : "") + option.value + "]";
-    // The script lines of -e add up.
-    if (option.id == OptionId::Line) text += "...";
+    if (repeats(option)) text += "...";
   }
   return text;
 }

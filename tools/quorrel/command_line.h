@@ -71,6 +71,14 @@ const Option* findOption(std::string_view name);
 const Option& option(OptionId id);
 CommandSet setOf(CommandId id);
 
+// Every: the options of every command, which come before the command; otherwise the
+// options of the commands in `set`.
+bool selected(const Option& option, CommandSet set);
+// Help and version answer on their own, so no synopsis shows them.
+bool answersAlone(const Option& option);
+// An option given more than once adds up (the script lines of -e).
+bool repeats(const Option& option);
+
 // "--rows", "-h, --help"; with the value: "--rows N".
 std::string optionLabel(const Option& option);
 // "run and shell", "run, inspect and convert".
