@@ -30,6 +30,12 @@ std::string roff(std::string_view text) {
   return out;
 }
 
+// A table's help line as a sentence of its own: "Print each E line ... locale)."
+std::string sentence(std::string text) {
+  text[0] = static_cast<char>(std::toupper(static_cast<unsigned char>(text[0])));
+  return text.ends_with('.') ? text : text + '.';
+}
+
 std::string optionName(const cli::Option& option) {
   return *option.longName ? option.longName : option.shortName;
 }
@@ -78,10 +84,15 @@ std::string manOptions() {
     if (*option.shortName && *option.longName) out += ", ";
     if (*option.longName) out += "\\fB" + roff(option.longName) + "\\fR";
     if (*option.value) out += " \\fI" + std::string(option.value) + "\\fR";
-    // A sentence of its own: "(run, shell) Print each E line ... locale)."
-    std::string help = option.help;
-    help[0] = static_cast<char>(std::toupper(static_cast<unsigned char>(help[0])));
-    out += '\n' + roff(owners(option) + help) + (help.ends_with('.') ? "\n" : ".\n");
+    out += '\n' + roff(owners(option) + sentence(option.help)) + '\n';
+  }
+  return out;
+}
+
+std::string manShellWords() {
+  std::string out;
+  for (const cli::ShellWord& word : cli::shellWords()) {
+    out += ".TP\n.B \"" + roff(cli::synopsis(word)) + "\"\n" + roff(sentence(word.summary)) + '\n';
   }
   return out;
 }
@@ -191,7 +202,8 @@ int main(int argc, char** argv) {
   const bool man = fill(argv[1], argv[2],
                         {{"@SYNOPSIS@", manSynopsis()},
                          {"@SHOW_OPTIONS@", roff(cli::synopsisOptions(cli::sets::Show))},
-                         {"@OPTIONS@", manOptions()}});
+                         {"@OPTIONS@", manOptions()},
+                         {"@SHELL_WORDS@", manShellWords()}});
   const bool bash = fill(argv[3], argv[4],
                          {{"@COMMAND_PATTERN@", commandPattern()},
                           {"@VALUE_CASES@", bashValueCases()},

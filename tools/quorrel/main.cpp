@@ -34,9 +34,8 @@ start is read past, with a note on standard error.
                            prints nothing
   E NAME|CODE [ARG [ARG]]  call expression CODE (0..59) or a name such as rowList$(
                            and print its result: -12 or "a,b,7"
-  show [--rows N | --all] [--width N] [--keys]
-                           print the current array as inspect does, the selected
-                           rows marked *
+  show [OPTION]...         print the current array as inspect does, with its view
+                           options, the selected rows marked *
 
 A name may be typed in any case, with or without its "(", and its arguments may
 follow in parentheses, separated by commas: E labSum("qty"), E size,
@@ -60,10 +59,7 @@ status 1.
     {"shell", R"(Reads script commands interactively, one per line, with line editing, history
 (~/.quorrel_history) and Tab completion of commands and names on a terminal.
 Errors are reported and the session goes on; when the input is not a terminal, the
-exit status is then 2 (else 1 with --strict after a failed file action). Beside
-the script commands:
-help, help NAME|CODE, list, show (the current array), quit or exit. Ctrl-C
-clears the line, Ctrl-D ends.
+exit status is then 2 (else 1 with --strict after a failed file action).
 )"},
     {"inspect", R"(Recognises a native array, host array, CSV, INI or JSON file (or reads it as
 --from says), loads it into a fresh instance and prints its format, dimensions,
@@ -384,8 +380,10 @@ int main(int argc, char** argv) {
     }
     if (options.help) {
       const cli::Command* found = cli::findCommand(command);
-      std::cout << (found ? cli::commandHelp(*found, kCommandProse.at(found->name))
-                          : cli::mainHelp());
+      std::string prose = found ? kCommandProse.at(found->name) : "";
+      // The shell's own help, the same the shell prints.
+      if (found && found->id == cli::CommandId::Shell) prose += '\n' + cli::shellHelp();
+      std::cout << (found ? cli::commandHelp(*found, prose) : cli::mainHelp());
       return checkedOutput(0);
     }
     if (options.words.empty()) throw UsageError("no command given");
