@@ -7,6 +7,7 @@
 #include <fstream>
 #include <tuple>
 
+#include "command_line.h"
 #include "commands.h"
 
 namespace quorrel::tool {
@@ -119,7 +120,8 @@ ViewOptions showOptions(std::string_view rest) {
     };
     try {
       if (!takeViewOption(words[i], next, view)) {
-        throw ScriptError("show takes --rows N, --width N, --all and --keys, not " + words[i]);
+        throw ScriptError("show takes " + cli::synopsisOptions(cli::sets::Show) + ", not " +
+                          words[i]);
       }
     } catch (const UsageError& error) {
       throw ScriptError(error.what());
