@@ -2,8 +2,8 @@
 
 #include <algorithm>
 #include <cstring>
-
 #include <vector>
+
 #include "catalog.h"
 #include "host/abi.h"
 
@@ -102,10 +102,6 @@ const Option* findOption(std::string_view name) {
     if (!name.empty() && (name == option.longName || name == option.shortName)) return &option;
   }
   return nullptr;
-}
-
-const Option& option(OptionId id) {
-  return kOptions[static_cast<size_t>(id)];
 }
 
 CommandSet setOf(CommandId id) {

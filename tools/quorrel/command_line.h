@@ -68,7 +68,6 @@ std::span<const Option> options();
 const Command* findCommand(std::string_view name);
 // By its long or short name.
 const Option* findOption(std::string_view name);
-const Option& option(OptionId id);
 CommandSet setOf(CommandId id);
 
 // Every: the options of every command, which come before the command; otherwise the
