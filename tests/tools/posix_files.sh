@@ -23,7 +23,8 @@ t.qs:3: warning: saveToFile "/dev/full": could not write it (No space left on de
 # Output that cannot be written is an error, whether found while running or at the end;
 # binary output to a terminal needs --force.
 printf 'E size(\n' >size.qs
-for command in list "inspect t.qs --from csv" "convert t.qs - --to json --from csv" "run size.qs"; do
+for command in list "inspect t.qs --from csv" "convert t.qs - --to json --from csv" "run size.qs" \
+  --help "menu --help" -V; do
   out=/dev/full check 1 "quorrel: cannot write standard output*" $command
 done
 # A command copied away from its module says where it looked and how to name it.

@@ -134,7 +134,7 @@ with tempfile.TemporaryDirectory() as home:
     steps(shell, ("show\r", "selected    1 of 3 rows (marked *)", "show's selection"),
           (None, "#8 #9\r\n", "show's tenth column"), (None, "  0   r0", "show's unselected row"),
           (None, "  *1  r1", "show's selected row"),
-          ("show --keys --rows 1\r", '0     string "r0"', "show --keys"),
+          ("show --ke\t--rows 1\r", '0     string "r0"', "show --keys, completed"),
           (None, "29 more elements not shown", "show --rows"),
           ("show --bogus\r", "not --bogus", "show's unknown option"),
           (None, "quorrel> ", "prompt before Ctrl-D"))

@@ -133,23 +133,29 @@ int32_t expressionCode(std::string_view name) {
   throw std::logic_error("no expression " + std::string(name));
 }
 
-std::vector<std::string> nearestNames(std::string_view typed) {
+std::vector<std::string> nearestWords(std::string_view typed,
+                                      std::span<const std::string_view> words) {
   const std::string wanted = comparable(typed);
   // A slip: about one key in three wrong, at least one.
   const size_t limit = std::max<size_t>(1, (wanted.size() + 1) / 3);
   std::vector<std::pair<size_t, std::string>> near;
-  for (const bool action : {true, false}) {
-    for (int32_t code = 0; code < countOf(action); ++code) {
-      const std::string_view name = nameOf(action, code);
-      const size_t distance = editDistance(wanted, comparable(name));
-      if (distance <= limit) near.emplace_back(distance, name);
-    }
+  for (const std::string_view word : words) {
+    const size_t distance = editDistance(wanted, comparable(word));
+    if (distance <= limit) near.emplace_back(distance, word);
   }
   std::stable_sort(near.begin(), near.end(),
                    [](const auto& a, const auto& b) { return a.first < b.first; });
-  std::vector<std::string> names;
-  for (size_t i = 0; i < near.size() && i < 3; ++i) names.push_back(near[i].second);
-  return names;
+  std::vector<std::string> nearest;
+  for (size_t i = 0; i < near.size() && i < 3; ++i) nearest.push_back(near[i].second);
+  return nearest;
+}
+
+std::vector<std::string> nearestNames(std::string_view typed) {
+  std::vector<std::string_view> names;
+  for (const bool action : {true, false}) {
+    for (int32_t code = 0; code < countOf(action); ++code) names.push_back(nameOf(action, code));
+  }
+  return nearestWords(typed, names);
 }
 
 std::string_view parameterMeaning(bool action, int32_t code, int param) {

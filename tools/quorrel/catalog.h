@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <map>
 #include <optional>
+#include <span>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -44,8 +45,11 @@ std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed);
 // table has none (a mistake in the command itself).
 int32_t expressionCode(std::string_view name);
 
-// The names of either kind nearest to `typed` by edit distance, nearest first; only
+// The words nearest to `typed` by edit distance, in any case, nearest first; only
 // those near enough to be a slip of the keys, at most three.
+std::vector<std::string> nearestWords(std::string_view typed,
+                                      std::span<const std::string_view> words);
+// The names of either kind nearest to `typed`, as nearestWords.
 std::vector<std::string> nearestNames(std::string_view typed);
 
 // What parameter `param` (0 or 1) is, from the table; empty when there is none.

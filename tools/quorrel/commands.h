@@ -60,6 +60,9 @@ struct ConvertOptions {
 };
 
 int runCommand(const ModuleLoader& module, const std::string& path, const RunOptions& options);
+// The script given as separate lines (run -e), named -e in errors.
+int runLinesCommand(const ModuleLoader& module, const std::vector<std::string>& lines,
+                    const RunOptions& options);
 int shellCommand(const ModuleLoader& module, const RunOptions& options);
 int inspectCommand(const Module& module, const std::string& path, const InspectOptions& options);
 int convertCommand(const Module& module, const ConvertOptions& options);

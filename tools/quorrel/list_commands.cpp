@@ -107,13 +107,17 @@ std::optional<Entry> find(std::string_view what) {
   return std::nullopt;
 }
 
-// The catalogue line of an action or expression: "A48 setLabel(text: ..., number: ...)  [menu]".
+// The catalogue line of an action or expression: "A48 setLabel(text: ..., number: ...)  [menu]";
+// a menu path that would take it past 120 columns goes on a line of its own.
 std::string catalogLine(const Module& module, Entry e,
                         const std::map<int32_t, std::string>& paths) {
+  constexpr size_t kWidth = 120;
   const auto path = paths.find(e.code);
-  return (e.action ? "A" : "E") + std::to_string(e.code) + ' ' + nameOf(module, e) +
-         parameters(module, e, describe(e.action, e.code)) + "  [" +
-         (path == paths.end() ? "no menu" : path->second) + "]";
+  const std::string call = (e.action ? "A" : "E") + std::to_string(e.code) + ' ' +
+                           nameOf(module, e) + parameters(module, e, describe(e.action, e.code));
+  const std::string menu = "[" + (path == paths.end() ? "no menu" : path->second) + "]";
+  const bool fits = printedWidth(call) + 2 + printedWidth(menu) <= kWidth;
+  return call + (fits ? "  " : "\n    ") + menu;
 }
 
 // Every entry whose name, menu path, parameters or description holds `word`, in any

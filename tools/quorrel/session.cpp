@@ -7,6 +7,9 @@
 #include <fstream>
 #include <tuple>
 
+#include "command_line.h"
+#include "commands.h"
+
 namespace quorrel::tool {
 namespace {
 
@@ -102,7 +105,53 @@ std::vector<std::string> oddSetupFields(const SetupFields& setup) {
   return odd;
 }
 
+// show takes inspect's view options and marks the selected rows.
+ViewOptions showOptions(std::string_view rest) {
+  std::vector<std::string> words;
+  for (auto [word, more] = firstWord(rest); !word.empty(); std::tie(word, more) = firstWord(more)) {
+    words.emplace_back(word);
+  }
+  ViewOptions view;
+  view.selection = true;
+  for (size_t i = 0; i < words.size(); ++i) {
+    const auto next = [&]() -> std::optional<std::string> {
+      if (i + 1 < words.size()) return words[++i];
+      return std::nullopt;
+    };
+    try {
+      if (!takeViewOption(words[i], next, view)) {
+        throw ScriptError("show takes " + cli::synopsisOptions(cli::sets::Show) + ", not " +
+                          words[i]);
+      }
+    } catch (const UsageError& error) {
+      throw ScriptError(error.what());
+    }
+  }
+  return view;
+}
+
 }  // namespace
+
+std::pair<std::string_view, std::string_view> firstWord(std::string_view line) {
+  const size_t start = line.find_first_not_of(" \t\r");
+  if (start == std::string_view::npos) return {};
+  line.remove_prefix(start);
+  const size_t end = line.find_first_of(" \t\r");
+  std::string_view rest = end == std::string_view::npos ? "" : line.substr(end);
+  const size_t restStart = rest.find_first_not_of(" \t\r");
+  rest = restStart == std::string_view::npos ? "" : rest.substr(restStart);
+  rest = rest.substr(0, rest.find_last_not_of(" \t\r") + 1);
+  return {line.substr(0, end), rest};
+}
+
+void Session::run(std::string_view line, std::ostream& out, const Where& where) {
+  const auto [word, rest] = firstWord(line);
+  if (word == "show") {
+    printArray(instance(), showOptions(rest), out);
+  } else {
+    execute(parseLine(line), out, where);
+  }
+}
 
 Instance& Session::instance() {
   if (!instance_) instance_ = std::make_unique<Instance>(module_.get(), SetupFields{});
@@ -194,7 +243,7 @@ int runScript(const ModuleLoader& module, std::istream& in, const std::string& n
   for (int lineNumber = 1; std::getline(in, line); ++lineNumber) {
     try {
       if (lineNumber == 1) skipByteOrderMark(line, name, err);
-      session.execute(parseLine(line), out, {name, lineNumber, line});
+      session.run(line, out, {name, lineNumber, line});
     } catch (const ScriptError& error) {
       out.flush();
       err << name << ':' << lineNumber << ": error: " << error.what() << '\n';

@@ -7,6 +7,7 @@
 #include <ostream>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "catalog.h"
 #include "module.h"
@@ -37,6 +38,10 @@ class Session {
   // Runs one parsed command; throws ScriptError for a call that does not fit the tables.
   void execute(const Command& command, std::ostream& out, const Where& where = {});
 
+  // Runs one script line: a command, or show [VIEW OPTIONS], which prints the current
+  // array as inspect does, the selected rows marked.
+  void run(std::string_view line, std::ostream& out, const Where& where);
+
   // The current instance, created with the default setup when there is none.
   Instance& instance();
   void replaceInstance(const SetupFields& setup);
@@ -59,6 +64,9 @@ class Session {
 // file action failed.
 int runScript(const ModuleLoader& module, std::istream& in, const std::string& name,
               std::ostream& out, std::ostream& err, const RunOptions& options = {});
+
+// The first word of a script line and the rest, without the blanks around them.
+std::pair<std::string_view, std::string_view> firstWord(std::string_view line);
 
 // What the failed step of a file action (as the module's QuorrelFileStatus numbers
 // it) means: "could not open it", ...

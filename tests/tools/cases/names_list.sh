@@ -3,6 +3,7 @@
 for line in list 'list setLabel' 'list 17' 'list labSum' 'list lunchbox'; do
   q $line
 done
+"$QUORREL" list | awk 'length > 120 { print "past 120 columns: " $0 }'
 cat >named.qs <<'QS'
 new x=2 autoselect=1
 A setLabel "qty" 1
