@@ -95,6 +95,8 @@ bool isRowName(std::string_view name) {
 void addLine(Description& block, std::string_view line) {
   if (line.substr(0, 5) == "bad: ") {
     block.bad = line.substr(5);
+  } else if (line.starts_with("example: ")) {
+    block.example.emplace_back(line.substr(9));
   } else {
     if (!block.prose.empty()) block.prose += '\n';
     block.prose += line;
