@@ -1,5 +1,6 @@
 #include "examples.h"
 
+#include <cctype>
 #include <sstream>
 
 #include "html.h"
@@ -81,6 +82,12 @@ std::string EditorWords::of(const std::string& line) const {
     case tool::CommandKind::Action: {
       const int32_t code = codeOf(command, true);
       std::string text = actionDisplay_[static_cast<size_t>(code)];
+      // The string starts with two digits that tell the editor how to draw it; it
+      // shows the rest.
+      if (text.size() >= 2 && std::isdigit(static_cast<unsigned char>(text[0])) &&
+          std::isdigit(static_cast<unsigned char>(text[1]))) {
+        text.erase(0, 2);
+      }
       std::vector<std::string> args = shownArguments(true, code, command.args);
       args.insert(args.begin(), kObjectName);
       size_t at = 0;

@@ -189,8 +189,8 @@ Generated render(const Kind& kind, const Examples& examples, const Descriptions&
     const Description& d = found->second;
     const std::string display = action ? module.actionString(code) : module.expressionString(code);
     if (display.empty()) fail("no display string for " + name);
-    out.body +=
-        "<div class=\"entry\" id=\"" + std::string(kind.anchor) + std::to_string(code) + "\">\n";
+    out.body += "<div class=\"entry\" id=\"" + std::string(kind.anchor) + std::to_string(code) +
+                "\" data-path=\"" + escape(group) + "\">\n";
     out.body += "<h5>" + escape(node.text) + "</h5>\n";
     out.body += "<div class=\"meta\">" + std::string(kind.letter == 'A' ? "Action" : "Expression") +
                 " " + std::to_string(code) + " · menu: " + escape(group) + " › " +
