@@ -13,9 +13,11 @@
 #include <string>
 #include <vector>
 
+#include "dialog_picture.h"
 #include "examples.h"
 #include "hostsim/host_simulator.h"
 #include "html.h"
+#include "pictures.h"
 #include "quorrel/catalog.h"
 #include "scratch_folder.h"
 
@@ -291,6 +293,10 @@ int main(int argc, char** argv) {
                examples, descriptions);
     std::string page = readFile(args["--template"]);
     runWorkedExamples(page, examples);
+    replace(page, "@@PICTURE_SETUP_DIALOG@@", quorrel::help::setupDialogPicture());
+    for (const auto& [name, html] : quorrel::help::drawPictures(module)) {
+      replace(page, "@@PICTURE_" + name + "@@", html);
+    }
     replace(page, "@@VERSION@@", args.count("--version") ? args["--version"] : "");
     replace(page, "@@TOC_ACTIONS@@", actions.toc);
     replace(page, "@@TOC_EXPRESSIONS@@", expressions.toc);
