@@ -130,7 +130,7 @@ std::string setupDialogPicture() {
     const bool option =
         c.className == std::string("Button") && (c.style & kButtonKind) > kDefaultPush;
     const double x =
-        option ? b.x + 26 + static_cast<double>(std::string(c.text).size()) * 6.0 : b.x + b.w;
+        option ? b.x + 22 + static_cast<double>(std::string(c.text).size()) * 5.6 : b.x + b.w;
     const double y = option ? b.y + b.h / 2 : b.y;
     svg += "<circle class=\"callout\" cx=\"" + num(x) + "\" cy=\"" + num(y) + "\" r=\"6.5\"/>" +
            text(x, y + 3.5, std::to_string(++number), "callout-text", "middle");

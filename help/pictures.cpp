@@ -6,6 +6,7 @@
 #include <functional>
 #include <sstream>
 #include <stdexcept>
+#include <string_view>
 #include <vector>
 
 #include "html.h"
@@ -66,7 +67,14 @@ class Svg {
             const char* anchor = "middle") {
     body_ += "<text class=\"" + cls + "\" x=\"" + num(x) + "\" y=\"" + num(y) +
              "\" text-anchor=\"" + anchor + "\">" + escapeHtml(content) + "</text>";
-    grow(x, y + 4);
+    // Room for the text as well, about 7 units a character.
+    size_t characters = 0;
+    for (const char c : content) characters += (static_cast<unsigned char>(c) & 0xC0) != 0x80;
+    const double width = 7.0 * static_cast<double>(characters);
+    grow(x + (std::string_view(anchor) == "start"    ? width
+              : std::string_view(anchor) == "middle" ? width / 2
+                                                     : 0),
+         y + 4);
   }
   std::string html(const std::string& label) const {
     const std::string w = num(width_ + 4), h = num(height_ + 4);
