@@ -363,7 +363,7 @@ std::string byteText(unsigned char byte) {
   return "";
 }
 
-std::string strip(const std::string& title, const std::string& bytes,
+std::string strip(const std::string& title, const std::string& made, const std::string& bytes,
                   const std::vector<Field>& fields) {
   constexpr int kPerRow = 16;
   constexpr double kWidth = 26, kRowHeight = 56;
@@ -385,7 +385,7 @@ std::string strip(const std::string& title, const std::string& bytes,
       svg.text(x + kWidth / 2, y + 53, byteText(byte), "char");
     }
   }
-  return "<figure class=\"picture strip\">" +
+  return "<figure class=\"picture strip\">" + made +
          svg.html(title + ": the " + std::to_string(bytes.size()) + " bytes of a saved file") +
          "\n<figcaption>" + title + ", " + std::to_string(bytes.size()) +
          " bytes as the object wrote them, field by field:</figcaption>" + legend +
@@ -402,7 +402,7 @@ std::string fileStrip(const tool::ModuleLoader& module, const std::vector<std::s
   walk(walker);
   std::string shown = "<pre class=\"made\">";
   for (const std::string& line : script) shown += escapeHtml(line) + "\n";
-  return shown + "</pre>\n" + strip(title, bytes, walker.fields());
+  return strip(title, shown + "</pre>\n", bytes, walker.fields());
 }
 
 void walkNative(ByteWalker& w) {
