@@ -67,10 +67,10 @@ class Svg {
             const char* anchor = "middle") {
     body_ += "<text class=\"" + cls + "\" x=\"" + num(x) + "\" y=\"" + num(y) +
              "\" text-anchor=\"" + anchor + "\">" + escapeHtml(content) + "</text>";
-    // Room for the text as well, about 7 units a character.
+    // Room for the text as well, at most about 8 units a character.
     size_t characters = 0;
     for (const char c : content) characters += (static_cast<unsigned char>(c) & 0xC0) != 0x80;
-    const double width = 7.0 * static_cast<double>(characters);
+    const double width = 8.0 * static_cast<double>(characters);
     grow(x + (std::string_view(anchor) == "start"    ? width
               : std::string_view(anchor) == "middle" ? width / 2
                                                      : 0),
