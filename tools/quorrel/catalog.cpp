@@ -95,8 +95,6 @@ bool isRowName(std::string_view name) {
 void addLine(Description& block, std::string_view line) {
   if (line.substr(0, 5) == "bad: ") {
     block.bad = line.substr(5);
-  } else if (line.starts_with("example: ")) {
-    block.example.emplace_back(line.substr(9));
   } else {
     if (!block.prose.empty()) block.prose += '\n';
     block.prose += line;
@@ -190,6 +188,8 @@ Prose readProse(std::string_view text) {
       prose.problems.push_back(where + "text before the first block");
     } else if (line.substr(0, 6) == "param:") {
       prose.problems.push_back(where + "parameters are described in host/table.inc");
+    } else if (line.starts_with("example: ")) {
+      block->example.emplace_back(line.substr(9));
     } else {
       addLine(*block, line);
     }
