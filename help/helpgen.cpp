@@ -32,9 +32,9 @@ struct MenuNode {
   std::string text;
 };
 
+// Thrown rather than exiting at once, so that the examples' scratch folder goes too.
 [[noreturn]] void fail(const std::string& message) {
-  std::cerr << "helpgen: " << message << "\n";
-  std::exit(1);
+  throw std::runtime_error(message);
 }
 
 std::string readFile(const std::string& path) {
@@ -273,13 +273,12 @@ void runWorkedExamples(std::string& page, const Examples& examples) {
 int main(int argc, char** argv) {
   std::map<std::string, std::string> args;
   for (int i = 1; i + 1 < argc; i += 2) args[argv[i]] = argv[i + 1];
-  for (const char* required : {"--module", "--descriptions", "--template", "--out"}) {
-    if (!args.count(required)) fail(std::string("missing ") + required);
-  }
-  for (const char* path : {"--module", "--descriptions", "--template", "--out"}) {
-    args[path] = std::filesystem::absolute(args[path]).string();
-  }
   try {
+    // Paths as given, before the examples make a scratch folder the current one.
+    for (const char* path : {"--module", "--descriptions", "--template", "--out"}) {
+      if (!args.count(path)) fail(std::string("missing ") + path);
+      args[path] = std::filesystem::absolute(args[path]).string();
+    }
     const quorrel::tool::ModuleLoader module(args["--module"]);
     const quorrel::help::EditorWords words(module.get());
     const Examples examples{module, words};
@@ -307,7 +306,8 @@ int main(int argc, char** argv) {
     out << page;
     if (!out) fail("cannot write " + args["--out"]);
   } catch (const std::exception& error) {
-    fail(error.what());
+    std::cerr << "helpgen: " << error.what() << "\n";
+    return 1;
   }
   return 0;
 }
