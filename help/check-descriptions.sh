@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # The help generator accepts the real descriptions and refuses broken copies: one that
 # lacks a row, one that describes a name the table does not have, one that describes a
-# row twice, and one that describes a parameter, which the table does.
+# row twice, one that describes a parameter, which the table does, and ones whose
+# example gives another result or is missing.
 set -u
 helpgen=$1 descriptions=$2 work=$3
 shift 3
@@ -25,7 +26,13 @@ refused stray ": size names no row"
 { cat "$descriptions"; printf '\n== get$(\nAgain.\n'; } > "$work/twice.txt"
 refused twice ': get$( twice'
 
+# An example must run, call its row and give the result written beside it.
+sed 's/^example: E labSum("score") → 555$/example: E labSum("score") → 556/' "$descriptions" > "$work/wrong.txt"
+refused wrong 'the example of labSum(, line 7 (E labSum("score")): gives 555, the page says 556'
+awk '/^== /{row = $2} !(row == "deleteAll" && /^example: /)' "$descriptions" > "$work/unshown.txt"
+refused unshown "no example for deleteAll"
+
 # Parameters are the table's, not the prose's.
 sed 's/^== appendString$/== appendString\nparam: the text to append/' "$descriptions" > "$work/params.txt"
 refused params "parameters are described in host/table.inc"
-echo "help descriptions: every action and expression described, broken copies refused"
+echo "help descriptions: every action and expression described and shown, broken copies refused"

@@ -4,6 +4,7 @@
 // through the quorrel command's catalog). It refuses to build a page that misses a row
 // or describes one that does not exist, so the page can never drift from the module.
 #include <cstdint>
+#include <filesystem>
 #include <fstream>
 #include <iostream>
 #include <map>
@@ -12,8 +13,13 @@
 #include <string>
 #include <vector>
 
+#include "dialog_picture.h"
+#include "examples.h"
 #include "hostsim/host_simulator.h"
+#include "html.h"
+#include "pictures.h"
 #include "quorrel/catalog.h"
+#include "scratch_folder.h"
 
 namespace {
 
@@ -26,9 +32,9 @@ struct MenuNode {
   std::string text;
 };
 
+// Thrown rather than exiting at once, so that the examples' scratch folder goes too.
 [[noreturn]] void fail(const std::string& message) {
-  std::cerr << "helpgen: " << message << "\n";
-  std::exit(1);
+  throw std::runtime_error(message);
 }
 
 std::string readFile(const std::string& path) {
@@ -60,26 +66,7 @@ std::map<std::string, Description, std::less<>> readDescriptions(const std::stri
 }
 
 std::string escape(const std::string& text) {
-  std::string out;
-  for (char c : text) {
-    switch (c) {
-      case '&':
-        out += "&amp;";
-        break;
-      case '<':
-        out += "&lt;";
-        break;
-      case '>':
-        out += "&gt;";
-        break;
-      case '"':
-        out += "&quot;";
-        break;
-      default:
-        out += c;
-    }
-  }
-  return out;
+  return quorrel::help::escapeHtml(text);
 }
 
 struct Kind {
@@ -87,6 +74,11 @@ struct Kind {
   const char* anchor;  // "a" or "e"
   int firstId;         // command id of code 0
   int count;
+};
+
+struct Examples {
+  const quorrel::tool::ModuleLoader& module;
+  const quorrel::help::EditorWords& words;
 };
 
 struct Generated {
@@ -150,8 +142,21 @@ class Contents {
   std::string html_ = "<ul>\n";
 };
 
-Generated render(const Kind& kind, const quorrel::hostsim::Module& module,
-                 const Descriptions& descriptions) {
+// The row's example, run; it must call the row it stands under.
+std::string example(const Kind& kind, int code, const Description& d, const Examples& examples) {
+  const bool action = kind.letter == 'A';
+  const std::string name(quorrel::tool::nameOf(action, code));
+  if (d.example.empty()) fail("no example for " + name);
+  std::vector<quorrel::help::ExampleLine> lines;
+  for (const std::string& text : d.example) lines.push_back(quorrel::help::parseExampleLine(text));
+  if (!quorrel::help::callsRow(lines, action, code))
+    fail("the example of " + name + " does not call it");
+  return quorrel::help::exampleHtml(
+      quorrel::help::runExample("the example of " + name, lines, examples.module, examples.words));
+}
+
+Generated render(const Kind& kind, const Examples& examples, const Descriptions& descriptions) {
+  const quorrel::hostsim::Module& module = examples.module.get();
   const bool action = kind.letter == 'A';
   std::vector<MenuNode> menu;
   flatten(module.menu(action ? "actions" : "expressions"), 0, menu);
@@ -186,13 +191,14 @@ Generated render(const Kind& kind, const quorrel::hostsim::Module& module,
     const Description& d = found->second;
     const std::string display = action ? module.actionString(code) : module.expressionString(code);
     if (display.empty()) fail("no display string for " + name);
-    out.body +=
-        "<div class=\"entry\" id=\"" + std::string(kind.anchor) + std::to_string(code) + "\">\n";
+    out.body += "<div class=\"entry\" id=\"" + std::string(kind.anchor) + std::to_string(code) +
+                "\" data-path=\"" + escape(group) + "\">\n";
     out.body += "<h5>" + escape(node.text) + "</h5>\n";
     out.body += "<div class=\"meta\">" + std::string(kind.letter == 'A' ? "Action" : "Expression") +
                 " " + std::to_string(code) + " · menu: " + escape(group) + " › " +
                 escape(node.text) + " · " + (kind.letter == 'A' ? "display string " : "name ") +
-                "<code>" + escape(display) + "</code></div>\n";
+                "<code>" + escape(display) + "</code> · script <code>" + kind.letter + ' ' +
+                escape(name) + "</code></div>\n";
     const auto declared = quorrel::tool::parameters(action, code);
     if (!declared.empty()) {
       out.body += "<ol class=\"params\">\n";
@@ -204,6 +210,7 @@ Generated render(const Kind& kind, const quorrel::hostsim::Module& module,
       out.body += "</ol>\n";
     }
     for (const std::string& p : paragraphs(d.prose)) out.body += "<p>" + escape(p) + "</p>\n";
+    out.body += example(kind, code, d, examples);
     if (!d.bad.empty()) out.body += "<p class=\"bad\">Bad input: " + escape(d.bad) + "</p>\n";
     out.body += "</div>\n";
   }
@@ -240,24 +247,55 @@ void checkLinks(const std::string& page) {
   }
 }
 
+// The template's worked examples, "<!--example TITLE" and script lines up to "-->",
+// run and shown as every row's example is.
+void runWorkedExamples(std::string& page, const Examples& examples) {
+  const std::string open = "<!--example ", close = "-->";
+  for (std::size_t at = page.find(open); at != std::string::npos; at = page.find(open, at)) {
+    const std::size_t end = page.find(close, at);
+    if (end == std::string::npos) fail("the template's example is not closed");
+    std::istringstream text(page.substr(at + open.size(), end - at - open.size()));
+    std::string title, line;
+    std::getline(text, title);
+    std::vector<quorrel::help::ExampleLine> lines;
+    while (std::getline(text, line)) {
+      if (!line.empty()) lines.push_back(quorrel::help::parseExampleLine(line));
+    }
+    const std::string html = quorrel::help::exampleHtml(quorrel::help::runExample(
+        "the worked example " + title, lines, examples.module, examples.words));
+    page.replace(at, end + close.size() - at, html);
+    at += html.size();
+  }
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
   std::map<std::string, std::string> args;
   for (int i = 1; i + 1 < argc; i += 2) args[argv[i]] = argv[i + 1];
-  for (const char* required : {"--module", "--descriptions", "--template", "--out"}) {
-    if (!args.count(required)) fail(std::string("missing ") + required);
-  }
   try {
-    const auto module = quorrel::hostsim::Module::open(args["--module"]);
+    // Paths as given, before the examples make a scratch folder the current one.
+    for (const char* path : {"--module", "--descriptions", "--template", "--out"}) {
+      if (!args.count(path)) fail(std::string("missing ") + path);
+      args[path] = std::filesystem::absolute(args[path]).string();
+    }
+    const quorrel::tool::ModuleLoader module(args["--module"]);
+    const quorrel::help::EditorWords words(module.get());
+    const Examples examples{module, words};
     const Descriptions descriptions = readDescriptions(args["--descriptions"]);
+    const quorrel::help::ScratchFolder scratch;
     const Generated actions =
-        render({'A', "a", quorrel::abi::kActionCommandBase, quorrel::abi::kActionCount}, *module,
+        render({'A', "a", quorrel::abi::kActionCommandBase, quorrel::abi::kActionCount}, examples,
                descriptions);
     const Generated expressions =
         render({'E', "e", quorrel::abi::kExpressionCommandBase, quorrel::abi::kExpressionCount},
-               *module, descriptions);
+               examples, descriptions);
     std::string page = readFile(args["--template"]);
+    runWorkedExamples(page, examples);
+    replace(page, "@@PICTURE_SETUP_DIALOG@@", quorrel::help::setupDialogPicture());
+    for (const auto& [name, html] : quorrel::help::drawPictures(module)) {
+      replace(page, "@@PICTURE_" + name + "@@", html);
+    }
     replace(page, "@@VERSION@@", args.count("--version") ? args["--version"] : "");
     replace(page, "@@TOC_ACTIONS@@", actions.toc);
     replace(page, "@@TOC_EXPRESSIONS@@", expressions.toc);
@@ -268,7 +306,8 @@ int main(int argc, char** argv) {
     out << page;
     if (!out) fail("cannot write " + args["--out"]);
   } catch (const std::exception& error) {
-    fail(error.what());
+    std::cerr << "helpgen: " << error.what() << "\n";
+    return 1;
   }
   return 0;
 }

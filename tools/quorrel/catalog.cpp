@@ -194,6 +194,8 @@ Prose readProse(std::string_view text) {
       prose.problems.push_back(where + "text before the first block");
     } else if (line.substr(0, 6) == "param:") {
       prose.problems.push_back(where + "parameters are described in host/table.inc");
+    } else if (line.starts_with("example: ")) {
+      block->example.emplace_back(line.substr(9));
     } else {
       addLine(*block, line);
     }

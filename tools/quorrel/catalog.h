@@ -59,6 +59,8 @@ bool parameterUnused(bool action, int32_t code, int param);
 
 // The help page's words on one action or expression.
 struct Description {
+  // The example's script lines; an E line ends in " → " and the result it prints.
+  std::vector<std::string> example;
   std::vector<std::string> params;  // what each parameter is, in order
   std::string prose;                // paragraphs joined by line breaks
   std::string bad;                  // what bad input does; may be empty
