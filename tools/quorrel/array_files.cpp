@@ -163,15 +163,31 @@ std::string formatNames() {
   return names;
 }
 
-std::optional<ArrayFormat> recogniseFormat(std::string_view start) {
+// JSON's first character, and for "[" what may follow it: a value, or "]". An INI
+// section such as [names] goes on with a letter.
+bool looksLikeJson(std::string_view text) {
+  const size_t first = text.find_first_not_of(" \t\r\n");
+  if (first == std::string_view::npos) return false;
+  if (text[first] == '{') return true;
+  if (text[first] != '[') return false;
+  const size_t next = text.find_first_not_of(" \t\r\n", first + 1);
+  if (next == std::string_view::npos) return true;
+  const std::string_view rest = text.substr(next);
+  return std::string_view("[{\"-0123456789]").find(rest[0]) != std::string_view::npos ||
+         rest.starts_with("true") || rest.starts_with("false") || rest.starts_with("null");
+}
+
+std::optional<ArrayFormat> recogniseFormat(std::string_view start,
+                                           std::optional<ArrayFormat> hint) {
   if (start.starts_with(kNativeFileMagic)) return ArrayFormat::Native;
   if (start.starts_with(kHostFileHeader)) return ArrayFormat::Host;
   if (start.find('\0') != std::string_view::npos) return std::nullopt;
-  const size_t first = start.find_first_not_of(" \t\r\n");
-  if (first != std::string_view::npos && start[first] == '{') return ArrayFormat::Json;
+  if (hint == ArrayFormat::Json) return ArrayFormat::Json;
   const std::string_view line = firstMeaningfulLine(start);
-  if (line.starts_with("[") && line.find(']') != std::string_view::npos) return ArrayFormat::Ini;
-  return ArrayFormat::Csv;
+  const bool section = line.starts_with("[") && line.find(']') != std::string_view::npos;
+  if (section && hint == ArrayFormat::Ini) return ArrayFormat::Ini;
+  if (looksLikeJson(start)) return ArrayFormat::Json;
+  return section ? ArrayFormat::Ini : ArrayFormat::Csv;
 }
 
 std::optional<ArrayFormat> formatOfExtension(std::string_view path) {

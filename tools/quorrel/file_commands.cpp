@@ -111,6 +111,7 @@ struct Input {
   std::string path;
   ArrayFormat format = ArrayFormat::Native;
   std::unique_ptr<TempFile> copy;
+  uintmax_t bytes = 0;  // as given, a byte-order mark included
 };
 
 constexpr std::string_view kUtf8ByteOrderMark = "\xEF\xBB\xBF";
@@ -122,29 +123,62 @@ void readPastByteOrderMark(Input& input) {
   copyFileFrom(input.path, kUtf8ByteOrderMark.size(), copy->path());
   input.copy = std::move(copy);
   input.path = input.copy->path();
-  std::cerr << "quorrel: note: " << input.name
-            << " begins with a UTF-8 byte-order mark, read past\n";
+  std::cerr << "quorrel: note: " << input.name << " begins with a UTF-8 byte-order mark, read past";
+  if (input.format == ArrayFormat::Csv) {
+    std::cerr << " (the extension's own loadFromCsv keeps it in the first cell, so that "
+                 "column's label would not be found)";
+  }
+  std::cerr << '\n';
+}
+
+// A cell that begins with a quote and is not the empty cell "" in the first lines:
+// RFC 4180 quoting, which the plain CSV reader keeps as text.
+bool hasQuotedCells(std::string_view start) {
+  for (size_t at = 0;; ++at) {
+    const std::string_view cell = start.substr(at, start.find_first_of(",\r\n", at) - at);
+    if (cell.starts_with('"') && cell != "\"\"") return true;
+    at += cell.size();
+    if (at >= start.size()) return false;
+  }
 }
 
 Input openInput(const std::string& operand, std::optional<ArrayFormat> from) {
   Input input{operand, operand, ArrayFormat::Native, nullptr};
-  if (operand == "-") {
-    input.name = "<stdin>";
-    input.copy = std::make_unique<TempFile>();
-    input.path = input.copy->path();
-    copyStandardInputTo(input.path);
+  std::string head;
+  std::ifstream stream;
+  const bool once = operand == "-" || isStreamFile(operand);
+  if (once) {
+    // Read once into a file the loaders can open by name, once its start is known as
+    // an array file (a device such as /dev/zero never ends).
+    if (operand == "-") input.name = "<stdin>";
+    if (operand != "-") stream.open(operand, std::ios::binary);
+    if (operand != "-" && !stream) {
+      throw FileError("cannot read " + operand + ": " + std::strerror(errno));
+    }
+    head = readStreamStart(operand == "-" ? std::cin : stream, kRecognitionBytes);
+  } else {
+    head = readFileStart(input.path, kRecognitionBytes);
   }
-  std::string_view start;
-  const std::string head = readFileStart(input.path, kRecognitionBytes);
-  start = head;
+  std::string_view start = head;
   const bool marked = start.starts_with(kUtf8ByteOrderMark);
   if (marked) start.remove_prefix(kUtf8ByteOrderMark.size());
-  const auto format = from ? from : recogniseFormat(start);
+  const auto format = from ? from : recogniseFormat(start, formatOfExtension(operand));
   if (!format) {
     throw FileError(input.name + " is not a native array, host array, CSV, INI or JSON file");
   }
   input.format = *format;
+  if (once) {
+    input.copy = std::make_unique<TempFile>();
+    input.path = input.copy->path();
+    copyStreamTo(operand == "-" ? std::cin : stream, head, input.path);
+  }
+  input.bytes = std::filesystem::file_size(input.path);
   if (marked && !formatInfo(input.format).binary) readPastByteOrderMark(input);
+  if (!from && input.format == ArrayFormat::Csv && hasQuotedCells(start)) {
+    std::cerr << "quorrel: note: " << input.name
+              << " has quoted cells, which plain CSV splits at every comma; --from csv-rfc4180 "
+                 "reads them whole\n";
+  }
   return input;
 }
 
@@ -484,8 +518,8 @@ int inspectCommand(const Module& module, const std::string& path, const InspectO
   auto instance = loadInput(module, input, {options.header, options.lenient});
   progress.stop();
   std::cout << "file        " << input.name << '\n';
-  std::cout << "format      " << formatInfo(input.format).description << " ("
-            << std::filesystem::file_size(input.path) << " bytes)\n";
+  std::cout << "format      " << formatInfo(input.format).description << " (" << input.bytes
+            << " bytes)\n";
   printArray(*instance, options.view, std::cout);
   std::cout.flush();
   instance.reset();
