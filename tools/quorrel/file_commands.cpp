@@ -182,49 +182,151 @@ Input openInput(const std::string& operand, std::optional<ArrayFormat> from) {
   return input;
 }
 
-// A native file made by the command, loaded by a fresh one-dimensional instance (the
-// load sets the dimensions the file holds).
-std::unique_ptr<Instance> loadBuilt(const Module& module, NativeFileBuilder& builder) {
-  const TempFile built;
-  if (!builder.save(built.path())) throw FileError("cannot write " + built.path());
+std::string problemText(const std::string& name, const TextProblem& problem) {
+  return name + ':' + std::to_string(problem.line) + ':' + std::to_string(problem.column) + ": " +
+         problem.what;
+}
+
+std::unique_ptr<Instance> loadedInstance(const Module& module, ArrayFormat format,
+                                         const std::string& path, const std::string& name) {
   SetupFields setup;
   setup.dims = 1;
   auto instance = std::make_unique<Instance>(module, setup);
-  fileAction(module, *instance, formatInfo(ArrayFormat::Native).loadAction, built.path(),
-             built.path());
+  fileAction(module, *instance, formatInfo(format).loadAction, path, name);
   return instance;
 }
 
-std::string problemText(const std::string& name, const TextProblem& problem) {
-  return name + ':' + std::to_string(problem.line) + ": " + problem.what;
+void setStringAt(Instance& instance, const std::string& value, int32_t index) {
+  static const int32_t kSetStringAt = codeOfName(true, "setStringAt").value();
+  instance.callAction(kSetStringAt, {text(value), Argument(index)});
 }
 
-// A broken text file is an error, or with --lenient a warning and what came before.
-void reportProblem(const std::string& name, const std::optional<TextProblem>& problem, bool lenient,
-                   const char* kept) {
-  if (!problem) return;
-  if (!lenient) throw FileError(problemText(name, *problem) + " (--lenient keeps " + kept + ")");
-  warn(problemText(name, *problem) + "; " + kept + " kept");
+// The first table row becomes the labels, and goes.
+void takeHeaderRow(Instance& instance) {
+  static const int32_t kSetLabel = codeOfName(true, "setLabel").value();
+  static const int32_t kDeleteAt = codeOfName(true, "deleteAt").value();
+  const int32_t columns = askNumber(instance, kBoundary, {Argument(1)});
+  const int32_t cells = std::min(columns, askNumber(instance, kSize));
+  for (int32_t c = 0; c < cells; ++c) {
+    const std::string label = askText(instance, kGetString, {Argument(c)}).value_or("");
+    if (!label.empty()) instance.callAction(kSetLabel, {text(label), Argument(c)});
+  }
+  for (int32_t c = cells - 1; c >= 0; --c) instance.callAction(kDeleteAt, {Argument(c)});
 }
 
-// The first table row becomes the labels: the array is rebuilt without it.
-std::unique_ptr<Instance> takeHeaderRow(const Module& module, Instance& instance) {
-  const Snapshot snapshot(instance);
-  const ByteBuffer bytes = readBytes(snapshot.file.path());
-  NativeHeader header;
-  NativeFileBuilder builder;
-  std::vector<std::optional<std::string>> labels;
-  walkNativeFile(bytes.view(), header, [&](const NativeHalf& value, const NativeHalf& key) {
-    if (labels.size() < static_cast<size_t>(std::max(header.columns(), 0))) {
-      labels.emplace_back(textOf(value));
+// RFC 4180 records written as the extension's own CSV, which loads fastest: each field
+// a cell, an empty one as "". A field that plain CSV cannot hold (a comma, a line
+// break, a zero byte, or the text "" itself) goes in empty and is set by its index
+// once loaded.
+class PlainCsvWriter : public Rfc4180Sink {
+ public:
+  struct Patch {
+    int64_t row;
+    int32_t column;
+    std::string text;
+  };
+
+  explicit PlainCsvWriter(const std::string& path)
+      : out_(path, std::ios::binary | std::ios::trunc) {}
+
+  void field(std::string_view cell) override {
+    if (column_ > 0) pending_ += ',';
+    if (cell.empty() || cell.find_first_of(std::string_view(",\r\n\0", 4)) != cell.npos ||
+        cell == "\"\"") {
+      if (!cell.empty()) patches_.push_back({row_, column_, std::string(cell)});
+      pending_ += "\"\"";
     } else {
-      builder.append(value, key);
+      pending_ += cell;
     }
-    return true;
-  });
-  builder.setShape(header.dimensions, header.boundaries);
-  builder.setLabels(labels);
-  return loadBuilt(module, builder);
+    ++column_;
+  }
+  void endRecord() override {
+    pending_ += "\r\n";
+    ++row_;
+    column_ = 0;
+    if (pending_.size() >= (size_t{1} << 20)) flush();
+    recordEnd_ = pending_.size();
+  }
+  // Writes what is left but an unfinished record.
+  const std::vector<Patch>& finish() {
+    pending_.resize(recordEnd_);
+    flush();
+    if (!out_.flush()) throw FileError("cannot write a temporary file");
+    return patches_;
+  }
+
+ private:
+  void flush() {
+    out_.write(pending_.data(), static_cast<std::streamsize>(pending_.size()));
+    pending_.clear();
+  }
+
+  std::ofstream out_;
+  std::string pending_;
+  size_t recordEnd_ = 0;
+  int64_t row_ = 0;
+  int32_t column_ = 0;
+  std::vector<Patch> patches_;
+};
+
+// The lines where --lenient kept a quote as a character, a few of them by number.
+void warnKeptQuotes(const std::string& name, const std::vector<size_t>& lines) {
+  if (lines.empty()) return;
+  constexpr size_t kNamed = 10;
+  std::string list;
+  for (size_t k = 0; k < std::min(lines.size(), kNamed); ++k) {
+    list += (k ? ", " : "") + std::to_string(lines[k]);
+  }
+  if (lines.size() > kNamed) list += " and " + std::to_string(lines.size() - kNamed) + " more";
+  warn(name + ": stray quotes kept as characters (RFC 4180 allows them only around a whole " +
+       "field), on " + (lines.size() == 1 ? "line " : "lines ") + list);
+}
+
+std::unique_ptr<Instance> loadRfc4180(const Module& module, const Input& input, bool lenient) {
+  const TempFile plain;
+  std::vector<PlainCsvWriter::Patch> patches;
+  {
+    const std::string bytes = readWholeFile(input.path);
+    PlainCsvWriter writer(plain.path());
+    const Rfc4180Outcome read = readRfc4180(bytes, writer, lenient);
+    patches = writer.finish();
+    if (read.problem) {
+      // Only an unclosed quote stops a lenient reading.
+      const std::string where = problemText(input.name, *read.problem);
+      if (!lenient) {
+        throw FileError(where + (read.problem->what == "a quoted field is not closed"
+                                     ? " (--lenient keeps the records before it)"
+                                     : " (--lenient keeps the quote as a character)"));
+      }
+      warn(where + "; the records before it kept");
+    }
+    warnKeptQuotes(input.name, read.keptQuoteLines);
+  }
+  auto instance = loadedInstance(module, ArrayFormat::Csv, plain.path(), input.name);
+  const int64_t columns = askNumber(*instance, kBoundary, {Argument(1)});
+  for (const auto& patch : patches) {
+    setStringAt(*instance, patch.text, static_cast<int32_t>(patch.row * columns + patch.column));
+  }
+  return instance;
+}
+
+std::unique_ptr<Instance> loadJson(const Module& module, const Input& input) {
+  const TempFile built;
+  {
+    NativeFileBuilder builder;
+    {
+      const std::string bytes = readWholeFile(input.path);
+      std::optional<TextProblem> problem;
+      try {
+        problem = buildFromJson(builder, bytes);
+      } catch (const JsonMistake& mistake) {
+        throw FileError(input.name + ": " + mistake.what());
+      }
+      if (problem) throw FileError(problemText(input.name, *problem));
+    }
+    if (!builder.save(built.path())) throw FileError("cannot write " + built.path());
+  }
+  return loadedInstance(module, ArrayFormat::Native, built.path(), built.path());
 }
 
 struct LoadOptions {
@@ -234,29 +336,18 @@ struct LoadOptions {
 
 std::unique_ptr<Instance> loadInput(const Module& module, const Input& input,
                                     const LoadOptions& options) {
-  if (input.format == ArrayFormat::CsvRfc4180 || input.format == ArrayFormat::Json) {
-    const std::string bytes = readWholeFile(input.path);
-    NativeFileBuilder builder;
-    if (input.format == ArrayFormat::CsvRfc4180) {
-      const Rfc4180Read read = readRfc4180(bytes);
-      reportProblem(input.name, read.problem, options.lenient, "the records before it");
-      buildFromRecords(builder, read.rows, options.header);
-    } else {
-      const JsonRead read = readJson(bytes);
-      if (read.problem) throw FileError(problemText(input.name, *read.problem));
-      try {
-        buildFromJson(builder, read.value);
-      } catch (const JsonMistake& mistake) {
-        throw FileError(input.name + ": " + mistake.what());
-      }
-    }
-    return loadBuilt(module, builder);
+  std::unique_ptr<Instance> instance;
+  if (input.format == ArrayFormat::CsvRfc4180) {
+    instance = loadRfc4180(module, input, options.lenient);
+  } else if (input.format == ArrayFormat::Json) {
+    instance = loadJson(module, input);
+  } else {
+    instance = loadedInstance(module, input.format, input.path, input.name);
   }
-  SetupFields setup;
-  setup.dims = 1;
-  auto instance = std::make_unique<Instance>(module, setup);
-  fileAction(module, *instance, formatInfo(input.format).loadAction, input.path, input.name);
-  if (options.header && input.format == ArrayFormat::Csv) return takeHeaderRow(module, *instance);
+  if (options.header &&
+      (input.format == ArrayFormat::Csv || input.format == ArrayFormat::CsvRfc4180)) {
+    takeHeaderRow(*instance);
+  }
   return instance;
 }
 
