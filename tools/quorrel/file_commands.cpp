@@ -226,13 +226,13 @@ class PlainCsvWriter : public Rfc4180Sink {
     std::string text;
   };
 
-  explicit PlainCsvWriter(const std::string& path)
-      : out_(path, std::ios::binary | std::ios::trunc) {}
+  // `zeros`: whether the text holds a zero byte, which would end the plain CSV there.
+  PlainCsvWriter(const std::string& path, bool zeros)
+      : out_(path, std::ios::binary | std::ios::trunc), zeros_(zeros) {}
 
-  void field(std::string_view cell) override {
+  void field(std::string_view cell, bool quoted) override {
     if (column_ > 0) pending_ += ',';
-    if (cell.empty() || cell.find_first_of(std::string_view(",\r\n\0", 4)) != cell.npos ||
-        cell == "\"\"") {
+    if (cell.empty() || ((quoted || zeros_) && !fitsPlainCsv(cell))) {
       if (!cell.empty()) patches_.push_back({row_, column_, std::string(cell)});
       pending_ += "\"\"";
     } else {
@@ -256,12 +256,20 @@ class PlainCsvWriter : public Rfc4180Sink {
   }
 
  private:
+  static bool fitsPlainCsv(std::string_view cell) {
+    for (const char c : cell) {
+      if (c == ',' || c == '\r' || c == '\n' || c == '\0') return false;
+    }
+    return cell != "\"\"";
+  }
+
   void flush() {
     out_.write(pending_.data(), static_cast<std::streamsize>(pending_.size()));
     pending_.clear();
   }
 
   std::ofstream out_;
+  bool zeros_;
   std::string pending_;
   size_t recordEnd_ = 0;
   int64_t row_ = 0;
@@ -286,9 +294,9 @@ std::unique_ptr<Instance> loadRfc4180(const Module& module, const Input& input, 
   const TempFile plain;
   std::vector<PlainCsvWriter::Patch> patches;
   {
-    const std::string bytes = readWholeFile(input.path);
-    PlainCsvWriter writer(plain.path());
-    const Rfc4180Outcome read = readRfc4180(bytes, writer, lenient);
+    const ByteBuffer bytes = readBytes(input.path);
+    PlainCsvWriter writer(plain.path(), std::memchr(bytes.data(), 0, bytes.size()) != nullptr);
+    const Rfc4180Outcome read = readRfc4180(bytes.view(), writer, lenient);
     patches = writer.finish();
     if (read.problem) {
       // Only an unclosed quote stops a lenient reading.
@@ -315,10 +323,10 @@ std::unique_ptr<Instance> loadJson(const Module& module, const Input& input) {
   {
     NativeFileBuilder builder;
     {
-      const std::string bytes = readWholeFile(input.path);
+      const ByteBuffer bytes = readBytes(input.path);
       std::optional<TextProblem> problem;
       try {
-        problem = buildFromJson(builder, bytes);
+        problem = buildFromJson(builder, bytes.view());
       } catch (const JsonMistake& mistake) {
         throw FileError(input.name + ": " + mistake.what());
       }

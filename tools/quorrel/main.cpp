@@ -97,12 +97,13 @@ clears the line, Ctrl-D ends. File warnings are on; --no-warn-files turns them o
        quorrel inspect [--rows N | --all] [--width N] [--keys]
                        [--from KIND] [--to KIND] [--header] [--lenient] FILE
 
-Recognises a native array, host array, CSV, INI or JSON file (or reads it as
---from says), loads it into a fresh instance and prints its format, dimensions,
-boundaries, labels and elements. FILE - reads standard input. A native file that
-ends inside an element, or has bytes after its last one, is named in a warning
-with the byte offset. A text file's UTF-8 byte-order mark is read past, with a
-note. Exits with status 1 when FILE cannot be read.
+Recognises a native array, host array, CSV, INI or JSON file by its content, the
+name's extension as a hint (or reads it as --from says), loads it into a fresh
+instance and prints its format, dimensions, boundaries, labels and elements.
+FILE - reads standard input; a pipe or a device reads like a file. A native file
+that ends inside an element, or has bytes after its last one, is named in a
+warning with the byte offset. A text file's UTF-8 byte-order mark is read past,
+with a note. Exits with status 1 when FILE cannot be read.
 
   --rows N      show at most N table rows or list elements (default 20 and 40)
   --all         show every row, column and element
@@ -113,7 +114,8 @@ note. Exits with status 1 when FILE cannot be read.
   --from KIND   read FILE as KIND (below) instead of recognising it
   --to KIND     show the array as it comes back from KIND, with convert's warnings
   --header      a CSV file's first row holds the column labels
-  --lenient     broken RFC 4180 CSV: a warning and the records before the fault
+  --lenient     RFC 4180 CSV: a stray quote is a character, with a warning;
+                an unclosed one keeps the records before it
 
 KIND is native, host, csv, ini, csv-rfc4180 or json, in any case.
 )"},
@@ -131,14 +133,17 @@ cannot be read or OUT cannot be written, 2 on misuse.
                native, host, csv, ini, csv-rfc4180 or json, in any case
                csv-rfc4180: cells quoted when they hold a comma, a quote or a
                line break, so that they read back whole; broken quoting in IN is
-               an error that names its line
+               an error that names its line and column
                json: dimensions, boundaries, labels, and each element as null
                (empty), a number, a string, {"base64": ...} (text that is not
                UTF-8) or {"file": ...} (bytes), with {"element": ..., "key": ...}
-               for a keyed one; it reads back exactly
+               for a keyed one; it reads back exactly. Read, an array of
+               records ([{"id": 1, "name": "a"}, ...]) is a table labelled by the
+               names, and a list of elements alone a 1-D array
   --header     write the column labels as a first CSV row; read a first row as
                the labels
-  --lenient    broken RFC 4180 CSV: a warning and the records before the fault
+  --lenient    RFC 4180 CSV: a stray quote is a character, with a warning; an
+               unclosed one keeps the records before it
   --force      allow OUT to be IN itself, and binary output to a terminal
   --           ends the options (for a file whose name starts with -)
 

@@ -6,7 +6,6 @@
 #include <filesystem>
 #include <fstream>
 #include <iostream>
-#include <iterator>
 #include <random>
 
 #ifdef _WIN32
@@ -64,19 +63,6 @@ bool isStreamFile(const std::string& path) {
   std::error_code error;
   const auto status = fs::status(path, error);
   return fs::exists(status) && !fs::is_directory(status) && !fs::is_regular_file(status);
-}
-
-std::string readWholeFile(const std::string& path) {
-  std::ifstream in = openRegular(path);
-  std::error_code error;
-  const auto size = fs::file_size(path, error);
-  std::string bytes(error ? 0 : static_cast<size_t>(size), '\0');
-  in.read(bytes.data(), static_cast<std::streamsize>(bytes.size()));
-  bytes.resize(static_cast<size_t>(in.gcount()));
-  // A file that grew meanwhile: the rest too.
-  if (in) bytes.append(std::istreambuf_iterator<char>(in), {});
-  if (in.bad()) throw FileError("cannot read " + path);
-  return bytes;
 }
 
 std::string readFileStart(const std::string& path, size_t count) {

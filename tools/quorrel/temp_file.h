@@ -24,9 +24,7 @@ class TempFile {
   std::string path_;
 };
 
-// Whole-file helpers shared by the file commands; they throw FileError with the reason.
-std::string readWholeFile(const std::string& path);
-
+// File helpers shared by the file commands; they throw FileError with the reason.
 // At most `count` bytes from the start of a regular file; throws FileError when it
 // cannot be read (a folder or a device too).
 std::string readFileStart(const std::string& path, size_t count);

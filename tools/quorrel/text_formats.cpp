@@ -80,7 +80,7 @@ class Rfc4180Reader {
     if (i_ < text_.size() && text_[i_] == '"') return quotedField();
     const size_t begin = i_;
     if (!plainRun()) return false;
-    sink_.field(text_.substr(begin, i_ - begin));
+    sink_.field(text_.substr(begin, i_ - begin), false);
     return true;
   }
 
@@ -121,7 +121,7 @@ class Rfc4180Reader {
       scratch_.append(text_.substr(after, i_ - after));
       break;
     }
-    sink_.field(scratch_);
+    sink_.field(scratch_, true);
     return true;
   }
 
@@ -169,7 +169,7 @@ class Rfc4180Reader {
 struct RowsSink : Rfc4180Sink {
   CsvRows rows;
   std::vector<std::string> row;
-  void field(std::string_view text) override { row.emplace_back(text); }
+  void field(std::string_view text, bool) override { row.emplace_back(text); }
   void endRecord() override { rows.push_back(std::exchange(row, {})); }
 };
 

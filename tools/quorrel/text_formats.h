@@ -33,8 +33,9 @@ struct Rfc4180Outcome {
 class Rfc4180Sink {
  public:
   virtual ~Rfc4180Sink() = default;
-  // `text` lasts until the next call.
-  virtual void field(std::string_view text) = 0;
+  // `text` lasts until the next call. Only a `quoted` field holds a comma or a line
+  // break.
+  virtual void field(std::string_view text, bool quoted) = 0;
   virtual void endRecord() = 0;
 };
 
