@@ -396,6 +396,12 @@ NativeHalf cellOfJson(const JsonValue& v, size_t record, const std::string& name
   return {kStringType, static_cast<int32_t>(v.text.size() + 1), 0, v.text};
 }
 
+// Most records name their members in the same order: the m-th member's column is
+// then found without hashing its name.
+bool sameColumn(const std::vector<std::string>& names, size_t m, const std::string& name) {
+  return m < names.size() && names[m] == name;
+}
+
 // An array of flat records: a table with a column for each name, in the order they
 // first appear. The names are gathered in a first pass, the cells written in a second.
 std::optional<TextProblem> buildFromRecords(NativeFileBuilder& builder, std::string_view text) {
@@ -411,10 +417,13 @@ std::optional<TextProblem> buildFromRecords(NativeFileBuilder& builder, std::str
                           std::to_string(records + 1) + " is not one");
       }
       json.enter('{');
-      for (bool member = true; json.next(member, '}');) {
+      size_t m = 0;
+      for (bool firstMember = true; json.next(firstMember, '}'); ++m) {
         std::string name = json.name();
-        json.value();
-        if (columnOf.emplace(name, names.size()).second) names.push_back(std::move(name));
+        json.skip();
+        if (!sameColumn(names, m, name) && columnOf.emplace(name, names.size()).second) {
+          names.push_back(std::move(name));
+        }
       }
     }
     json.end();
@@ -427,9 +436,13 @@ std::optional<TextProblem> buildFromRecords(NativeFileBuilder& builder, std::str
   json.enter('[');
   records = 0;
   for (bool first = true; json.next(first, ']'); ++records) {
-    const JsonValue record = json.value();
+    JsonValue record = json.value();
     for (JsonValue& cell : row) cell = JsonValue{};
-    for (const JsonMember& member : record.members) row[columnOf[member.name]] = member.value;
+    for (size_t m = 0; m < record.members.size(); ++m) {
+      JsonMember& member = record.members[m];
+      const size_t column = sameColumn(names, m, member.name) ? m : columnOf[member.name];
+      row[column] = std::move(member.value);
+    }
     for (size_t c = 0; c < row.size(); ++c)
       builder.append(cellOfJson(row[c], records + 1, names[c]), {});
   }

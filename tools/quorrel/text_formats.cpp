@@ -372,6 +372,23 @@ std::string JsonReader::name() {
   return name;
 }
 
+void JsonReader::skip() {
+  if (peek() != '"') {
+    value();
+    return;
+  }
+  // A string's end, its escapes left for the reading that keeps it to check.
+  for (++pos_; pos_ < text_.size(); ++pos_) {
+    if (text_[pos_] == '\\') {
+      ++pos_;
+    } else if (text_[pos_] == '"') {
+      ++pos_;
+      return;
+    }
+  }
+  fail("a string is not closed");
+}
+
 void JsonReader::end() {
   if (peek() != '\0') fail("text after the document");
 }
@@ -397,11 +414,11 @@ JsonValue JsonReader::value(int depth) {
   } else if (c == '"') {
     v.kind = JsonValue::Kind::String;
     v.text = string();
-  } else if (word("true") || word("false")) {
+  } else if ((c == 't' && word("true")) || (c == 'f' && word("false"))) {
     v.kind = JsonValue::Kind::Boolean;
     v.boolean = c == 't';
     v.text = v.boolean ? "true" : "false";
-  } else if (!word("null")) {
+  } else if (c != 'n' || !word("null")) {
     number(v);
   }
   return v;
@@ -439,8 +456,9 @@ std::string JsonReader::string() {
   ++pos_;
   while (pos_ < text_.size() && !problem_) {
     // The plain run up to the next quote or backslash in one piece.
-    const size_t stop = text_.find_first_of("\"\\", pos_);
-    if (stop == std::string_view::npos) break;
+    size_t stop = pos_;
+    while (stop < text_.size() && text_[stop] != '"' && text_[stop] != '\\') ++stop;
+    if (stop == text_.size()) break;
     out.append(text_.substr(pos_, stop - pos_));
     pos_ = stop + 1;
     if (text_[stop] == '"') return out;

@@ -105,6 +105,8 @@ class JsonReader {
   // The first character of the next value, blanks skipped; 0 at the end.
   char peek();
   JsonValue value() { return value(0); }
+  // Steps over the next value, building nothing of a string.
+  void skip();
   // Steps into the array ('[') or object ('{') that comes next.
   bool enter(char open);
   // Inside an array or object: whether another item follows, taking the comma before
