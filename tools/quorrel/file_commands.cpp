@@ -220,10 +220,11 @@ void takeHeaderRow(Instance& instance) {
 // once loaded.
 class PlainCsvWriter : public Rfc4180Sink {
  public:
-  struct Patch {
-    int64_t row;
-    int32_t column;
-    std::string text;
+  // The cells to set once loaded, and their texts one after another, each ended by a
+  // zero byte (where the action's text would end anyway).
+  struct Patches {
+    std::vector<std::pair<int64_t, int32_t>> cells;  // row, column
+    std::string texts;
   };
 
   // `zeros`: whether the text holds a zero byte, which would end the plain CSV there.
@@ -233,7 +234,10 @@ class PlainCsvWriter : public Rfc4180Sink {
   void field(std::string_view cell, bool quoted) override {
     if (column_ > 0) pending_ += ',';
     if (cell.empty() || ((quoted || zeros_) && !fitsPlainCsv(cell))) {
-      if (!cell.empty()) patches_.push_back({row_, column_, std::string(cell)});
+      if (!cell.empty()) {
+        patches_.cells.emplace_back(row_, column_);
+        patches_.texts.append(cell.substr(0, cell.find('\0'))) += '\0';
+      }
       pending_ += "\"\"";
     } else {
       pending_ += cell;
@@ -248,11 +252,11 @@ class PlainCsvWriter : public Rfc4180Sink {
     recordEnd_ = pending_.size();
   }
   // Writes what is left but an unfinished record.
-  const std::vector<Patch>& finish() {
+  Patches finish() {
     pending_.resize(recordEnd_);
     flush();
     if (!out_.flush()) throw FileError("cannot write a temporary file");
-    return patches_;
+    return std::move(patches_);
   }
 
  private:
@@ -274,7 +278,7 @@ class PlainCsvWriter : public Rfc4180Sink {
   size_t recordEnd_ = 0;
   int64_t row_ = 0;
   int32_t column_ = 0;
-  std::vector<Patch> patches_;
+  Patches patches_;
 };
 
 // The lines where --lenient kept a quote as a character, a few of them by number.
@@ -292,7 +296,7 @@ void warnKeptQuotes(const std::string& name, const std::vector<size_t>& lines) {
 
 std::unique_ptr<Instance> loadRfc4180(const Module& module, const Input& input, bool lenient) {
   const TempFile plain;
-  std::vector<PlainCsvWriter::Patch> patches;
+  PlainCsvWriter::Patches patches;
   {
     const ByteBuffer bytes = readBytes(input.path);
     PlainCsvWriter writer(plain.path(), std::memchr(bytes.data(), 0, bytes.size()) != nullptr);
@@ -312,8 +316,11 @@ std::unique_ptr<Instance> loadRfc4180(const Module& module, const Input& input, 
   }
   auto instance = loadedInstance(module, ArrayFormat::Csv, plain.path(), input.name);
   const int64_t columns = askNumber(*instance, kBoundary, {Argument(1)});
-  for (const auto& patch : patches) {
-    setStringAt(*instance, patch.text, static_cast<int32_t>(patch.row * columns + patch.column));
+  const char* text = patches.texts.c_str();
+  for (const auto& [row, column] : patches.cells) {
+    const std::string_view cell(text);
+    setStringAt(*instance, std::string(cell), static_cast<int32_t>(row * columns + column));
+    text += cell.size() + 1;
   }
   return instance;
 }
