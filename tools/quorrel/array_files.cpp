@@ -171,7 +171,8 @@ std::optional<ArrayFormat> recogniseFormat(std::string_view start,
   if (start.starts_with(kNativeFileMagic)) return ArrayFormat::Native;
   if (start.starts_with(kHostFileHeader)) return ArrayFormat::Host;
   if (start.find('\0') != std::string_view::npos) return std::nullopt;
-  if (hint == ArrayFormat::Json) return ArrayFormat::Json;
+  // Any text is CSV, and a .json name asks for JSON whatever follows.
+  if (hint == ArrayFormat::Json || hint == ArrayFormat::Csv) return hint;
   const std::string_view line = firstMeaningfulLine(start);
   const bool section = line.starts_with("[") && line.find(']') != std::string_view::npos;
   if (section && hint == ArrayFormat::Ini) return ArrayFormat::Ini;

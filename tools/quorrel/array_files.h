@@ -44,8 +44,8 @@ std::string formatNames();
 // By magic or header, else by content with the name's format as a hint. JSON begins
 // with "{", or "[" and a value; an INI file's first line that is not blank or a
 // comment (//, ; or #) is a [section]; any other text is CSV. A name ending in .json
-// makes any text JSON, and one in .ini makes a [section] INI even where it could
-// begin JSON. Bytes with a zero byte and no known header are none of them. `start`
+// or .csv makes any text that format, and one in .ini makes a [section] INI even
+// where it could begin JSON. Bytes with a zero byte and no known header are none of them. `start`
 // may be the beginning of a longer file.
 std::optional<ArrayFormat> recogniseFormat(std::string_view start,
                                            std::optional<ArrayFormat> hint = std::nullopt);

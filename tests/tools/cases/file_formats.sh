@@ -61,3 +61,5 @@ q convert rec.txt - --to csv-rfc4180
 printf 'place,lat\r\nhome,37\xc2\xb036'"'"'37.8"N\r\n"a ""b""",1\r\n' >geo.csv
 q inspect geo.csv --from csv-rfc4180 --header
 q inspect geo.csv --from csv-rfc4180 --header --lenient
+cp list.txt list.csv
+q inspect list.csv --rows 0
