@@ -68,25 +68,51 @@ x)",
   }
 }
 
-TEST(Rfc4180, NamesTheLineOfTheFirstBrokenRecordAndKeepsTheRecordsBefore) {
+TEST(Rfc4180, NamesTheLineAndColumnOfTheFirstBrokenRecordAndKeepsTheRecordsBefore) {
   const struct {
     std::string_view text;
-    size_t line;
+    size_t line, column;
     const char* what;
     CsvRows before;
   } cases[] = {
       // The quote opens on line 1 and is never closed.
-      {"a,\"unterminated\nb,2\n", 1, "a quoted field is not closed", {}},
+      {"a,\"unterminated\nb,2\n", 1, 3, "a quoted field is not closed", {}},
       // A quoted line break counts: the text after the quote is on line 3.
-      {"h\n\"x\ny\"z,1\n", 3, "text after a closing quote", {{"h"}}},
-      {"ok\r\nok\r\na\"b\r\n", 3, "a quote inside an unquoted field", {{"ok"}, {"ok"}}},
+      {"h\n\"x\ny\"z,1\n", 3, 3, "text after a closing quote", {{"h"}}},
+      {"ok\r\nok\r\na\"b\r\n", 3, 2, "a quote inside an unquoted field", {{"ok"}, {"ok"}}},
   };
   for (const auto& c : cases) {
     const Rfc4180Read read = readRfc4180(c.text);
     ASSERT_TRUE(read.problem) << c.text;
     EXPECT_EQ(read.problem->line, c.line) << c.text;
+    EXPECT_EQ(read.problem->column, c.column) << c.text;
     EXPECT_EQ(read.problem->what, c.what) << c.text;
     EXPECT_EQ(read.rows, c.before) << c.text;
+  }
+}
+
+TEST(Rfc4180, LenientKeepsStrayQuotesAsCharactersAndNamesTheirLines) {
+  const struct {
+    std::string_view text;
+    CsvRows rows;
+    std::vector<size_t> lines;
+  } cases[] = {
+      {"37\xc2\xb0"
+       "36'37.8\"N,1\r\nx,\"a\"b,c\r\n\"ok\"\r\n",
+       {{"37\xc2\xb0"
+         "36'37.8\"N",
+         "1"},
+        {"x", "a\"b", "c"},
+        {"ok"}},
+       {1, 2}},
+      // Doubled quotes stay two characters outside quotes; "q"""x is q, a quote, then "x.
+      {"a\"\"b,\"q\"\"\"x\n", {{"a\"\"b", "q\"\"x"}}, {1}},
+  };
+  for (const auto& c : cases) {
+    const Rfc4180Read read = readRfc4180(c.text, true);
+    EXPECT_FALSE(read.problem) << c.text;
+    EXPECT_EQ(read.rows, c.rows) << c.text;
+    EXPECT_EQ(read.keptQuoteLines, c.lines) << c.text;
   }
 }
 
@@ -121,7 +147,8 @@ TEST(Json, ReadsWhatItWritesAndNamesTheLineOfAMistake) {
   const JsonRead broken = readJson("{\n\"a\": [1,\n 2\n}");
   ASSERT_TRUE(broken.problem);
   EXPECT_EQ(broken.problem->line, 4u);
-  EXPECT_EQ(broken.problem->what, "a closing bracket is missing");
+  EXPECT_EQ(broken.problem->column, 1u);
+  EXPECT_EQ(broken.problem->what, "a comma or closing bracket is missing");
 }
 
 TEST(Base64, EncodesEveryLengthAndRefusesOtherText) {

@@ -14,8 +14,9 @@ check() {  # expected-status expected-stderr (a pattern) command...; stdout to $
   echo "quorrel $*${out:+ >$out}: status $got, stderr '$err'; expected $status, '$expected'"
   fail=1
 }
-check 1 "quorrel: cannot read /dev/null: it is not a regular file" inspect /dev/null
-check 1 "quorrel: cannot read /dev/zero: it is not a regular file" convert /dev/zero o.arr
+# A device is read as a pipe is: one without end stops at a start that is no array file.
+check 1 "quorrel: /dev/zero is not a native array, host array, CSV, INI or JSON file" \
+  convert /dev/zero o.arr
 # A file action that fails is named with the step that failed; the run goes on.
 printf 'A 8 "x"\nA 0 "/dev/null/x.arr"\nA 0 "/dev/full"\n' >t.qs
 check 0 't.qs:2: warning: saveToFile "/dev/null/x.arr": could not open it (Not a directory)

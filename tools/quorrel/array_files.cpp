@@ -2,10 +2,13 @@
 
 #include <climits>
 #include <cstring>
+#include <fstream>
+#include <unordered_map>
 
 #include "array/element_array.h"
 #include "ascii_case.h"
 #include "io/host_array_file.h"
+#include "temp_file.h"
 #include "text_formats.h"
 
 namespace quorrel::tool {
@@ -127,20 +130,6 @@ NativeHalf halfOfJson(const JsonValue& v, std::string& held) {
   return {kFileType, static_cast<int32_t>(held.size()), 0, held};
 }
 
-ElementValue operandOf(const NativeHalf& half, std::string& text) {
-  switch (static_cast<ElementType>(half.type)) {
-    case ElementType::None:
-      return {};
-    case ElementType::Value:
-      return ElementValue::ofValue(half.number);
-    case ElementType::String:
-      text = textOf(half);
-      return ElementValue::ofText(text.c_str());
-    default:
-      return ElementValue::ofBytes(half.bytes.data(), static_cast<int32_t>(half.bytes.size()));
-  }
-}
-
 }  // namespace
 
 const FormatInfo& formatInfo(ArrayFormat format) {
@@ -163,15 +152,32 @@ std::string formatNames() {
   return names;
 }
 
-std::optional<ArrayFormat> recogniseFormat(std::string_view start) {
+// JSON's first character, and for "[" what may follow it: a value, or "]". An INI
+// section such as [names] goes on with a letter.
+bool looksLikeJson(std::string_view text) {
+  const size_t first = text.find_first_not_of(" \t\r\n");
+  if (first == std::string_view::npos) return false;
+  if (text[first] == '{') return true;
+  if (text[first] != '[') return false;
+  const size_t next = text.find_first_not_of(" \t\r\n", first + 1);
+  if (next == std::string_view::npos) return true;
+  const std::string_view rest = text.substr(next);
+  return std::string_view("[{\"-0123456789]").find(rest[0]) != std::string_view::npos ||
+         rest.starts_with("true") || rest.starts_with("false") || rest.starts_with("null");
+}
+
+std::optional<ArrayFormat> recogniseFormat(std::string_view start,
+                                           std::optional<ArrayFormat> hint) {
   if (start.starts_with(kNativeFileMagic)) return ArrayFormat::Native;
   if (start.starts_with(kHostFileHeader)) return ArrayFormat::Host;
   if (start.find('\0') != std::string_view::npos) return std::nullopt;
-  const size_t first = start.find_first_not_of(" \t\r\n");
-  if (first != std::string_view::npos && start[first] == '{') return ArrayFormat::Json;
+  // Any text is CSV, and a .json name asks for JSON whatever follows.
+  if (hint == ArrayFormat::Json || hint == ArrayFormat::Csv) return hint;
   const std::string_view line = firstMeaningfulLine(start);
-  if (line.starts_with("[") && line.find(']') != std::string_view::npos) return ArrayFormat::Ini;
-  return ArrayFormat::Csv;
+  const bool section = line.starts_with("[") && line.find(']') != std::string_view::npos;
+  if (section && hint == ArrayFormat::Ini) return ArrayFormat::Ini;
+  if (looksLikeJson(start)) return ArrayFormat::Json;
+  return section ? ArrayFormat::Ini : ArrayFormat::Csv;
 }
 
 std::optional<ArrayFormat> formatOfExtension(std::string_view path) {
@@ -200,56 +206,102 @@ std::string textOf(const NativeHalf& half) {
   return std::string(textBytes(half));
 }
 
+// The records go to a scratch file as they come, so that a big array is never held:
+// save() writes the header, then copies them after it.
 struct NativeFileBuilder::Parts {
-  ElementArray array;
-  std::string valueText, keyText;
+  int32_t dimensions = 1;
+  std::vector<int32_t> boundaries;
+  std::vector<std::optional<std::string>> labels;
+  TempFile records;
+  std::ofstream out{records.path(), std::ios::binary | std::ios::trunc};
+  std::string pending;
+  int64_t count = 0;
+
+  void flush() {
+    out.write(pending.data(), static_cast<std::streamsize>(pending.size()));
+    pending.clear();
+  }
 };
+
+namespace {
+
+void putU16(std::string& out, uint16_t v) {
+  char le[2];
+  BufferedWriter::putLE16(le, v);
+  out.append(le, 2);
+}
+
+void putI32(std::string& out, int32_t v) {
+  char le[4];
+  BufferedWriter::putLE32(le, static_cast<uint32_t>(v));
+  out.append(le, 4);
+}
+
+// One half of a record as the core's writer lays it out: type, size, then the number
+// of a value, a text with its terminating zero, or a file's bytes.
+void putHalf(std::string& out, const NativeHalf& half) {
+  putU16(out, half.type);
+  if (half.type == kValueType) {
+    putI32(out, 4);
+    putI32(out, half.number);
+  } else if (half.type == kStringType) {
+    const std::string_view text = textBytes(half);
+    putI32(out, static_cast<int32_t>(text.size() + 1));
+    out.append(text);
+    out += '\0';
+  } else {
+    putI32(out, static_cast<int32_t>(half.bytes.size()));
+    out.append(half.bytes);
+  }
+}
+
+}  // namespace
 
 NativeFileBuilder::NativeFileBuilder() : parts_(std::make_unique<Parts>()) {}
 NativeFileBuilder::~NativeFileBuilder() = default;
 
 void NativeFileBuilder::setShape(int32_t dimensions, const std::vector<int32_t>& boundaries) {
-  ElementArray& array = parts_->array;
-  array.setDimensions(dimensions);
-  for (size_t d = 0; d < boundaries.size(); ++d) {
-    array.setBoundary(static_cast<int32_t>(d + 1), boundaries[d]);
-  }
+  parts_->dimensions = dimensions;
+  parts_->boundaries = boundaries;
 }
 
 void NativeFileBuilder::setLabels(const std::vector<std::optional<std::string>>& labels) {
-  // The list as it is, so that the file holds the same records.
-  parts_->array.labels = LabelList(labels.begin(), labels.end());
+  parts_->labels = labels;
 }
 
 void NativeFileBuilder::append(const NativeHalf& value, const NativeHalf& key) {
-  ElementArray& array = parts_->array;
-  const int32_t index = array.size();
-  array.insertElement(operandOf(value, parts_->valueText), index);
-  if (key.type != 0) array.setKey(operandOf(key, parts_->keyText), index);
+  putHalf(parts_->pending, value);
+  putHalf(parts_->pending, key);
+  ++parts_->count;
+  if (parts_->pending.size() >= (size_t{1} << 20)) parts_->flush();
 }
 
 bool NativeFileBuilder::save(const std::string& path) {
-  return saveNativeFile(parts_->array, path.c_str(), FileModeTruncate).ok();
+  Parts& p = *parts_;
+  p.flush();
+  if (!p.out.flush() || p.count > ElementArray::kMaxSize) return false;
+  p.out.close();
+  std::string head(kNativeFileMagic);
+  putU16(head, 1);
+  putI32(head, p.dimensions);
+  for (int32_t d = 0; d < p.dimensions; ++d) {
+    putI32(head, static_cast<size_t>(d) < p.boundaries.size() ? p.boundaries[d] : 0);
+  }
+  putI32(head, static_cast<int32_t>(p.labels.size()));
+  for (const auto& label : p.labels) {
+    putI32(head, label ? static_cast<int32_t>(label->size()) : 0);
+    if (label) head += *label;
+  }
+  putI32(head, static_cast<int32_t>(p.count));
+  std::ofstream file(path, std::ios::binary | std::ios::trunc);
+  file.write(head.data(), static_cast<std::streamsize>(head.size()));
+  std::ifstream records(p.records.path(), std::ios::binary);
+  file << records.rdbuf();
+  return static_cast<bool>(file.flush());
 }
 
 std::string_view textBytes(const NativeHalf& half) {
   return half.bytes.substr(0, half.bytes.find('\0'));
-}
-
-void buildFromRecords(NativeFileBuilder& builder, const CsvRows& rows, bool header) {
-  size_t columns = 0;
-  for (const auto& row : rows) columns = std::max(columns, row.size());
-  builder.setShape(2, {static_cast<int32_t>(columns), 0});
-  const size_t first = header && !rows.empty() ? 1 : 0;
-  if (first == 1) {
-    builder.setLabels(std::vector<std::optional<std::string>>(rows[0].begin(), rows[0].end()));
-  }
-  const std::string empty;
-  for (size_t r = first; r < rows.size(); ++r) {
-    for (size_t c = 0; c < columns; ++c) {
-      builder.append(stringHalf(c < rows[r].size() ? rows[r][c] : empty), {});
-    }
-  }
 }
 
 void appendJsonElement(std::string& out, const NativeHalf& value, const NativeHalf& key) {
@@ -278,40 +330,148 @@ void appendJsonEnd(std::string& out, bool anyElement) {
   out += anyElement ? "\n  ]\n}\n" : "]\n}\n";
 }
 
-void buildFromJson(NativeFileBuilder& builder, const JsonValue& document) {
-  const JsonValue* dims = document.find("dimensions");
-  const JsonValue* boundaries = document.find("boundaries");
-  const JsonValue* labels = document.find("labels");
-  const JsonValue* elements = document.find("elements");
-  if (!elements || elements->kind != JsonValue::Kind::Array) {
-    throw JsonMistake("the document needs an \"elements\" list");
-  }
+namespace {
+
+constexpr const char* kExpectedDocument =
+    "expected an array of records, a list of elements, or an object with an \"elements\" "
+    "list";
+
+// The array document: its lists read as they come, "elements" a piece at a time.
+void buildFromArrayDocument(NativeFileBuilder& builder, JsonReader& json) {
+  std::optional<int32_t> dimensions;
   std::vector<int32_t> shape;
-  if (boundaries) {
-    for (const JsonValue& b : boundaries->items) shape.push_back(jsonInt32(&b, "a boundary"));
-  }
-  builder.setShape(dims ? jsonInt32(dims, "\"dimensions\"") : 1, shape);
-  if (labels) {
-    std::vector<std::optional<std::string>> list;
-    for (const JsonValue& label : labels->items) {
-      if (label.kind == JsonValue::Kind::String) {
-        list.emplace_back(label.text);
+  bool elementsSeen = false;
+  std::string valueBytes, keyBytes;
+  json.enter('{');
+  for (bool first = true; json.next(first, '}');) {
+    const std::string name = json.name();
+    if (name != "elements") {
+      const JsonValue v = json.value();
+      if (name == "dimensions") dimensions = jsonInt32(&v, "\"dimensions\"");
+      if (name == "boundaries") {
+        for (const JsonValue& b : v.items) shape.push_back(jsonInt32(&b, "a boundary"));
+      }
+      if (name == "labels") {
+        std::vector<std::optional<std::string>> list;
+        for (const JsonValue& label : v.items) {
+          list.push_back(label.kind == JsonValue::Kind::String ? std::optional(label.text)
+                                                               : std::nullopt);
+        }
+        builder.setLabels(list);
+      }
+      continue;
+    }
+    elementsSeen = json.enter('[');
+    for (bool item = true; json.next(item, ']');) {
+      const JsonValue element = json.value();
+      const JsonValue* keyed = element.find("element");
+      const JsonValue* key = element.find("key");
+      if (keyed && key) {
+        builder.append(halfOfJson(*keyed, valueBytes), halfOfJson(*key, keyBytes));
       } else {
-        list.emplace_back();
+        builder.append(halfOfJson(element, valueBytes), {});
       }
     }
-    builder.setLabels(list);
   }
-  std::string valueBytes, keyBytes;
-  for (const JsonValue& element : elements->items) {
-    const JsonValue* keyed = element.find("element");
-    const JsonValue* key = element.find("key");
-    if (keyed && key) {
-      builder.append(halfOfJson(*keyed, valueBytes), halfOfJson(*key, keyBytes));
-    } else {
-      builder.append(halfOfJson(element, valueBytes), {});
+  if (json.problem()) return;
+  if (!elementsSeen) throw JsonMistake(kExpectedDocument);
+  if (dimensions && (*dimensions < 1 || *dimensions > ElementArray::kBoundaryCount)) {
+    throw JsonMistake("\"dimensions\" must be 1 to " +
+                      std::to_string(ElementArray::kBoundaryCount));
+  }
+  builder.setShape(dimensions.value_or(1), shape);
+}
+
+// A cell of a record: an integer as a value, null as an empty text, other numbers and
+// true and false as their text.
+NativeHalf cellOfJson(const JsonValue& v, size_t record, const std::string& name) {
+  if (v.kind == JsonValue::Kind::Array || v.kind == JsonValue::Kind::Object) {
+    throw JsonMistake("record " + std::to_string(record) + ": \"" + name +
+                      "\" holds a list or object; a record's values are numbers, strings, "
+                      "true, false or null");
+  }
+  if (v.kind == JsonValue::Kind::Number && v.integer && *v.integer >= INT32_MIN &&
+      *v.integer <= INT32_MAX) {
+    return {kValueType, 4, static_cast<int32_t>(*v.integer), {}};
+  }
+  return {kStringType, static_cast<int32_t>(v.text.size() + 1), 0, v.text};
+}
+
+// Most records name their members in the same order: the m-th member's column is
+// then found without hashing its name.
+bool sameColumn(const std::vector<std::string>& names, size_t m, const std::string& name) {
+  return m < names.size() && names[m] == name;
+}
+
+// An array of flat records: a table with a column for each name, in the order they
+// first appear. The names are gathered in a first pass, the cells written in a second.
+std::optional<TextProblem> buildFromRecords(NativeFileBuilder& builder, std::string_view text) {
+  std::vector<std::string> names;
+  std::unordered_map<std::string, size_t> columnOf;
+  size_t records = 0;
+  {
+    JsonReader json(text);
+    json.enter('[');
+    for (bool first = true; json.next(first, ']'); ++records) {
+      if (json.peek() != '{' && !json.problem()) {
+        throw JsonMistake("an array of records holds objects only; item " +
+                          std::to_string(records + 1) + " is not one");
+      }
+      json.enter('{');
+      size_t m = 0;
+      for (bool firstMember = true; json.next(firstMember, '}'); ++m) {
+        std::string name = json.name();
+        json.skip();
+        if (!sameColumn(names, m, name) && columnOf.emplace(name, names.size()).second) {
+          names.push_back(std::move(name));
+        }
+      }
     }
+    json.end();
+    if (json.problem()) return json.problem();
   }
+  builder.setShape(2, {static_cast<int32_t>(names.size()), 0});
+  builder.setLabels({names.begin(), names.end()});
+  JsonReader json(text);
+  std::vector<JsonValue> row(names.size());
+  json.enter('[');
+  records = 0;
+  for (bool first = true; json.next(first, ']'); ++records) {
+    JsonValue record = json.value();
+    for (JsonValue& cell : row) cell = JsonValue{};
+    for (size_t m = 0; m < record.members.size(); ++m) {
+      JsonMember& member = record.members[m];
+      const size_t column = sameColumn(names, m, member.name) ? m : columnOf[member.name];
+      row[column] = std::move(member.value);
+    }
+    for (size_t c = 0; c < row.size(); ++c)
+      builder.append(cellOfJson(row[c], records + 1, names[c]), {});
+  }
+  return json.problem();
+}
+
+}  // namespace
+
+std::optional<TextProblem> buildFromJson(NativeFileBuilder& builder, std::string_view text) {
+  JsonReader json(text);
+  const char first = json.peek();
+  if (first == '{') {
+    buildFromArrayDocument(builder, json);
+  } else if (first == '[' && JsonReader(text.substr(text.find('[') + 1)).peek() == '{') {
+    return buildFromRecords(builder, text);
+  } else if (first == '[') {
+    // A list of elements alone: a one-dimensional array.
+    std::string valueBytes;
+    json.enter('[');
+    for (bool item = true; json.next(item, ']');) {
+      builder.append(halfOfJson(json.value(), valueBytes), {});
+    }
+  } else if (!json.problem()) {
+    json.value();
+    if (!json.problem()) throw JsonMistake(kExpectedDocument);
+  }
+  json.end();
+  return json.problem();
 }
 
 }  // namespace quorrel::tool

@@ -15,6 +15,7 @@
 
 #include "array/element.h"
 #include "io/native_file.h"
+#include "text_formats.h"
 
 namespace quorrel::tool {
 
@@ -40,11 +41,14 @@ std::optional<ArrayFormat> formatOfName(std::string_view name);
 // "native, host, csv, ini, csv-rfc4180, json", for messages.
 std::string formatNames();
 
-// By magic or header, else by content: JSON begins with "{"; an INI file's first line
-// that is not blank or a comment (//, ; or #) is a [section]; any other text is CSV.
-// Bytes with a zero byte and no known header are none of them. `start` may be the
-// beginning of a longer file.
-std::optional<ArrayFormat> recogniseFormat(std::string_view start);
+// By magic or header, else by content with the name's format as a hint. JSON begins
+// with "{", or "[" and a value; an INI file's first line that is not blank or a
+// comment (//, ; or #) is a [section]; any other text is CSV. A name ending in .json
+// or .csv makes any text that format, and one in .ini makes a [section] INI even
+// where it could begin JSON. Bytes with a zero byte and no known header are none of them. `start`
+// may be the beginning of a longer file.
+std::optional<ArrayFormat> recogniseFormat(std::string_view start,
+                                           std::optional<ArrayFormat> hint = std::nullopt);
 
 // The format that a file name's extension asks for (.arr, .mmf, .csv, .ini, .json, any
 // case), or nothing.
@@ -93,23 +97,24 @@ class NativeFileBuilder {
   std::unique_ptr<Parts> parts_;
 };
 
-// The formats the command reads itself become a native file first.
-// RFC 4180 records as a table of string cells, short records padded; with `header`,
-// the first record gives the column labels.
-void buildFromRecords(NativeFileBuilder& builder, const std::vector<std::vector<std::string>>& rows,
-                      bool header);
-
-// JSON. An element (or key) is what says all of it: null for an empty element, a number
-// for a value, a string for a UTF-8 text; else {"base64": ...} for a text that is not
-// UTF-8 and {"file": ...} for file bytes, both base64. An element with a key is
-// {"element": ..., "key": ...}. The document holds "dimensions", "boundaries", "labels"
-// (null for a label record without text) and "elements".
-struct JsonValue;
-// A document that does not describe an array.
+// JSON, which the command reads itself, becomes a native file first. Three documents
+// map to an array:
+// - The array document, which `convert` writes and which keeps all of an array: it
+//   holds "dimensions", "boundaries", "labels" (null for a label record without text)
+//   and "elements". An element (or key) is what says all of it: null for an empty
+//   element, a number for a value, a string for a UTF-8 text; else {"base64": ...} for
+//   a text that is not UTF-8 and {"file": ...} for file bytes, both base64. An element
+//   with a key is {"element": ..., "key": ...}.
+// - An array of flat records, as most tools write them: a two-dimensional table with
+//   a column for each member name, in the order the names first appear, the names as
+//   column labels. A 32-bit integer is a value; a string, another number, true and
+//   false are texts as written; null and a missing member are empty texts.
+// - A list of elements alone, as in "elements": a one-dimensional array.
+// A document of another shape throws JsonMistake; broken JSON is returned as a problem.
 struct JsonMistake : std::runtime_error {
   using std::runtime_error::runtime_error;
 };
-void buildFromJson(NativeFileBuilder& builder, const JsonValue& document);
+std::optional<TextProblem> buildFromJson(NativeFileBuilder& builder, std::string_view text);
 // Written in three parts, so that a big array goes out in pieces.
 void appendJsonHeader(std::string& out, const NativeHeader& header);
 void appendJsonElement(std::string& out, const NativeHalf& value, const NativeHalf& key);

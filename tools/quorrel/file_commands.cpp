@@ -112,6 +112,7 @@ struct Input {
   std::string path;
   ArrayFormat format = ArrayFormat::Native;
   std::unique_ptr<TempFile> copy;
+  uintmax_t bytes = 0;  // as given, a byte-order mark included
 };
 
 constexpr std::string_view kUtf8ByteOrderMark = "\xEF\xBB\xBF";
@@ -123,75 +124,225 @@ void readPastByteOrderMark(Input& input) {
   copyFileFrom(input.path, kUtf8ByteOrderMark.size(), copy->path());
   input.copy = std::move(copy);
   input.path = input.copy->path();
-  std::cerr << "quorrel: note: " << input.name
-            << " begins with a UTF-8 byte-order mark, read past\n";
+  std::cerr << "quorrel: note: " << input.name << " begins with a UTF-8 byte-order mark, read past";
+  if (input.format == ArrayFormat::Csv) {
+    std::cerr << " (the extension's own loadFromCsv keeps it in the first cell, so that "
+                 "column's label would not be found)";
+  }
+  std::cerr << '\n';
+}
+
+// A cell that begins with a quote and is not the empty cell "" in the first lines:
+// RFC 4180 quoting, which the plain CSV reader keeps as text.
+bool hasQuotedCells(std::string_view start) {
+  for (size_t at = 0;; ++at) {
+    const std::string_view cell = start.substr(at, start.find_first_of(",\r\n", at) - at);
+    if (cell.starts_with('"') && cell != "\"\"") return true;
+    at += cell.size();
+    if (at >= start.size()) return false;
+  }
 }
 
 Input openInput(const std::string& operand, std::optional<ArrayFormat> from) {
   Input input{operand, operand, ArrayFormat::Native, nullptr};
-  if (operand == "-") {
-    input.name = "<stdin>";
-    input.copy = std::make_unique<TempFile>();
-    input.path = input.copy->path();
-    copyStandardInputTo(input.path);
+  std::string head;
+  std::ifstream stream;
+  const bool once = operand == "-" || isStreamFile(operand);
+  if (once) {
+    // Read once into a file the loaders can open by name, once its start is known as
+    // an array file (a device such as /dev/zero never ends).
+    if (operand == "-") input.name = "<stdin>";
+    if (operand != "-") stream.open(operand, std::ios::binary);
+    if (operand != "-" && !stream) {
+      throw FileError("cannot read " + operand + ": " + std::strerror(errno));
+    }
+    head = readStreamStart(operand == "-" ? std::cin : stream, kRecognitionBytes);
+  } else {
+    head = readFileStart(input.path, kRecognitionBytes);
   }
-  std::string_view start;
-  const std::string head = readFileStart(input.path, kRecognitionBytes);
-  start = head;
+  std::string_view start = head;
   const bool marked = start.starts_with(kUtf8ByteOrderMark);
   if (marked) start.remove_prefix(kUtf8ByteOrderMark.size());
-  const auto format = from ? from : recogniseFormat(start);
+  const auto format = from ? from : recogniseFormat(start, formatOfExtension(operand));
   if (!format) {
     throw FileError(input.name + " is not a native array, host array, CSV, INI or JSON file");
   }
   input.format = *format;
+  if (once) {
+    input.copy = std::make_unique<TempFile>();
+    input.path = input.copy->path();
+    copyStreamTo(operand == "-" ? std::cin : stream, head, input.path);
+  }
+  input.bytes = std::filesystem::file_size(input.path);
   if (marked && !formatInfo(input.format).binary) readPastByteOrderMark(input);
+  if (!from && input.format == ArrayFormat::Csv && hasQuotedCells(start)) {
+    std::cerr << "quorrel: note: " << input.name
+              << " has quoted cells, which plain CSV splits at every comma; --from csv-rfc4180 "
+                 "reads them whole\n";
+  }
   return input;
 }
 
-// A native file made by the command, loaded by a fresh one-dimensional instance (the
-// load sets the dimensions the file holds).
-std::unique_ptr<Instance> loadBuilt(const Module& module, NativeFileBuilder& builder) {
-  const TempFile built;
-  if (!builder.save(built.path())) throw FileError("cannot write " + built.path());
+std::string problemText(const std::string& name, const TextProblem& problem) {
+  return name + ':' + std::to_string(problem.line) + ':' + std::to_string(problem.column) + ": " +
+         problem.what;
+}
+
+std::unique_ptr<Instance> loadedInstance(const Module& module, ArrayFormat format,
+                                         const std::string& path, const std::string& name) {
   SetupFields setup;
   setup.dims = 1;
   auto instance = std::make_unique<Instance>(module, setup);
-  fileAction(module, *instance, formatInfo(ArrayFormat::Native).loadAction, built.path(),
-             built.path());
+  fileAction(module, *instance, formatInfo(format).loadAction, path, name);
   return instance;
 }
 
-std::string problemText(const std::string& name, const TextProblem& problem) {
-  return name + ':' + std::to_string(problem.line) + ": " + problem.what;
+void setStringAt(Instance& instance, const std::string& value, int32_t index) {
+  static const int32_t kSetStringAt = codeOfName(true, "setStringAt").value();
+  instance.callAction(kSetStringAt, {text(value), Argument(index)});
 }
 
-// A broken text file is an error, or with --lenient a warning and what came before.
-void reportProblem(const std::string& name, const std::optional<TextProblem>& problem, bool lenient,
-                   const char* kept) {
-  if (!problem) return;
-  if (!lenient) throw FileError(problemText(name, *problem) + " (--lenient keeps " + kept + ")");
-  warn(problemText(name, *problem) + "; " + kept + " kept");
+// The first table row becomes the labels, and goes.
+void takeHeaderRow(Instance& instance) {
+  static const int32_t kSetLabel = codeOfName(true, "setLabel").value();
+  static const int32_t kDeleteAt = codeOfName(true, "deleteAt").value();
+  const int32_t columns = askNumber(instance, kBoundary, {Argument(1)});
+  const int32_t cells = std::min(columns, askNumber(instance, kSize));
+  for (int32_t c = 0; c < cells; ++c) {
+    const std::string label = askText(instance, kGetString, {Argument(c)}).value_or("");
+    if (!label.empty()) instance.callAction(kSetLabel, {text(label), Argument(c)});
+  }
+  for (int32_t c = cells - 1; c >= 0; --c) instance.callAction(kDeleteAt, {Argument(c)});
 }
 
-// The first table row becomes the labels: the array is rebuilt without it.
-std::unique_ptr<Instance> takeHeaderRow(const Module& module, Instance& instance) {
-  const Snapshot snapshot(instance);
-  const ByteBuffer bytes = readBytes(snapshot.file.path());
-  NativeHeader header;
-  NativeFileBuilder builder;
-  std::vector<std::optional<std::string>> labels;
-  walkNativeFile(bytes.view(), header, [&](const NativeHalf& value, const NativeHalf& key) {
-    if (labels.size() < static_cast<size_t>(std::max(header.columns(), 0))) {
-      labels.emplace_back(textOf(value));
+// RFC 4180 records written as the extension's own CSV, which loads fastest: each field
+// a cell, an empty one as "". A field that plain CSV cannot hold (a comma, a line
+// break, a zero byte, or the text "" itself) goes in empty and is set by its index
+// once loaded.
+class PlainCsvWriter : public Rfc4180Sink {
+ public:
+  // The cells to set once loaded, and their texts one after another, each ended by a
+  // zero byte (where the action's text would end anyway).
+  struct Patches {
+    std::vector<std::pair<int64_t, int32_t>> cells;  // row, column
+    std::string texts;
+  };
+
+  // `zeros`: whether the text holds a zero byte, which would end the plain CSV there.
+  PlainCsvWriter(const std::string& path, bool zeros)
+      : out_(path, std::ios::binary | std::ios::trunc), zeros_(zeros) {}
+
+  void field(std::string_view cell, bool quoted) override {
+    if (column_ > 0) pending_ += ',';
+    if (cell.empty() || ((quoted || zeros_) && !fitsPlainCsv(cell))) {
+      if (!cell.empty()) {
+        patches_.cells.emplace_back(row_, column_);
+        patches_.texts.append(cell.substr(0, cell.find('\0'))) += '\0';
+      }
+      pending_ += "\"\"";
     } else {
-      builder.append(value, key);
+      pending_ += cell;
     }
-    return true;
-  });
-  builder.setShape(header.dimensions, header.boundaries);
-  builder.setLabels(labels);
-  return loadBuilt(module, builder);
+    ++column_;
+  }
+  void endRecord() override {
+    pending_ += "\r\n";
+    ++row_;
+    column_ = 0;
+    if (pending_.size() >= (size_t{1} << 20)) flush();
+    recordEnd_ = pending_.size();
+  }
+  // Writes what is left but an unfinished record.
+  Patches finish() {
+    pending_.resize(recordEnd_);
+    flush();
+    if (!out_.flush()) throw FileError("cannot write a temporary file");
+    return std::move(patches_);
+  }
+
+ private:
+  static bool fitsPlainCsv(std::string_view cell) {
+    for (const char c : cell) {
+      if (c == ',' || c == '\r' || c == '\n' || c == '\0') return false;
+    }
+    return cell != "\"\"";
+  }
+
+  void flush() {
+    out_.write(pending_.data(), static_cast<std::streamsize>(pending_.size()));
+    pending_.clear();
+  }
+
+  std::ofstream out_;
+  bool zeros_;
+  std::string pending_;
+  size_t recordEnd_ = 0;
+  int64_t row_ = 0;
+  int32_t column_ = 0;
+  Patches patches_;
+};
+
+// The lines where --lenient kept a quote as a character, a few of them by number.
+void warnKeptQuotes(const std::string& name, const std::vector<size_t>& lines) {
+  if (lines.empty()) return;
+  constexpr size_t kNamed = 10;
+  std::string list;
+  for (size_t k = 0; k < std::min(lines.size(), kNamed); ++k) {
+    list += (k ? ", " : "") + std::to_string(lines[k]);
+  }
+  if (lines.size() > kNamed) list += " and " + std::to_string(lines.size() - kNamed) + " more";
+  warn(name + ": stray quotes kept as characters (RFC 4180 allows them only around a whole " +
+       "field), on " + (lines.size() == 1 ? "line " : "lines ") + list);
+}
+
+std::unique_ptr<Instance> loadRfc4180(const Module& module, const Input& input, bool lenient) {
+  const TempFile plain;
+  PlainCsvWriter::Patches patches;
+  {
+    const ByteBuffer bytes = readBytes(input.path);
+    PlainCsvWriter writer(plain.path(), std::memchr(bytes.data(), 0, bytes.size()) != nullptr);
+    const Rfc4180Outcome read = readRfc4180(bytes.view(), writer, lenient);
+    patches = writer.finish();
+    if (read.problem) {
+      // Only an unclosed quote stops a lenient reading.
+      const std::string where = problemText(input.name, *read.problem);
+      if (!lenient) {
+        throw FileError(where + (read.problem->what == "a quoted field is not closed"
+                                     ? " (--lenient keeps the records before it)"
+                                     : " (--lenient keeps the quote as a character)"));
+      }
+      warn(where + "; the records before it kept");
+    }
+    warnKeptQuotes(input.name, read.keptQuoteLines);
+  }
+  auto instance = loadedInstance(module, ArrayFormat::Csv, plain.path(), input.name);
+  const int64_t columns = askNumber(*instance, kBoundary, {Argument(1)});
+  const char* text = patches.texts.c_str();
+  for (const auto& [row, column] : patches.cells) {
+    const std::string_view cell(text);
+    setStringAt(*instance, std::string(cell), static_cast<int32_t>(row * columns + column));
+    text += cell.size() + 1;
+  }
+  return instance;
+}
+
+std::unique_ptr<Instance> loadJson(const Module& module, const Input& input) {
+  const TempFile built;
+  {
+    NativeFileBuilder builder;
+    {
+      const ByteBuffer bytes = readBytes(input.path);
+      std::optional<TextProblem> problem;
+      try {
+        problem = buildFromJson(builder, bytes.view());
+      } catch (const JsonMistake& mistake) {
+        throw FileError(input.name + ": " + mistake.what());
+      }
+      if (problem) throw FileError(problemText(input.name, *problem));
+    }
+    if (!builder.save(built.path())) throw FileError("cannot write " + built.path());
+  }
+  return loadedInstance(module, ArrayFormat::Native, built.path(), built.path());
 }
 
 struct LoadOptions {
@@ -201,29 +352,18 @@ struct LoadOptions {
 
 std::unique_ptr<Instance> loadInput(const Module& module, const Input& input,
                                     const LoadOptions& options) {
-  if (input.format == ArrayFormat::CsvRfc4180 || input.format == ArrayFormat::Json) {
-    const std::string bytes = readWholeFile(input.path);
-    NativeFileBuilder builder;
-    if (input.format == ArrayFormat::CsvRfc4180) {
-      const Rfc4180Read read = readRfc4180(bytes);
-      reportProblem(input.name, read.problem, options.lenient, "the records before it");
-      buildFromRecords(builder, read.rows, options.header);
-    } else {
-      const JsonRead read = readJson(bytes);
-      if (read.problem) throw FileError(problemText(input.name, *read.problem));
-      try {
-        buildFromJson(builder, read.value);
-      } catch (const JsonMistake& mistake) {
-        throw FileError(input.name + ": " + mistake.what());
-      }
-    }
-    return loadBuilt(module, builder);
+  std::unique_ptr<Instance> instance;
+  if (input.format == ArrayFormat::CsvRfc4180) {
+    instance = loadRfc4180(module, input, options.lenient);
+  } else if (input.format == ArrayFormat::Json) {
+    instance = loadJson(module, input);
+  } else {
+    instance = loadedInstance(module, input.format, input.path, input.name);
   }
-  SetupFields setup;
-  setup.dims = 1;
-  auto instance = std::make_unique<Instance>(module, setup);
-  fileAction(module, *instance, formatInfo(input.format).loadAction, input.path, input.name);
-  if (options.header && input.format == ArrayFormat::Csv) return takeHeaderRow(module, *instance);
+  if (options.header &&
+      (input.format == ArrayFormat::Csv || input.format == ArrayFormat::CsvRfc4180)) {
+    takeHeaderRow(*instance);
+  }
   return instance;
 }
 
@@ -485,8 +625,8 @@ int inspectCommand(const Module& module, const std::string& path, const InspectO
   auto instance = loadInput(module, input, {options.header, options.lenient});
   progress.stop();
   std::cout << "file        " << input.name << '\n';
-  std::cout << "format      " << formatInfo(input.format).description << " ("
-            << std::filesystem::file_size(input.path) << " bytes)\n";
+  std::cout << "format      " << formatInfo(input.format).description << " (" << input.bytes
+            << " bytes)\n";
   printArray(*instance, options.view, std::cout);
   std::cout.flush();
   instance.reset();

@@ -61,13 +61,14 @@ status 1.
 Errors are reported and the session goes on; when the input is not a terminal, the
 exit status is then 2 (else 1 with --strict after a failed file action).
 )"},
-    {"inspect", R"(Recognises a native array, host array, CSV, INI or JSON file (or reads it as
---from says), loads it into a fresh instance and prints its format, dimensions,
-boundaries, labels and elements. FILE - reads standard input. A native file that
-ends inside an element, or has bytes after its last one, is named in a warning
-with the byte offset. A text file's UTF-8 byte-order mark is read past, with a
-note. Exits with status 1 when FILE cannot be read. KIND is native, host, csv, ini,
-csv-rfc4180 or json, in any case.
+    {"inspect", R"(Recognises a native array, host array, CSV, INI or JSON file by its content, the
+name's extension as a hint (or reads it as --from says), loads it into a fresh
+instance and prints its format, dimensions, boundaries, labels and elements.
+FILE - reads standard input; a pipe or a device reads like a file. A native file
+that ends inside an element, or has bytes after its last one, is named in a
+warning with the byte offset. A text file's UTF-8 byte-order mark is read past,
+with a note. Exits with status 1 when FILE cannot be read. KIND is native, host,
+csv, ini, csv-rfc4180 or json, in any case.
 )"},
     {"convert", R"(Loads IN (its format recognised as by inspect, or as --from says) and saves it as
 OUT in the format --to names, or else OUT's extension: .arr native, .mmf host,
@@ -77,10 +78,12 @@ cannot be read or OUT cannot be written, 2 on misuse.
 
 KIND is native, host, csv, ini, csv-rfc4180 or json, in any case. csv-rfc4180
 quotes cells when they hold a comma, a quote or a line break, so that they read
-back whole; broken quoting in IN is an error that names its line. json holds the
-dimensions, boundaries, labels, and each element as null (empty), a number, a
-string, {"base64": ...} (text that is not UTF-8) or {"file": ...} (bytes), with
-{"element": ..., "key": ...} for a keyed one; it reads back exactly.
+back whole; broken quoting in IN is an error that names its line and column. json
+holds the dimensions, boundaries, labels, and each element as null (empty), a
+number, a string, {"base64": ...} (text that is not UTF-8) or {"file": ...}
+(bytes), with {"element": ..., "key": ...} for a keyed one; it reads back exactly.
+Read, an array of records ([{"id": 1, "name": "a"}, ...]) is a table labelled by
+the names, and a list of elements alone a 1-D array.
 
 A warning on standard error names each kind of content the target format loses.
 A command that runs longer than 2 seconds shows its progress on standard error

@@ -1,8 +1,11 @@
 #include "script.h"
 
+#include <algorithm>
 #include <cctype>
 #include <charconv>
 #include <cstdlib>
+#include <iterator>
+#include <utility>
 
 #include "ascii_case.h"
 
@@ -155,18 +158,54 @@ TextForm textForm() {
   return gTextForm;
 }
 
+namespace {
+
+// East Asian Wide and Fullwidth characters, which a terminal draws two columns wide:
+// the blocks that hold nearly all of them.
+constexpr std::pair<uint32_t, uint32_t> kWideRanges[] = {
+    {0x1100, 0x115F},   {0x2E80, 0x303E},   {0x3041, 0x33FF},   {0x3400, 0x4DBF},
+    {0x4E00, 0x9FFF},   {0xA000, 0xA4CF},   {0xAC00, 0xD7A3},   {0xF900, 0xFAFF},
+    {0xFE30, 0xFE4F},   {0xFF00, 0xFF60},   {0xFFE0, 0xFFE6},   {0x1F300, 0x1F64F},
+    {0x1F900, 0x1F9FF}, {0x20000, 0x2FFFD}, {0x30000, 0x3FFFD},
+};
+
+// The columns of the character that starts at `at`, and its length in bytes.
+std::pair<size_t, size_t> characterAt(std::string_view printed, size_t at) {
+  const auto lead = static_cast<unsigned char>(printed[at]);
+  size_t length = 1;
+  while (at + length < printed.size() &&
+         isContinuation(static_cast<unsigned char>(printed[at + length]))) {
+    ++length;
+  }
+  if (lead < 0xE1) return {1, length};  // nothing below U+1000 is wide
+  uint32_t code = lead & (lead >= 0xF0 ? 0x07 : 0x0F);
+  for (size_t i = 1; i < length; ++i) code = code << 6 | (printed[at + i] & 0x3F);
+  const bool wide = std::any_of(std::begin(kWideRanges), std::end(kWideRanges),
+                                [&](const auto& r) { return code >= r.first && code <= r.second; });
+  return {wide ? 2 : 1, length};
+}
+
+}  // namespace
+
 size_t printedWidth(std::string_view printed) {
   size_t width = 0;
-  for (char c : printed) width += !isContinuation(static_cast<unsigned char>(c));
+  for (size_t at = 0; at < printed.size();) {
+    const auto [columns, length] = characterAt(printed, at);
+    width += columns;
+    at += length;
+  }
   return width;
 }
 
 std::string cutToWidth(std::string_view printed, size_t width) {
   if (width < kMinimumCutWidth || printedWidth(printed) <= width) return std::string(printed);
-  // Keep width - 3 characters: stop at the first byte of the one after them.
+  // Keep the characters that fit in width - 3 columns.
   size_t end = 0;
-  for (size_t kept = 0; end < printed.size(); ++end) {
-    if (!isContinuation(static_cast<unsigned char>(printed[end])) && kept++ == width - 3) break;
+  for (size_t used = 0; end < printed.size();) {
+    const auto [columns, length] = characterAt(printed, end);
+    if (used + columns > width - 3) break;
+    used += columns;
+    end += length;
   }
   return std::string(printed.substr(0, end)) + "...";
 }

@@ -59,9 +59,10 @@ TextForm textForm();
 // The printed form of a text result: "..." with non-printing bytes escaped.
 std::string quoteText(std::string_view bytes);
 
-// The characters of printed text: a UTF-8 sequence counts as one.
+// The terminal columns of printed text: a UTF-8 sequence counts as one, or two for an
+// East Asian wide or fullwidth character.
 size_t printedWidth(std::string_view printed);
-// Printed text cut to at most `width` characters, the last three "..." when cut;
+// Printed text cut to at most `width` columns, the last three "..." when cut;
 // a width of 0 never cuts, and the cut never splits a character.
 std::string cutToWidth(std::string_view printed, size_t width);
 // The narrowest width cutToWidth cuts at: room for a character and the "...".

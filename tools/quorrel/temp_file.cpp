@@ -6,10 +6,10 @@
 #include <filesystem>
 #include <fstream>
 #include <iostream>
-#include <iterator>
 #include <random>
 
 #include "commands.h"
+#include "io/file_handle.h"
 
 namespace quorrel::tool {
 namespace fs = std::filesystem;
@@ -53,17 +53,10 @@ std::ifstream openRegular(const std::string& path) {
 
 }  // namespace
 
-std::string readWholeFile(const std::string& path) {
-  std::ifstream in = openRegular(path);
+bool isStreamFile(const std::string& path) {
   std::error_code error;
-  const auto size = fs::file_size(path, error);
-  std::string bytes(error ? 0 : static_cast<size_t>(size), '\0');
-  in.read(bytes.data(), static_cast<std::streamsize>(bytes.size()));
-  bytes.resize(static_cast<size_t>(in.gcount()));
-  // A file that grew meanwhile: the rest too.
-  if (in) bytes.append(std::istreambuf_iterator<char>(in), {});
-  if (in.bad()) throw FileError("cannot read " + path);
-  return bytes;
+  const auto status = fs::status(path, error);
+  return fs::exists(status) && !fs::is_directory(status) && !fs::is_regular_file(status);
 }
 
 std::string readFileStart(const std::string& path, size_t count) {
@@ -75,20 +68,31 @@ std::string readFileStart(const std::string& path, size_t count) {
   return bytes;
 }
 
-// main() made the standard streams binary on every system.
-void copyStandardInputTo(const std::string& path) {
-  std::ofstream out(path, std::ios::binary | std::ios::trunc);
+std::string readStreamStart(std::istream& in, size_t count) {
+  std::string bytes(count, '\0');
+  in.read(bytes.data(), static_cast<std::streamsize>(count));
+  if (in.bad()) throw FileError("cannot read the input");
+  bytes.resize(static_cast<size_t>(in.gcount()));
+  return bytes;
+}
+
+void copyStreamTo(std::istream& in, std::string_view start, const std::string& to) {
+  std::ofstream out(to, std::ios::binary | std::ios::trunc);
+  out.write(start.data(), static_cast<std::streamsize>(start.size()));
   std::string chunk(size_t{1} << 20, '\0');
-  while (std::cin.read(chunk.data(), static_cast<std::streamsize>(chunk.size())) ||
-         std::cin.gcount() > 0) {
-    out.write(chunk.data(), std::cin.gcount());
+  size_t copied = start.size();
+  // No reader takes more than kMaxFileBytes: a device without end stops there.
+  while (copied <= kMaxFileBytes &&
+         (in.read(chunk.data(), static_cast<std::streamsize>(chunk.size())) || in.gcount() > 0)) {
+    out.write(chunk.data(), in.gcount());
+    copied += static_cast<size_t>(in.gcount());
   }
-  if (!out.flush()) throw FileError("cannot copy standard input to " + path);
+  if (in.bad() || !out.flush()) throw FileError("cannot copy the input to " + to);
 }
 
 void copyFileFrom(const std::string& from, size_t skip, const std::string& to) {
   std::ifstream in(from, std::ios::binary);
-  in.seekg(static_cast<std::streamoff>(skip));
+  if (skip > 0) in.seekg(static_cast<std::streamoff>(skip));  // a pipe cannot seek
   std::ofstream out(to, std::ios::binary | std::ios::trunc);
   std::string chunk(size_t{1} << 20, '\0');
   while (in.read(chunk.data(), static_cast<std::streamsize>(chunk.size())) || in.gcount() > 0) {

@@ -3,6 +3,8 @@
 // pass through one of these.
 #pragma once
 
+#include <cstdio>
+#include <istream>
 #include <string>
 #include <string_view>
 
@@ -22,16 +24,21 @@ class TempFile {
   std::string path_;
 };
 
-// Whole-file helpers shared by the file commands; they throw FileError with the reason.
-std::string readWholeFile(const std::string& path);
-
+// File helpers shared by the file commands; they throw FileError with the reason.
 // At most `count` bytes from the start of a regular file; throws FileError when it
 // cannot be read (a folder or a device too).
 std::string readFileStart(const std::string& path, size_t count);
 
-// Standard input or output as bytes, unchanged on every platform. A failed write to
-// standard output throws FileError.
-void copyStandardInputTo(const std::string& path);
+// Whether the path is neither a regular file nor a folder: a pipe or a device, which
+// reads once, from its start, and has no size.
+bool isStreamFile(const std::string& path);
+
+// At most `count` bytes from the start of a stream (standard input, a pipe, a
+// device), and the stream's copy into the file `to`: `start` (what was read of it) and
+// the rest. Standard input and output are bytes, unchanged on every platform; a
+// failed write to standard output throws FileError.
+std::string readStreamStart(std::istream& in, size_t count);
+void copyStreamTo(std::istream& in, std::string_view start, const std::string& to);
 // Copies the file `from`, less its first `skip` bytes, to `to`; throws FileError.
 void copyFileFrom(const std::string& from, size_t skip, const std::string& to);
 void writeStandardOutput(std::string_view bytes);

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <charconv>
 #include <cstring>
+#include <utility>
 
 namespace quorrel::tool {
 namespace {
@@ -39,67 +40,149 @@ size_t utf8Length(std::string_view text) {
 
 }  // namespace
 
-Rfc4180Read readRfc4180(std::string_view text) {
-  Rfc4180Read read;
-  std::vector<std::string> row;
-  std::string field;
-  size_t line = 1;
-  bool quoted = false;  // the current field was quoted, and its quote closed
-  const auto fail = [&](size_t at, const char* what) {
-    read.problem = TextProblem{at, what};
-    return std::move(read);
-  };
-  const auto endField = [&] {
-    row.push_back(std::move(field));
-    field.clear();
-    quoted = false;
-  };
-  size_t i = 0;
-  while (i < text.size()) {
-    const char c = text[i];
-    if (c == ',') {
-      endField();
-      ++i;
-    } else if (c == '\r' || c == '\n') {
-      i += c == '\r' && i + 1 < text.size() && text[i + 1] == '\n' ? 2 : 1;
-      endField();
-      read.rows.push_back(std::move(row));
-      row.clear();
-      ++line;
-    } else if (quoted) {
-      return fail(line, "text after a closing quote");
-    } else if (c != '"') {
-      field += c;
-      ++i;
-    } else if (!field.empty()) {
-      return fail(line, "a quote inside an unquoted field");
-    } else {
-      // A quoted field: up to the quote that is not doubled.
-      const size_t opened = line;
-      for (++i;; ++i) {
-        if (i == text.size()) return fail(opened, "a quoted field is not closed");
-        if (text[i] == '"' && i + 1 < text.size() && text[i + 1] == '"') {
-          field += '"';
-          ++i;
-        } else if (text[i] == '"') {
-          ++i;
-          break;
-        } else {
-          // A CR LF inside the field is one line break, as outside.
-          const bool lineEnd =
-              text[i] == '\n' || (text[i] == '\r' && (i + 1 == text.size() || text[i + 1] != '\n'));
-          line += lineEnd;
-          field += text[i];
-        }
+namespace {
+
+// The bytes that end an unquoted field's plain run: a separator, a line break, a quote.
+struct StopBytes {
+  bool stop[256] = {};
+  constexpr StopBytes() {
+    for (unsigned char c : std::string_view(",\r\n\"")) stop[c] = true;
+  }
+};
+constexpr StopBytes kFieldStops;
+
+class Rfc4180Reader {
+ public:
+  Rfc4180Reader(std::string_view text, Rfc4180Sink& sink, bool lenient)
+      : text_(text), sink_(sink), lenient_(lenient) {}
+
+  Rfc4180Outcome read() {
+    if (text_.empty()) return std::move(outcome_);
+    for (;;) {
+      if (!field()) return std::move(outcome_);
+      if (i_ == text_.size()) break;
+      if (text_[i_] == ',') {
+        ++i_;
+        continue;
       }
-      quoted = true;
+      i_ += text_[i_] == '\r' && i_ + 1 < text_.size() && text_[i_ + 1] == '\n' ? 2 : 1;
+      newLine();
+      sink_.endRecord();
+      if (i_ == text_.size()) return std::move(outcome_);  // a final line break adds none
+    }
+    sink_.endRecord();
+    return std::move(outcome_);
+  }
+
+ private:
+  // One field, up to the separator or line break after it.
+  bool field() {
+    if (i_ < text_.size() && text_[i_] == '"') return quotedField();
+    const size_t begin = i_;
+    if (!plainRun()) return false;
+    sink_.field(text_.substr(begin, i_ - begin), false);
+    return true;
+  }
+
+  // Unquoted text up to a separator or line break; a quote in it breaks the rules.
+  bool plainRun() {
+    skipPlain();
+    while (i_ < text_.size() && text_[i_] == '"') {
+      if (!keepQuote("a quote inside an unquoted field")) return false;
+      ++i_;
+      skipPlain();
+    }
+    return true;
+  }
+
+  bool quotedField() {
+    const size_t open = i_, openLine = line_, openLineStart = lineStart_;
+    scratch_.clear();
+    for (++i_;;) {
+      const size_t quote = text_.find('"', i_);
+      if (quote == std::string_view::npos) {
+        line_ = openLine, lineStart_ = openLineStart;
+        return fail(open, "a quoted field is not closed");
+      }
+      countLineBreaks(quote);
+      scratch_.append(text_.substr(i_, quote - i_));
+      i_ = quote + 1;
+      if (i_ < text_.size() && text_[i_] == '"') {
+        scratch_ += '"';
+        ++i_;
+        continue;
+      }
+      if (i_ == text_.size() || text_[i_] == ',' || text_[i_] == '\r' || text_[i_] == '\n') break;
+      // Text after the closing quote: kept, with the quote, up to the field's end.
+      if (!keepQuote("text after a closing quote")) return false;
+      const size_t after = i_;
+      if (!plainRun()) return false;
+      scratch_ += '"';
+      scratch_.append(text_.substr(after, i_ - after));
+      break;
+    }
+    sink_.field(scratch_, true);
+    return true;
+  }
+
+  void skipPlain() {
+    while (i_ < text_.size() && !kFieldStops.stop[static_cast<unsigned char>(text_[i_])]) ++i_;
+  }
+
+  // The line breaks of quoted text up to `end`: a CR LF is one, as outside.
+  void countLineBreaks(size_t end) {
+    for (size_t k = text_.find_first_of("\r\n", i_); k < end;
+         k = text_.find_first_of("\r\n", k + 1)) {
+      if (text_[k] == '\r' && k + 1 < text_.size() && text_[k + 1] == '\n') ++k;
+      ++line_;
+      lineStart_ = k + 1;
     }
   }
-  if (!text.empty() && text.back() != '\n' && text.back() != '\r') {
-    endField();
-    read.rows.push_back(std::move(row));
+
+  void newLine() {
+    ++line_;
+    lineStart_ = i_;
   }
-  return read;
+
+  // A quote where the rules allow none: kept as a character when lenient.
+  bool keepQuote(const char* what) {
+    if (!lenient_) return fail(i_, what);
+    auto& lines = outcome_.keptQuoteLines;
+    if (lines.empty() || lines.back() != line_) lines.push_back(line_);
+    return true;
+  }
+
+  bool fail(size_t at, const char* what) {
+    outcome_.problem = TextProblem{line_, at - lineStart_ + 1, what};
+    return false;
+  }
+
+  std::string_view text_;
+  Rfc4180Sink& sink_;
+  bool lenient_;
+  size_t i_ = 0, line_ = 1, lineStart_ = 0;
+  std::string scratch_;  // a quoted field without its quotes
+  Rfc4180Outcome outcome_;
+};
+
+// Keeps the records whole, an unfinished one left out.
+struct RowsSink : Rfc4180Sink {
+  CsvRows rows;
+  std::vector<std::string> row;
+  void field(std::string_view text, bool) override { row.emplace_back(text); }
+  void endRecord() override { rows.push_back(std::exchange(row, {})); }
+};
+
+}  // namespace
+
+Rfc4180Outcome readRfc4180(std::string_view text, Rfc4180Sink& sink, bool lenient) {
+  return Rfc4180Reader(text, sink, lenient).read();
+}
+
+Rfc4180Read readRfc4180(std::string_view text, bool lenient) {
+  RowsSink sink;
+  Rfc4180Outcome outcome = readRfc4180(text, sink, lenient);
+  return {std::move(sink.rows), std::move(outcome.problem), std::move(outcome.keptQuoteLines)};
 }
 
 void appendRfc4180Record(const std::vector<std::string>& fields, std::string& out) {
@@ -204,172 +287,199 @@ namespace {
 
 constexpr char kBase64[] = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/";
 
-// A recursive-descent reader; `problem` is set at the first mistake.
-class JsonReader {
- public:
-  explicit JsonReader(std::string_view text) : text_(text) {}
+void appendUtf8(uint32_t code, std::string& out) {
+  if (code < 0x80) {
+    out += static_cast<char>(code);
+  } else if (code < 0x800) {
+    out += static_cast<char>(0xC0 | code >> 6);
+    out += static_cast<char>(0x80 | (code & 0x3F));
+  } else if (code < 0x10000) {
+    out += static_cast<char>(0xE0 | code >> 12);
+    out += static_cast<char>(0x80 | (code >> 6 & 0x3F));
+    out += static_cast<char>(0x80 | (code & 0x3F));
+  } else {
+    out += static_cast<char>(0xF0 | code >> 18);
+    out += static_cast<char>(0x80 | (code >> 12 & 0x3F));
+    out += static_cast<char>(0x80 | (code >> 6 & 0x3F));
+    out += static_cast<char>(0x80 | (code & 0x3F));
+  }
+}
 
-  JsonRead read() {
-    JsonRead result;
-    result.value = value(0);
-    skipBlanks();
-    if (!problem_ && pos_ < text_.size()) fail("text after the document");
-    result.problem = std::move(problem_);
-    return result;
-  }
-
- private:
-  static constexpr int kMaxDepth = 64;
-
-  void fail(const char* what) {
-    if (problem_) return;
-    const size_t at = std::min(pos_, text_.size());
-    problem_ = TextProblem{
-        1 + static_cast<size_t>(std::count(text_.begin(), text_.begin() + at, '\n')), what};
-  }
-  void skipBlanks() {
-    while (pos_ < text_.size() &&
-           std::string_view(" \t\r\n").find(text_[pos_]) != std::string_view::npos) {
-      ++pos_;
-    }
-  }
-  bool take(char c) {
-    skipBlanks();
-    if (pos_ < text_.size() && text_[pos_] == c) return ++pos_, true;
-    return false;
-  }
-  bool word(std::string_view w) {
-    if (text_.substr(pos_, w.size()) != w) return false;
-    pos_ += w.size();
-    return true;
-  }
-
-  JsonValue value(int depth) {
-    JsonValue v;
-    skipBlanks();
-    if (problem_ || depth > kMaxDepth || pos_ >= text_.size()) {
-      fail(depth > kMaxDepth ? "nested too deeply" : "a value is missing");
-      return v;
-    }
-    const char c = text_[pos_];
-    if (c == '{') {
-      object(v, depth);
-    } else if (c == '[') {
-      array(v, depth);
-    } else if (c == '"') {
-      v.kind = JsonValue::Kind::String;
-      v.text = string();
-    } else if (word("true") || word("false")) {
-      v.kind = JsonValue::Kind::Boolean;
-      v.boolean = c == 't';
-    } else if (!word("null")) {
-      number(v);
-    }
-    return v;
-  }
-
-  void object(JsonValue& v, int depth) {
-    v.kind = JsonValue::Kind::Object;
-    ++pos_;
-    if (take('}')) return;
-    do {
-      skipBlanks();
-      if (pos_ >= text_.size() || text_[pos_] != '"') return fail("a member name is missing");
-      std::string name = string();
-      if (!take(':')) return fail("a colon is missing");
-      v.members.push_back({std::move(name), value(depth + 1)});
-    } while (!problem_ && take(','));
-    if (!take('}')) fail("a closing brace is missing");
-  }
-
-  void array(JsonValue& v, int depth) {
-    v.kind = JsonValue::Kind::Array;
-    ++pos_;
-    if (take(']')) return;
-    do {
-      v.items.push_back(value(depth + 1));
-    } while (!problem_ && take(','));
-    if (!take(']')) fail("a closing bracket is missing");
-  }
-
-  void number(JsonValue& v) {
-    const size_t start = pos_;
-    while (pos_ < text_.size() &&
-           std::string_view("+-0123456789.eE").find(text_[pos_]) != std::string_view::npos) {
-      ++pos_;
-    }
-    const std::string_view digits = text_.substr(start, pos_ - start);
-    if (digits.empty()) return fail("not a JSON value");
-    v.kind = JsonValue::Kind::Number;
-    int64_t n = 0;
-    const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), n);
-    if (error == std::errc{} && end == digits.data() + digits.size()) v.integer = n;
-  }
-
-  void appendUtf8(uint32_t code, std::string& out) {
-    if (code < 0x80) {
-      out += static_cast<char>(code);
-    } else if (code < 0x800) {
-      out += static_cast<char>(0xC0 | code >> 6);
-      out += static_cast<char>(0x80 | (code & 0x3F));
-    } else if (code < 0x10000) {
-      out += static_cast<char>(0xE0 | code >> 12);
-      out += static_cast<char>(0x80 | (code >> 6 & 0x3F));
-      out += static_cast<char>(0x80 | (code & 0x3F));
-    } else {
-      out += static_cast<char>(0xF0 | code >> 18);
-      out += static_cast<char>(0x80 | (code >> 12 & 0x3F));
-      out += static_cast<char>(0x80 | (code >> 6 & 0x3F));
-      out += static_cast<char>(0x80 | (code & 0x3F));
-    }
-  }
-
-  uint32_t hex4() {
-    uint32_t code = 0;
-    const auto [end, error] = std::from_chars(
-        text_.data() + pos_, text_.data() + std::min(pos_ + 4, text_.size()), code, 16);
-    if (error != std::errc{} || end != text_.data() + pos_ + 4) {
-      fail("a \\u escape needs four hex digits");
-      return 0;
-    }
-    pos_ += 4;
-    return code;
-  }
-
-  std::string string() {
-    std::string out;
-    for (++pos_; pos_ < text_.size() && !problem_;) {
-      const char c = text_[pos_++];
-      if (c == '"') return out;
-      if (c != '\\') {
-        out += c;
-        continue;
-      }
-      if (pos_ >= text_.size()) break;
-      const char e = text_[pos_++];
-      static constexpr std::string_view kFrom = "\"\\/bfnrt", kTo = "\"\\/\b\f\n\r\t";
-      if (const size_t k = kFrom.find(e); k != std::string_view::npos) {
-        out += kTo[k];
-      } else if (e == 'u') {
-        uint32_t code = hex4();
-        if (code >= 0xD800 && code < 0xDC00 && word("\\u")) {
-          code = 0x10000 + ((code - 0xD800) << 10) + (hex4() - 0xDC00);
-        }
-        appendUtf8(code, out);
-      } else {
-        fail("an unknown escape");
-      }
-    }
-    fail("a string is not closed");
-    return out;
-  }
-
-  std::string_view text_;
-  size_t pos_ = 0;
-  std::optional<TextProblem> problem_;
-};
+// The line and column (both from 1, the column in bytes) of an offset in a text.
+TextProblem problemAt(std::string_view text, size_t at, std::string what) {
+  const std::string_view before = text.substr(0, at);
+  const size_t lineStart = before.find_last_of('\n') + 1;  // 0 on the first line
+  return {1 + static_cast<size_t>(std::count(before.begin(), before.end(), '\n')),
+          at - lineStart + 1, std::move(what)};
+}
 
 }  // namespace
+
+char JsonReader::peek() {
+  skipBlanks();
+  return pos_ < text_.size() && !problem_ ? text_[pos_] : '\0';
+}
+
+void JsonReader::fail(const char* what) {
+  if (!problem_) problem_ = problemAt(text_, std::min(pos_, text_.size()), what);
+}
+
+void JsonReader::skipBlanks() {
+  while (pos_ < text_.size() && (text_[pos_] == ' ' || text_[pos_] == '\n' || text_[pos_] == '\r' ||
+                                 text_[pos_] == '\t')) {
+    ++pos_;
+  }
+}
+
+bool JsonReader::take(char c) {
+  skipBlanks();
+  if (pos_ < text_.size() && text_[pos_] == c) return ++pos_, true;
+  return false;
+}
+
+bool JsonReader::word(std::string_view w) {
+  if (text_.substr(pos_, w.size()) != w) return false;
+  pos_ += w.size();
+  return true;
+}
+
+bool JsonReader::enter(char open) {
+  if (problem_) return false;
+  if (take(open)) return true;
+  fail(open == '[' ? "an array is missing" : "an object is missing");
+  return false;
+}
+
+bool JsonReader::next(bool& first, char close) {
+  if (problem_) return false;
+  if (take(close)) return false;
+  if (!first && !take(',')) {
+    fail(close == ']' ? "a comma or closing bracket is missing"
+                      : "a comma or closing brace is missing");
+    return false;
+  }
+  first = false;
+  return true;
+}
+
+std::string JsonReader::name() {
+  if (peek() != '"') {
+    fail("a member name is missing");
+    return {};
+  }
+  std::string name = string();
+  if (!take(':')) fail("a colon is missing");
+  return name;
+}
+
+void JsonReader::skip() {
+  if (peek() != '"') {
+    value();
+    return;
+  }
+  // A string's end, its escapes left for the reading that keeps it to check.
+  for (++pos_; pos_ < text_.size(); ++pos_) {
+    if (text_[pos_] == '\\') {
+      ++pos_;
+    } else if (text_[pos_] == '"') {
+      ++pos_;
+      return;
+    }
+  }
+  fail("a string is not closed");
+}
+
+void JsonReader::end() {
+  if (peek() != '\0') fail("text after the document");
+}
+
+JsonValue JsonReader::value(int depth) {
+  JsonValue v;
+  const char c = peek();
+  if (problem_ || depth > kMaxDepth || c == '\0') {
+    fail(depth > kMaxDepth ? "nested too deeply" : "a value is missing");
+    return v;
+  }
+  if (c == '{') {
+    v.kind = JsonValue::Kind::Object;
+    enter('{');
+    for (bool first = true; next(first, '}');) {
+      std::string member = name();
+      v.members.push_back({std::move(member), value(depth + 1)});
+    }
+  } else if (c == '[') {
+    v.kind = JsonValue::Kind::Array;
+    enter('[');
+    for (bool first = true; next(first, ']');) v.items.push_back(value(depth + 1));
+  } else if (c == '"') {
+    v.kind = JsonValue::Kind::String;
+    v.text = string();
+  } else if ((c == 't' && word("true")) || (c == 'f' && word("false"))) {
+    v.kind = JsonValue::Kind::Boolean;
+    v.boolean = c == 't';
+    v.text = v.boolean ? "true" : "false";
+  } else if (c != 'n' || !word("null")) {
+    number(v);
+  }
+  return v;
+}
+
+void JsonReader::number(JsonValue& v) {
+  const size_t start = pos_;
+  while (pos_ < text_.size() &&
+         std::string_view("+-0123456789.eE").find(text_[pos_]) != std::string_view::npos) {
+    ++pos_;
+  }
+  const std::string_view digits = text_.substr(start, pos_ - start);
+  if (digits.empty()) return fail("not a JSON value");
+  v.kind = JsonValue::Kind::Number;
+  v.text = digits;
+  int64_t n = 0;
+  const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), n);
+  if (error == std::errc{} && end == digits.data() + digits.size()) v.integer = n;
+}
+
+uint32_t JsonReader::hex4() {
+  uint32_t code = 0;
+  const auto [end, error] = std::from_chars(
+      text_.data() + pos_, text_.data() + std::min(pos_ + 4, text_.size()), code, 16);
+  if (error != std::errc{} || end != text_.data() + pos_ + 4) {
+    fail("a \\u escape needs four hex digits");
+    return 0;
+  }
+  pos_ += 4;
+  return code;
+}
+
+std::string JsonReader::string() {
+  std::string out;
+  ++pos_;
+  while (pos_ < text_.size() && !problem_) {
+    // The plain run up to the next quote or backslash in one piece.
+    size_t stop = pos_;
+    while (stop < text_.size() && text_[stop] != '"' && text_[stop] != '\\') ++stop;
+    if (stop == text_.size()) break;
+    out.append(text_.substr(pos_, stop - pos_));
+    pos_ = stop + 1;
+    if (text_[stop] == '"') return out;
+    if (pos_ >= text_.size()) break;
+    const char e = text_[pos_++];
+    static constexpr std::string_view kFrom = "\"\\/bfnrt", kTo = "\"\\/\b\f\n\r\t";
+    if (const size_t k = kFrom.find(e); k != std::string_view::npos) {
+      out += kTo[k];
+    } else if (e == 'u') {
+      uint32_t code = hex4();
+      if (code >= 0xD800 && code < 0xDC00 && word("\\u")) {
+        code = 0x10000 + ((code - 0xD800) << 10) + (hex4() - 0xDC00);
+      }
+      appendUtf8(code, out);
+    } else {
+      fail("an unknown escape");
+    }
+  }
+  fail("a string is not closed");
+  return out;
+}
 
 std::string base64(std::string_view bytes) {
   std::string out;
@@ -414,7 +524,12 @@ const JsonValue* JsonValue::find(std::string_view name) const {
 }
 
 JsonRead readJson(std::string_view text) {
-  return JsonReader(text).read();
+  JsonReader reader(text);
+  JsonRead result;
+  result.value = reader.value();
+  reader.end();
+  result.problem = reader.problem();
+  return result;
 }
 
 }  // namespace quorrel::tool

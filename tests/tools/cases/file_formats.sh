@@ -48,3 +48,18 @@ q convert -- -x.csv x.json
 # A byte-order mark before a text file is read past, and said so.
 printf '\xef\xbb\xbfname,age\nbo,3\n' >bom.csv
 "$QUORREL" convert bom.csv - --to csv | od -An -c
+# JSON by content or name: a list is a 1-D array; records are a table labelled by their
+# names, 32-bit integers as values; other documents name what was expected, and a .json
+# name is never read as CSV.
+printf ' [1, "a", null]' >list.txt
+printf '[{"id": 1, "name": "a"},\n {"name": "b,c", "x": 2.5, "ok": true}, {"id": null}]' >rec.txt
+printf '{"a": 1}' >other.json
+printf 'a,b\n' >csv.json
+for f in list.txt rec.txt other.json csv.json; do q inspect $f; done
+q convert rec.txt - --to csv-rfc4180
+# A stray quote is named by line and column; --lenient keeps it as a character.
+printf 'place,lat\r\nhome,37\xc2\xb036'"'"'37.8"N\r\n"a ""b""",1\r\n' >geo.csv
+q inspect geo.csv --from csv-rfc4180 --header
+q inspect geo.csv --from csv-rfc4180 --header --lenient
+cp list.txt list.csv
+q inspect list.csv --rows 0

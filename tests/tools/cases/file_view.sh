@@ -32,3 +32,10 @@ for line in 'run make.qs' 'inspect list.arr' 'inspect part.arr' 'inspect wide.ar
 done
 printf 'ZUB\0' >junk.bin
 q inspect junk.bin
+# A pipe and /dev/null are inputs like any other; a byte-order mark counts in the size;
+# wide characters take two columns and the quoted cells of plain CSV bring a hint.
+mkfifo pipe && { printf 'a,b\n' >pipe & }
+q inspect pipe --rows 0
+q inspect /dev/null
+printf '\xef\xbb\xbfname,city\n日本語,東京都\nab,"x,y"\n' >wide.csv
+q inspect wide.csv --width 5
