@@ -44,16 +44,35 @@ constexpr int32_t kMaxDimensions = ElementArray::kBoundaryCount;
 
 // --- Writing -------------------------------------------------------------------------
 
-void writeHeader(BufferedWriter& out, int32_t dimensions, const int32_t* boundaries) {
+// Bytes gathered in memory, for a head written before its file is opened.
+struct StringOut {
+  std::string& bytes;
+  void text(std::string_view s) { bytes.append(s); }
+  void u16(uint16_t v) { BufferedWriter::putLE16(grow(2), v); }
+  void i32(int32_t v) { BufferedWriter::putLE32(grow(4), static_cast<uint32_t>(v)); }
+  char* grow(std::size_t count) {
+    bytes.resize(bytes.size() + count);
+    return bytes.data() + bytes.size() - count;
+  }
+};
+
+// Everything before the records: magic, version, dimensions and boundaries, the label
+// records (length 0 for a column without a label text) and the element count.
+template <class Out>
+void writeHead(Out& out, int32_t dimensions, const int32_t* boundaries, const LabelList* labels,
+               int32_t count) {
   out.text(kNativeFileMagic);
   out.u16(1);
   out.i32(dimensions);
   for (int32_t d = 0; d < std::min(dimensions, kMaxDimensions); ++d) out.i32(boundaries[d]);
-}
-
-void writeLabel(BufferedWriter& out, int32_t length, const char* text) {
-  out.i32(length);
-  if (length > 0 && text != nullptr) out.bytes(text, static_cast<std::size_t>(length));
+  out.i32(static_cast<int32_t>(labels ? labels->size() : 0));
+  if (labels) {
+    for (const auto& label : *labels) {
+      out.i32(label ? static_cast<int32_t>(label->size()) : 0);
+      if (label) out.text(*label);
+    }
+  }
+  out.i32(count);
 }
 
 // One half of an element record as written: a type code (any, for images that carry
@@ -104,6 +123,24 @@ Half halfOf(const Element* e) {
   if (e == nullptr) return {};
   const ElementValue v = e->view();
   return {static_cast<uint16_t>(v.type), v.size, v.number, v.bytes};
+}
+
+// A half that may hold fewer bytes than its size (a text without its terminating zero)
+// is completed with zeros.
+std::size_t dataLength(const NativeHalf& h) {
+  if (h.type == kTypeValue) return 4;
+  return h.size > 0 ? static_cast<std::size_t>(h.size) : 0;
+}
+
+char* putHalf(char* p, const NativeHalf& h) {
+  p = BufferedWriter::putLE16(p, h.type);
+  p = BufferedWriter::putLE32(p, static_cast<uint32_t>(h.size));
+  if (h.type == kTypeValue) return BufferedWriter::putLE32(p, static_cast<uint32_t>(h.number));
+  const std::size_t length = dataLength(h);
+  const std::size_t held = std::min(length, h.bytes.size());
+  if (held > 0) std::memcpy(p, h.bytes.data(), held);
+  std::memset(p + held, 0, length - held);
+  return p + length;
 }
 
 // --- Reading -------------------------------------------------------------------------
@@ -287,18 +324,24 @@ FileStatus saveNativeFile(const ElementArray& array, const char* path, FileMode 
   return saveWith(path, mode, [&](BufferedWriter& out) {
     int32_t boundaries[kMaxDimensions];
     for (int32_t d = 0; d < kMaxDimensions; ++d) boundaries[d] = array.boundary(d + 1);
-    writeHeader(out, array.dimensions(), boundaries);
-    // A column without a label text is written with length 0, like an empty label.
-    const std::size_t labelCount = array.labels ? array.labels->size() : 0;
-    out.i32(static_cast<int32_t>(labelCount));
-    for (std::size_t i = 0; i < labelCount; ++i) {
-      const auto& label = (*array.labels)[i];
-      writeLabel(out, label ? static_cast<int32_t>(label->size()) : 0,
-                 label ? label->data() : nullptr);
-    }
-    out.i32(array.size());
+    writeHead(out, array.dimensions(), boundaries, array.labels ? &*array.labels : nullptr,
+              array.size());
     for (const Element& e : array.slots()) writeRecord(out, halfOf(&e), halfOf(e.key()));
   });
+}
+
+std::string nativeFileHead(int32_t dimensions, const int32_t* boundaries, const LabelList& labels,
+                           int32_t count) {
+  std::string bytes;
+  StringOut out{bytes};
+  writeHead(out, dimensions, boundaries, &labels, count);
+  return bytes;
+}
+
+void appendNativeRecord(std::string& out, const NativeHalf& value, const NativeHalf& key) {
+  const std::size_t at = out.size();
+  out.resize(at + 12 + dataLength(value) + dataLength(key));
+  putHalf(putHalf(out.data() + at, value), key);
 }
 
 FileStatus loadNativeFile(ElementArray& array, const char* path, LoadMode mode) {

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstdint>
+#include <string>
 #include <string_view>
 
 #include "array/element_array.h"
@@ -42,5 +43,14 @@ class NativeFileVisitor {
 
 // Walks the file's bytes with the loader's own reader.
 FileExtent scanNativeFile(std::string_view file, NativeFileVisitor& visitor);
+
+// The layout saveNativeFile writes, in pieces, for a writer that holds no array (a big
+// document streamed into a native file): the bytes before the first record, and one
+// record appended to `out`. `boundaries` holds one per dimension. A half's `bytes` may
+// leave out a text's terminating zero: the record holds `size` bytes, completed with
+// zeros.
+std::string nativeFileHead(int32_t dimensions, const int32_t* boundaries, const LabelList& labels,
+                           int32_t count);
+void appendNativeRecord(std::string& out, const NativeHalf& value, const NativeHalf& key);
 
 }  // namespace quorrel

@@ -223,40 +223,6 @@ struct NativeFileBuilder::Parts {
   }
 };
 
-namespace {
-
-void putU16(std::string& out, uint16_t v) {
-  char le[2];
-  BufferedWriter::putLE16(le, v);
-  out.append(le, 2);
-}
-
-void putI32(std::string& out, int32_t v) {
-  char le[4];
-  BufferedWriter::putLE32(le, static_cast<uint32_t>(v));
-  out.append(le, 4);
-}
-
-// One half of a record as the core's writer lays it out: type, size, then the number
-// of a value, a text with its terminating zero, or a file's bytes.
-void putHalf(std::string& out, const NativeHalf& half) {
-  putU16(out, half.type);
-  if (half.type == kValueType) {
-    putI32(out, 4);
-    putI32(out, half.number);
-  } else if (half.type == kStringType) {
-    const std::string_view text = textBytes(half);
-    putI32(out, static_cast<int32_t>(text.size() + 1));
-    out.append(text);
-    out += '\0';
-  } else {
-    putI32(out, static_cast<int32_t>(half.bytes.size()));
-    out.append(half.bytes);
-  }
-}
-
-}  // namespace
-
 NativeFileBuilder::NativeFileBuilder() : parts_(std::make_unique<Parts>()) {}
 NativeFileBuilder::~NativeFileBuilder() = default;
 
@@ -270,8 +236,7 @@ void NativeFileBuilder::setLabels(const std::vector<std::optional<std::string>>&
 }
 
 void NativeFileBuilder::append(const NativeHalf& value, const NativeHalf& key) {
-  putHalf(parts_->pending, value);
-  putHalf(parts_->pending, key);
+  appendNativeRecord(parts_->pending, value, key);
   ++parts_->count;
   if (parts_->pending.size() >= (size_t{1} << 20)) parts_->flush();
 }
@@ -281,18 +246,11 @@ bool NativeFileBuilder::save(const std::string& path) {
   p.flush();
   if (!p.out.flush() || p.count > ElementArray::kMaxSize) return false;
   p.out.close();
-  std::string head(kNativeFileMagic);
-  putU16(head, 1);
-  putI32(head, p.dimensions);
-  for (int32_t d = 0; d < p.dimensions; ++d) {
-    putI32(head, static_cast<size_t>(d) < p.boundaries.size() ? p.boundaries[d] : 0);
-  }
-  putI32(head, static_cast<int32_t>(p.labels.size()));
-  for (const auto& label : p.labels) {
-    putI32(head, label ? static_cast<int32_t>(label->size()) : 0);
-    if (label) head += *label;
-  }
-  putI32(head, static_cast<int32_t>(p.count));
+  std::vector<int32_t> boundaries(static_cast<size_t>(std::max(p.dimensions, 0)), 0);
+  std::copy_n(p.boundaries.begin(), std::min(p.boundaries.size(), boundaries.size()),
+              boundaries.begin());
+  const std::string head =
+      nativeFileHead(p.dimensions, boundaries.data(), p.labels, static_cast<int32_t>(p.count));
   std::ofstream file(path, std::ios::binary | std::ios::trunc);
   file.write(head.data(), static_cast<std::streamsize>(head.size()));
   std::ifstream records(p.records.path(), std::ios::binary);
