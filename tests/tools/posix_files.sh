@@ -43,10 +43,12 @@ if command -v script >/dev/null; then
   # A long command notes its progress on a terminal (at once here, not after 2 s).
   err=$(script -qec "(sleep 1; cat t.qs) | QUORREL_PROGRESS_AFTER=0 $quorrel convert --from csv - p.arr" \
     /dev/null | tr -d '\r')
-  if [[ $err != *"quorrel: converting"*"s"* ]]; then
+  if [[ $err != *"quorrel: converting - ("*" bytes)... "*"s"* ]]; then
     echo "no progress note: $err"
     fail=1
   fi
+  err=$(script -qec "QUORREL_PROGRESS_AFTER=0 $quorrel inspect --from csv t.qs" /dev/null | tr -d '\r')
+  [[ $err == *"quorrel: inspecting t.qs ($(wc -c <t.qs) bytes)... 0s"* ]] || { echo "no size: $err"; fail=1; }
 fi
 if [[ $(id -u) != 0 ]]; then
   printf 'a,b\r\n' >locked.csv && chmod 000 locked.csv

@@ -68,6 +68,15 @@ class ProgressNote {
   }
   ProgressNote(const ProgressNote&) = delete;
   ProgressNote& operator=(const ProgressNote&) = delete;
+  // The input's size, once known, so that the note says how much there is to do.
+  void setSize(uintmax_t bytes) {
+    {
+      const std::lock_guard lock(mutex_);
+      bytes_ = bytes;
+      redraw_ = true;
+    }
+    wake_.notify_one();
+  }
 
  private:
   // Two seconds of quiet; QUORREL_PROGRESS_AFTER (whole seconds) lets a test see the note
@@ -80,18 +89,33 @@ class ProgressNote {
   void tick() {
     std::unique_lock lock(mutex_);
     const auto start = std::chrono::steady_clock::now();
-    if (wake_.wait_for(lock, quietTime(), [this] { return done_; })) return;
-    bool shown = false;
-    do {
+    // No quiet time shows the note at least once, however soon the command ends.
+    const auto quiet = quietTime();
+    if (quiet.count() > 0 && wake_.wait_for(lock, quiet, [this] { return done_; })) return;
+    // A size that came just before the end is still shown once.
+    for (;;) {
       const auto seconds =
           std::chrono::duration_cast<std::chrono::seconds>(std::chrono::steady_clock::now() - start)
               .count();
-      std::fprintf(stderr, "\rquorrel: %s... %llds", what_.c_str(),
+      std::fprintf(stderr, "\rquorrel: %s%s... %llds", what_.c_str(), sizeText().c_str(),
                    static_cast<long long>(seconds));
       std::fflush(stderr);
-      shown = true;
-    } while (!wake_.wait_for(lock, std::chrono::seconds(1), [this] { return done_; }));
-    if (shown) std::fprintf(stderr, "\r\033[K");
+      redraw_ = false;
+      wake_.wait_for(lock, std::chrono::seconds(1), [this] { return done_ || redraw_; });
+      if (done_ && !redraw_) break;
+    }
+    std::fprintf(stderr, "\r\033[K");
+  }
+
+  std::string sizeText() const {
+    if (bytes_ == 0) return "";
+    char text[32];
+    if (bytes_ < 1000000) {
+      std::snprintf(text, sizeof text, " (%ju bytes)", bytes_);
+    } else {
+      std::snprintf(text, sizeof text, " (%.1f MB)", static_cast<double>(bytes_) / 1e6);
+    }
+    return text;
   }
 
   std::string what_;
@@ -99,6 +123,8 @@ class ProgressNote {
   std::mutex mutex_;
   std::condition_variable wake_;
   bool done_ = false;
+  uintmax_t bytes_ = 0;
+  bool redraw_ = false;  // the size came: show it without waiting for the next second
 };
 
 // ---------------------------------------------------------------------------------
@@ -621,6 +647,7 @@ int inspectCommand(const Module& module, const std::string& path, const InspectO
   }
   Input input =
       openInput(converted ? converted->path() : path, converted ? options.to : options.from);
+  progress.setSize(input.bytes);
   if (converted) input.name = path + " as " + formatInfo(input.format).name;
   auto instance = loadInput(module, input, {options.header, options.lenient});
   progress.stop();
@@ -658,6 +685,7 @@ int convertCommand(const Module& module, const ConvertOptions& options) {
   const bool toStdout = out == "-";
   ProgressNote progress("converting " + options.in);
   const Input input = openInput(options.in, options.from);
+  progress.setSize(input.bytes);
   auto instance = loadInput(module, input, {options.header, options.lenient});
   const int32_t elements = askNumber(*instance, kSize);
 

@@ -86,8 +86,8 @@ Read, an array of records ([{"id": 1, "name": "a"}, ...]) is a table labelled by
 the names, and a list of elements alone a 1-D array.
 
 A warning on standard error names each kind of content the target format loses.
-A command that runs longer than 2 seconds shows its progress on standard error
-when that is a terminal.
+A command that runs longer than 2 seconds shows on standard error, when that is a
+terminal, the input's size and the seconds gone.
 )"},
     {"list", R"(Without an operand, lists every action (A) and expression (E): code, name,
 parameters with their types, and menu path. With a name in any case (setLabel,
