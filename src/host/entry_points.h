@@ -45,6 +45,12 @@ QUORREL_EXPORT int16_t QUORREL_CALL GetRunObjectDataSize(quorrel::abi::HostWord 
 
 // Not the host's: what the last file action did, for the quorrel command.
 QUORREL_EXPORT int32_t QUORREL_CALL QuorrelFileStatus(int32_t* error);
+#ifdef QUORREL_NOTES
+// Not the host's, and only where notes are built in: where the module's notes go (a
+// null listener stops them).
+QUORREL_EXPORT void QUORREL_CALL QuorrelListenNotes(quorrel::abi::NoteListenerFn listener,
+                                                    void* context);
+#endif
 
 // Information entries.
 QUORREL_EXPORT const quorrel::abi::InfoEntry* QUORREL_CALL GetConditionInfos(void* editorContext,
@@ -100,6 +106,9 @@ static_assert(kHasType<&ContinueRunObject, RunObjectFn>);
 static_assert(kHasType<&GetRunObjectInfos, GetRunObjectInfosFn>);
 static_assert(kHasType<&GetRunObjectDataSize, GetRunObjectDataSizeFn>);
 static_assert(kHasType<&QuorrelFileStatus, FileStatusFn>);
+#ifdef QUORREL_NOTES
+static_assert(kHasType<&QuorrelListenNotes, ListenNotesFn>);
+#endif
 static_assert(kHasType<&GetConditionInfos, GetInfoEntryFn>);
 static_assert(kHasType<&GetActionInfos, GetInfoEntryFn>);
 static_assert(kHasType<&GetExpressionInfos, GetInfoEntryFn>);

@@ -33,7 +33,12 @@ if(NOT WIN32 AND NOT APPLE)
   set(quorrel_version_script ${CMAKE_CURRENT_BINARY_DIR}/quorrel.map)
   set(quorrel_map_text "{\n  global:\n")
   # Plus the portable platform services, when cmake/ModuleResources.cmake lists them.
-  foreach(name IN LISTS QUORREL_ENTRY_POINT_NAMES QUORREL_PLATFORM_EXPORTS)
+  # And, in a build with notes, the listener the quorrel command registers.
+  set(quorrel_note_exports "")
+  if(QUORREL_NOTES)
+    set(quorrel_note_exports QuorrelListenNotes)
+  endif()
+  foreach(name IN LISTS QUORREL_ENTRY_POINT_NAMES QUORREL_PLATFORM_EXPORTS quorrel_note_exports)
     string(APPEND quorrel_map_text "    ${name};\n")
   endforeach()
   string(APPEND quorrel_map_text "  local:\n    *;\n};\n")

@@ -32,6 +32,7 @@ FileStatus saveToFile(Instance in, const char* path) {
   return saveNativeFile(in.array, path, FileModeTruncate);
 }
 FileStatus loadFromFile(Instance in, const char* path) {
+  rowsReplaced();
   return loadNativeFile(in.array, path, LoadReplace);
 }
 FileStatus appendElementsFromFile(Instance in, const char* path) {
@@ -41,6 +42,7 @@ FileStatus saveToHostArray(Instance in, const char* path) {
   return saveHostArrayFile(in.array, path, FileModeTruncate);
 }
 FileStatus loadFromHostArray(Instance in, const char* path) {
+  rowsReplaced();
   return loadHostArrayFile(in.array, path, LoadReplace);
 }
 FileStatus appendElementsFromHostArray(Instance in, const char* path) {
@@ -51,6 +53,7 @@ FileStatus saveToCsv(Instance in, const char* path) {
   return saveCsvFile(in.array, path, FileModeTruncate);
 }
 FileStatus loadFromCsv(Instance in, const char* path) {
+  rowsReplaced();
   return loadCsvFile(in.array, path, LoadReplace);
 }
 FileStatus appendElementsFromCsv(Instance in, const char* path) {
@@ -60,6 +63,7 @@ FileStatus saveToIni(Instance in, const char* path) {
   return saveIniFile(in.array, path, FileModeTruncate);
 }
 FileStatus loadFromIni(Instance in, const char* path) {
+  rowsReplaced();
   return loadIniFile(in.array, path, LoadReplace);
 }
 FileStatus appendElementsFromIni(Instance in, const char* path) {

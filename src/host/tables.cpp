@@ -30,14 +30,14 @@ struct Row {
 constexpr Row<abi::ActionRoutine> kActionRows[] = {
 #define ACTION(code, name, param1, param2, file, menuText, display, meaning1, meaning2) \
   {code, actionParamType(Param::param1), actionParamType(Param::param2),                \
-   &callAction<&act::name, Param::param1, Param::param2>},
+   &callAction<&act::name, Param::param1, Param::param2, code>},
 #include "host/table.inc"
 };
 
 constexpr Row<abi::ExpressionRoutine> kExpressionRows[] = {
 #define EXPRESSION(code, name, routine, param1, param2, menuText, meaning1, meaning2) \
   {code, expressionParamType(Param::param1), expressionParamType(Param::param2),      \
-   &callExpression<&expr::routine, Param::param1, Param::param2>},
+   &callExpression<&expr::routine, Param::param1, Param::param2, code>},
 #include "host/table.inc"
 };
 

@@ -9,6 +9,7 @@
 #include <string_view>
 #include <utility>
 
+#include "array/notes.h"
 #include "io/apply.h"
 #include "io/parsing.h"
 
@@ -138,6 +139,13 @@ void appendCells(ElementArray& target, std::shared_ptr<ByteBuffer> text, CsvShap
       });
 }
 
+// A spreadsheet's UTF-8 file may begin with a byte-order mark; the loader keeps it, so
+// the first cell (a label, often) no longer equals the text the author sees.
+void noteByteOrderMark(std::string_view text) {
+  if (!notesWanted() || !text.starts_with("\xEF\xBB\xBF")) return;
+  note(NoteKind::ByteOrderMark, {noteText(text.substr(0, text.find_first_of(",\r\n")))});
+}
+
 }  // namespace
 
 std::optional<ByteBuffer> readTextFile(const char* path, FileStatus& status) {
@@ -187,6 +195,7 @@ FileStatus loadCsvFile(ElementArray& array, const char* path, LoadMode mode) {
     std::optional<ByteBuffer> read = readTextFile(path, status);
     std::shared_ptr<ByteBuffer> text =
         read ? std::make_shared<ByteBuffer>(std::move(*read)) : std::make_shared<ByteBuffer>();
+    noteByteOrderMark(std::string_view(text->data(), text->size()));
     const CsvShape shape = shapeOf(text->data(), text->size());
     io_detail::loadAllOrNothing(array, mode == LoadReplace, [&](ElementArray& target) {
       target.setDimensions(2);
