@@ -41,7 +41,7 @@ Options:
 
 const std::map<std::string, const char*> kCommandHelp = {
     {"run", R"(Usage: quorrel run FILE
-       quorrel run [--echo] [--no-warn-files] [--strict] FILE
+       quorrel run [--echo] [--no-warn-files] [--strict] [--no-notes] [--notes-fail] FILE
 
 Runs a script: one command per line; blank lines and lines starting with # are
 ignored. FILE - reads the script from standard input. A UTF-8 byte-order mark at
@@ -81,9 +81,22 @@ status 1.
   --no-warn-files  no warnings about failed file actions (--warn-files, the
                    default, is still taken)
   --strict         exit with status 1 when a file action failed
+  --no-notes       no notes
+  --notes-fail     exit with status 3 when the module gave a note (unless an
+                   error or --strict sets another status)
+
+The module never reports a mistake to the host: a call on an index outside the
+array, an unknown label or a row that is not visible does nothing or answers 0
+or -1. The module the command loads says why, in a note on standard error:
+FILE:LINE: note: labSum: no column is labelled "scroe" (labels: name, score);
+column -1 was used [label-unknown]. A note given again (the same call with the
+same values) is printed once, and at the end once more with its count. A text
+expression with no text to give prints (no text), never a number.
+Arguments that do not fit are errors that name the call as written:
+setLabel "TEXT" NUMBER: argument 1 must be a quoted text; got name (add quotes).
 )"},
     {"shell", R"(Usage: quorrel shell
-       quorrel shell [--echo] [--no-warn-files] [--strict]
+       quorrel shell [--echo] [--no-warn-files] [--strict] [--no-notes] [--notes-fail]
 
 Reads script commands interactively, one per line, with line editing, history
 (~/.quorrel_history) and Tab completion of commands and names on a terminal.
@@ -92,6 +105,7 @@ exit status is then 2 (else 1 with --strict after a failed file action). Beside
 the script commands:
 help, help NAME|CODE, list, show (the current array), quit or exit. Ctrl-C
 clears the line, Ctrl-D ends. File warnings are on; --no-warn-files turns them off.
+The module's notes are printed as run prints them; --no-notes turns them off.
 )"},
     {"inspect", R"(Usage: quorrel inspect FILE
        quorrel inspect [--rows N | --all] [--width N] [--keys]
@@ -262,6 +276,9 @@ Options parseOptions(int argc, char** argv) {
       belongs("run");
     } else if (arg == "--no-warn-files") {
       options.noWarnFiles = true;
+      belongs("run");
+    } else if (arg == "--no-notes" || arg == "--notes-fail") {
+      (arg == "--no-notes" ? options.run.notes : options.run.notesFail) = arg == "--notes-fail";
       belongs("run");
     } else if (options.mistake.empty()) {
       options.mistake = "unknown option " + arg + " (-- ends the options, for a file named so)";
