@@ -171,15 +171,23 @@ namespace {
 abi::NoteListenerFn gListener = nullptr;
 void* gListenerContext = nullptr;
 
-void toListener(void*, NoteKind kind, const std::string& message) {
-  gListener(gListenerContext, noteId(kind), currentCallName(), message.c_str());
+void deliver(void*, NoteKind kind, const std::string& message) {
+  if (gListener) gListener(gListenerContext, noteId(kind), currentCallName(), message.c_str());
+  if (noteLogWanted()) writeNoteToLog(kind, message);
 }
+
+void updateSink() {
+  gNoteSink = gListener || noteLogWanted() ? NoteSink{&deliver, nullptr} : NoteSink{};
+}
+
+// The log, where there is one, hears every note from the moment the module is loaded.
+[[maybe_unused]] const bool kLogListens = (updateSink(), true);
 }  // namespace
 
 void listenToNotes(abi::NoteListenerFn listener, void* context) {
   gListener = listener;
   gListenerContext = context;
-  gNoteSink = listener ? NoteSink{&toListener, nullptr} : NoteSink{};
+  updateSink();
 }
 #endif
 

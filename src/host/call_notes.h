@@ -5,6 +5,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <string>
 
 #include "array/element_array.h"
 #include "array/notes.h"
@@ -15,6 +16,9 @@ namespace quorrel::host {
 
 // A note's receiver outside the module (QuorrelListenNotes).
 void listenToNotes(abi::NoteListenerFn listener, void* context);
+// The log (note_log.cpp): whether there is one, and a note for it.
+bool noteLogWanted();
+void writeNoteToLog(NoteKind kind, const std::string& message);
 
 // The call whose notes are being reported, for as long as it runs. An action also
 // notes the rows it added that are not selected.

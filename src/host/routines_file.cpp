@@ -80,9 +80,11 @@ FileStatus appendElementToFile(Instance in, int32_t index, const char* path) {
 
 // File contents become File elements.
 FileStatus setFileAt(Instance in, const char* path, int32_t index) {
+  noteNegativeIndex(in.array, index);
   return withFileContents(path, [&](ByteBlock block) { in.array.setFile(block, index); });
 }
 FileStatus insertFileAt(Instance in, const char* path, int32_t index) {
+  noteNegativeIndex(in.array, index);
   return withFileContents(path, [&](ByteBlock block) { in.array.insertFile(block, index); });
 }
 FileStatus appendFile(Instance in, const char* path) {

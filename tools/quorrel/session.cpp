@@ -264,7 +264,7 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
       }
       // A text expression that has no text answers the number 0; shown as that, it
       // would pass for the number or the text "0".
-      const bool noText = !result.isText && nameOf(false, code).ends_with("$(");
+      const bool noText = !result.isText && answersText(code);
       out << (noText          ? std::string(kNoText)
               : result.isText ? quoteText(result.text)
                               : std::to_string(result.number))
