@@ -21,6 +21,15 @@ foreach(line IN LISTS quorrel_def_lines)
     string(APPEND quorrel_def_text "  ${CMAKE_MATCH_1} @${CMAKE_MATCH_2}\n")
   endif()
 endforeach()
+# The checked DLL (QUORREL_NOTES) adds, after every ordinal of the list, the listener
+# through which quorrel.exe prints its notes.
+if(QUORREL_NOTES)
+  if(CMAKE_SIZEOF_VOID_P EQUAL 4)
+    string(APPEND quorrel_def_text "  QuorrelListenNotes@8 @201\n")
+  else()
+    string(APPEND quorrel_def_text "  QuorrelListenNotes @201\n")
+  endif()
+endif()
 set(quorrel_def ${CMAKE_BINARY_DIR}/quorrel.def)
 file(CONFIGURE OUTPUT ${quorrel_def} CONTENT "${quorrel_def_text}" @ONLY)
 
