@@ -54,10 +54,9 @@ std::string labelNames(const ElementArray& a) {
 }  // namespace
 
 void CallScope::begin(bool action, int32_t code, const void* runRecord, const ElementArray* array) {
-  if (!notesWanted()) return;
+  active_ = true;
   array_ = array;
-  rowsBefore_ = array ? array->rowStates.size() : 0;
-  gCall = {nameOfCall(action, code), runRecord, rowsBefore_};
+  gCall = {nameOfCall(action, code), runRecord, array ? array->rowStates.size() : 0};
 }
 
 void CallScope::end() {

@@ -25,10 +25,10 @@ void writeNoteToLog(NoteKind kind, const std::string& message);
 class CallScope {
  public:
   CallScope(bool action, int32_t code, const void* runRecord, const ElementArray* array) {
-    if constexpr (kNotesBuilt) begin(action, code, runRecord, array);
+    if (notesWanted()) begin(action, code, runRecord, array);
   }
   ~CallScope() {
-    if constexpr (kNotesBuilt) end();
+    if (active_) end();
   }
   CallScope(const CallScope&) = delete;
   CallScope& operator=(const CallScope&) = delete;
@@ -36,8 +36,8 @@ class CallScope {
  private:
   void begin(bool action, int32_t code, const void* runRecord, const ElementArray* array);
   void end();
+  bool active_ = false;
   const ElementArray* array_ = nullptr;
-  std::size_t rowsBefore_ = 0;
 };
 
 // An action that replaced the whole array: every row it leaves is a new one.
