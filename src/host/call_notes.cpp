@@ -51,24 +51,38 @@ std::string labelNames(const ElementArray& a) {
   return names;
 }
 
-}  // namespace
-
-void CallScope::begin(bool action, int32_t code, const void* runRecord, const ElementArray* array) {
-  active_ = true;
-  array_ = array;
-  gCall = {nameOfCall(action, code), runRecord, array ? array->rowStates.size() : 0};
+// The rows the call added, as new row states, that are not selected.
+void noteRowsAdded(const ElementArray& a) {
+  const std::vector<uint8_t>& states = a.rowStates;
+  const auto first =
+      states.begin() + static_cast<std::ptrdiff_t>(std::min(gCall.rowsBefore, states.size()));
+  const auto added = std::count_if(first, states.end(), [](uint8_t s) { return s != RowSelected; });
+  if (added > 0) {
+    note(NoteKind::RowsNotSelected, {noteNumber(added), noteNumber(numberOfRows(a)),
+                                     noteNumber(static_cast<int64_t>(states.size()))});
+  }
 }
 
-void CallScope::end() {
-  if (array_ != nullptr && notesWanted() && !array_->settings.autoSelectNewRows) {
-    const std::vector<uint8_t>& states = array_->rowStates;
-    const auto added = std::count_if(
-        states.begin() + static_cast<std::ptrdiff_t>(std::min(gCall.rowsBefore, states.size())),
-        states.end(), [](uint8_t s) { return s != RowSelected; });
-    if (added > 0) {
-      note(NoteKind::RowsNotSelected, {noteNumber(added), noteNumber(numberOfRows(*array_)),
-                                       noteNumber(static_cast<int64_t>(states.size()))});
+}  // namespace
+
+// A scope lives outside the routines' guards (an expression's, a destructor): a note
+// that cannot be made for want of memory is dropped rather than let out.
+void CallScope::begin(bool action, int32_t code, const void* runRecord,
+                      const ElementArray* array) noexcept {
+  try {
+    gCall = {nameOfCall(action, code), runRecord, array ? array->rowStates.size() : 0};
+    active_ = true;
+    array_ = array;
+  } catch (...) {
+  }
+}
+
+void CallScope::end() noexcept {
+  try {
+    if (array_ != nullptr && notesWanted() && !array_->settings.autoSelectNewRows) {
+      noteRowsAdded(*array_);
     }
+  } catch (...) {
   }
   gCall = {};
 }

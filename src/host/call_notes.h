@@ -34,8 +34,8 @@ class CallScope {
   CallScope& operator=(const CallScope&) = delete;
 
  private:
-  void begin(bool action, int32_t code, const void* runRecord, const ElementArray* array);
-  void end();
+  void begin(bool action, int32_t code, const void* runRecord, const ElementArray* array) noexcept;
+  void end() noexcept;
   bool active_ = false;
   const ElementArray* array_ = nullptr;
 };
