@@ -1,5 +1,6 @@
 # Notes: one row per kind of note, the script lines (joined by |) that make the
-# mistake; each row runs as its own script and its notes are printed.
+# mistake; each row runs as its own script and its notes are printed. (all.qs keeps
+# every row for tests/windows/run_wine_notes.sh.)
 printf '\xef\xbb\xbfname,score\r\nann,1\r\n' >bom.csv
 rows=('new dims=2 x=2|A setLabel "name" 0|E labSum("scroe")'
   'new dims=2 x=2 autoselect=1|A appendRowFromList "1,2"|E colMax( 5'
@@ -16,7 +17,7 @@ rows=('new dims=2 x=2|A setLabel "name" 0|E labSum("scroe")'
   'new dims=2 x=2 autoselect=1|A appendRowFromList "a,b,c"'
   'A setArrayDimension 12')
 for row in "${rows[@]}"; do
-  tr '|' '\n' <<<"$row" >n.qs
+  tr '|' '\n' <<<"$row" | tee -a all.qs >n.qs
   "$QUORREL" run --no-warn-files n.qs 2>&1
 done | tee notes.txt
 # Every kind of note the module has comes from some row above.
@@ -29,4 +30,4 @@ printf 'E get( 9\nE get( 9\nE get( 9\n' >r.qs
 "$QUORREL" run --notes-fail r.qs 2>/dev/null; echo "status $?"
 "$QUORREL" run --no-notes r.qs 2>&1 >/dev/null | wc -l
 for i in $(seq 25); do echo 'E get( -1'; done >loop.qs
-QUORREL_NOTES_LOG=notes.log "$QUORREL" run --no-notes loop.qs >/dev/null && cat notes.log
+QUORREL_NOTES_LOG=notes.log "$QUORREL" run --no-notes loop.qs >/dev/null && tr -d '\r' <notes.log
