@@ -41,7 +41,8 @@ Options:
 
 const std::map<std::string, const char*> kCommandHelp = {
     {"run", R"(Usage: quorrel run FILE
-       quorrel run [--echo] [--no-warn-files] [--strict] [--no-notes] [--notes-fail] FILE
+       quorrel run [--echo] [--no-warn-files] [--strict] [--no-notes]
+                   [--notes-fail] FILE
 
 Runs a script: one command per line; blank lines and lines starting with # are
 ignored. FILE - reads the script from standard input. A UTF-8 byte-order mark at
@@ -96,7 +97,8 @@ Arguments that do not fit are errors that name the call as written:
 setLabel "TEXT" NUMBER: argument 1 must be a quoted text; got name (add quotes).
 )"},
     {"shell", R"(Usage: quorrel shell
-       quorrel shell [--echo] [--no-warn-files] [--strict] [--no-notes] [--notes-fail]
+       quorrel shell [--echo] [--no-warn-files] [--strict] [--no-notes]
+                     [--notes-fail]
 
 Reads script commands interactively, one per line, with line editing, history
 (~/.quorrel_history) and Tab completion of commands and names on a terminal.
