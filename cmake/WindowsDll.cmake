@@ -4,7 +4,7 @@
 # CMakeLists.txt on Windows builds after src/ is added.
 
 # The module-definition file and --kill-at come from src/host/exports.cmake, with the
-# Linux version script.
+# Linux version script (the notes listener too, in a build with notes).
 set_target_properties(quorrel_module PROPERTIES
   PREFIX ""
   OUTPUT_NAME quorrel

@@ -35,4 +35,13 @@ refused unshown "no example for deleteAll"
 # Parameters are the table's, not the prose's.
 sed 's/^== appendString$/== appendString\nparam: the text to append/' "$descriptions" > "$work/params.txt"
 refused params "parameters are described in host/table.inc"
+
+# Every bad: line names the notes it leads to, each a real one, and every kind of note
+# is named by some line.
+sed 's/ \[note: setting-refused\]$/ [note: setting-ignored]/' "$descriptions" > "$work/unknown-note.txt"
+refused unknown-note "no note is called setting-ignored"
+sed 's/ \[note: setting-refused\]$/ [no note]/' "$descriptions" > "$work/unnamed-note.txt"
+refused unnamed-note "no bad: line leads to note setting-refused"
+sed 's/ \[no note\]$//' "$descriptions" > "$work/bare-bad.txt"
+refused bare-bad "a bad: line ends with the notes it leads to"
 echo "help descriptions: every action and expression described and shown, broken copies refused"

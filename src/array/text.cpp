@@ -1,5 +1,6 @@
 #include "array/text.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cstring>
 
@@ -29,6 +30,20 @@ int32_t readDecimal(std::string_view text) {
   }
   if (negative) return magnitude >= kLimit ? INT32_MIN : static_cast<int32_t>(-magnitude);
   return magnitude > INT32_MAX ? INT32_MAX : static_cast<int32_t>(magnitude);
+}
+
+bool isWholeDecimal(std::string_view text) {
+  while (!text.empty() && isCSpace(text.front())) text.remove_prefix(1);
+  while (!text.empty() && isCSpace(text.back())) text.remove_suffix(1);
+  const bool negative = !text.empty() && text.front() == '-';
+  if (!text.empty() && (text.front() == '+' || negative)) text.remove_prefix(1);
+  if (text.empty()) return false;
+  int64_t magnitude = 0;
+  for (const char c : text) {
+    if (c < '0' || c > '9') return false;
+    magnitude = std::min<int64_t>(magnitude * 10 + (c - '0'), int64_t{INT32_MAX} + 2);
+  }
+  return magnitude <= int64_t{INT32_MAX} + (negative ? 1 : 0);
 }
 
 int32_t readDecimal(const char* text) {

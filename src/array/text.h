@@ -13,6 +13,8 @@ namespace quorrel {
 // fit 32 bits saturate to INT32_MAX / INT32_MIN.
 int32_t readDecimal(const char* text);
 int32_t readDecimal(std::string_view text);
+// Whether readDecimal reads all of the text (blanks around it aside) without saturating.
+bool isWholeDecimal(std::string_view text);
 
 // Writes value in decimal into out (at least 12 bytes) with its terminator and
 // returns the number of characters written.

@@ -213,6 +213,11 @@ using GetRunObjectDataSizeFn = int16_t(QUORREL_CALL*)(HostWord unused1, HostWord
 // the last file action did. The failed step (0 when it was done) and the system's error
 // number.
 using FileStatusFn = int32_t(QUORREL_CALL*)(int32_t* error);
+// QuorrelListenNotes, exported only by a module built with notes: the listener gets each
+// note's id, the name of the call it comes from and its message.
+using NoteListenerFn = void(QUORREL_CALL*)(void* context, const char* id, const char* call,
+                                           const char* message);
+using ListenNotesFn = void(QUORREL_CALL*)(NoteListenerFn listener, void* context);
 // GetConditionInfos, GetActionInfos, GetExpressionInfos.
 using GetInfoEntryFn = const InfoEntry*(QUORREL_CALL*)(void* editorContext, int32_t code);
 // GetConditionMenu, GetActionMenu, GetExpressionMenu: a menu the host owns.

@@ -107,6 +107,7 @@ QUORREL_EXPORT int16_t QUORREL_CALL CreateRunObject(void* runRecord, void* setup
     auto array = std::make_unique<ElementArray>();
     if (setupRecord != nullptr) applySetup(*array, setupRecord);
     host::setElementArray(runRecord, array.release());  // owned by the instance
+    host::objectCreated(runRecord);
   } catch (...) {
     // Without an array every action does nothing and every expression answers 0.
   }
@@ -119,6 +120,7 @@ QUORREL_EXPORT int16_t QUORREL_CALL DestroyRunObject(void* runRecord, HostWord) 
   // no array instead of a freed one.
   std::unique_ptr<ElementArray> owned(host::elementArrayOf(runRecord));
   host::setElementArray(runRecord, nullptr);
+  host::objectDestroyed(runRecord);
   return 0;
 }
 
@@ -164,6 +166,12 @@ QUORREL_EXPORT int32_t QUORREL_CALL QuorrelFileStatus(int32_t* error) {
   if (error != nullptr) *error = host::lastFileStatus.error;
   return host::lastFileStatus.failed;
 }
+
+#ifdef QUORREL_NOTES
+QUORREL_EXPORT void QUORREL_CALL QuorrelListenNotes(abi::NoteListenerFn listener, void* context) {
+  host::listenToNotes(listener, context);
+}
+#endif
 
 QUORREL_EXPORT const InfoEntry* QUORREL_CALL GetConditionInfos(void*, int32_t code) {
   return entryOf(host::ConditionInfoTable, code);

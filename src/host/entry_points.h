@@ -18,8 +18,12 @@
 extern "C" {
 #define QUORREL_ENTRY_POINT(name, ordinal, bytes, side, Type) \
   QUORREL_EXPORT std::remove_pointer_t<quorrel::abi::Type> name;
+#ifdef QUORREL_NOTES
+#define QUORREL_NOTES_ENTRY_POINT QUORREL_ENTRY_POINT
+#endif
 #include "host/entry_points.inc"
 #undef QUORREL_ENTRY_POINT
+#undef QUORREL_NOTES_ENTRY_POINT
 }  // extern "C"
 
 // Every row's argument bytes are those of its declaration, checked in every build: the
@@ -41,6 +45,10 @@ constexpr std::size_t argumentBytes32(Result(QUORREL_CALL*)(Args...)) {
 }
 #define QUORREL_ENTRY_POINT(name, ordinal, bytes, side, Type) \
   static_assert(argumentBytes32(&name) == (bytes), #name ": argument bytes");
+#ifdef QUORREL_NOTES
+#define QUORREL_NOTES_ENTRY_POINT QUORREL_ENTRY_POINT
+#endif
 #include "host/entry_points.inc"
 #undef QUORREL_ENTRY_POINT
+#undef QUORREL_NOTES_ENTRY_POINT
 }  // namespace quorrel::abi::check

@@ -4,19 +4,26 @@ set(QUORREL_ENTRY_POINTS_FILE ${CMAKE_CURRENT_LIST_DIR}/entry_points.inc)
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${QUORREL_ENTRY_POINTS_FILE})
 
 # QUORREL_ENTRY_POINT_NAMES, _ORDINALS, _ARG_BYTES: parallel lists, one entry per row.
-file(STRINGS ${QUORREL_ENTRY_POINTS_FILE} quorrel_entry_lines REGEX "^QUORREL_ENTRY_POINT\\(")
+# The rows exported only with notes count in a build with notes.
+set(quorrel_entry_kinds "ENTRY_POINT")
+if(QUORREL_NOTES)
+  set(quorrel_entry_kinds "(NOTES_)?ENTRY_POINT")
+endif()
+file(STRINGS ${QUORREL_ENTRY_POINTS_FILE} quorrel_entry_lines
+  REGEX "^QUORREL_${quorrel_entry_kinds}\\(")
 set(QUORREL_ENTRY_POINT_NAMES "")
 set(QUORREL_ENTRY_POINT_ORDINALS "")
 set(QUORREL_ENTRY_POINT_ARG_BYTES "")
 foreach(line IN LISTS quorrel_entry_lines)
-  string(REGEX MATCH "^QUORREL_ENTRY_POINT\\(([A-Za-z]+), ([0-9]+), ([0-9]+), [a-z]+, [A-Za-z]+\\)$"
+  string(REGEX MATCH
+    "^QUORREL_(NOTES_)?ENTRY_POINT\\(([A-Za-z]+), ([0-9]+), ([0-9]+), [a-z]+, [A-Za-z]+\\)$"
     matched "${line}")
   if(NOT matched)
     message(FATAL_ERROR "entry_points.inc: cannot read line '${line}'")
   endif()
-  list(APPEND QUORREL_ENTRY_POINT_NAMES ${CMAKE_MATCH_1})
-  list(APPEND QUORREL_ENTRY_POINT_ORDINALS ${CMAKE_MATCH_2})
-  list(APPEND QUORREL_ENTRY_POINT_ARG_BYTES ${CMAKE_MATCH_3})
+  list(APPEND QUORREL_ENTRY_POINT_NAMES ${CMAKE_MATCH_2})
+  list(APPEND QUORREL_ENTRY_POINT_ORDINALS ${CMAKE_MATCH_3})
+  list(APPEND QUORREL_ENTRY_POINT_ARG_BYTES ${CMAKE_MATCH_4})
 endforeach()
 
 if(WIN32)

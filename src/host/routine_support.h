@@ -14,6 +14,7 @@
 
 #include "array/element_array.h"
 #include "host/abi.h"
+#include "host/call_notes.h"
 #include "host/run_record.h"
 #include "platform/files.h"
 
@@ -95,19 +96,27 @@ auto invokeAction(const Instance& instance, HostWord param1, HostWord param2) {
   }
 }
 
+// The path a file action names: its first text parameter.
+template <Param P1>
+const char* pathParameter(HostWord param1, HostWord param2) {
+  return paramFrom<Param::Text>(P1 == Param::Text ? param1 : param2);
+}
+
 // The routine the host calls for an action: its parameters as declared, then the
 // action's routine on the instance. A file action's outcome is kept: no array, or an
 // exception the routine let out, is a failure of the file action too.
-template <auto Routine, Param P1, Param P2>
+template <auto Routine, Param P1, Param P2, int32_t Code>
 int16_t QUORREL_CALL callAction(void* runRecord, [[maybe_unused]] HostWord param1,
                                 [[maybe_unused]] HostWord param2) noexcept {
   using Answer = decltype(invokeAction<Routine, P1, P2>(std::declval<const Instance&>(), 0, 0));
   if constexpr (std::is_same_v<Answer, FileStatus>) lastFileStatus = {FileStatus::Refused};
   return runAction(runRecord, [&](ElementArray& array) {
+    const CallScope scope(true, Code, runRecord, &array);
     const Instance instance{array, runRecord};
     if constexpr (std::is_same_v<Answer, FileStatus>) {
       lastFileStatus = {FileStatus::OutOfMemory};  // kept when the routine throws
       lastFileStatus = invokeAction<Routine, P1, P2>(instance, param1, param2);
+      if (notesWanted()) reportFile(pathParameter<P1>(param1, param2), lastFileStatus);
     } else {
       invokeAction<Routine, P1, P2>(instance, param1, param2);
     }
@@ -144,7 +153,10 @@ struct Borrowed {
 // Copies text into a host buffer and marks the result as text; no text answers the
 // number 0 and leaves the flag alone.
 inline HostWord handOverText(void* runRecord, const char* text) {
-  if (text == nullptr) return 0;
+  if (text == nullptr) {
+    note(NoteKind::NoText, {});
+    return 0;
+  }
   const std::size_t length = std::strlen(text);
   const abi::AllocateResultStringService allocate = allocateResultString(runRecord);
   if (allocate == nullptr) return 0;
@@ -201,8 +213,9 @@ HostWord runExpression(void* runRecord, HostWord token, Op&& op) noexcept {
 
 // The routine the host calls for an expression: its parameters fetched as declared, then
 // the expression's routine.
-template <auto Routine, Param P1, Param P2>
+template <auto Routine, Param P1, Param P2, int32_t Code>
 HostWord QUORREL_CALL callExpression(void* runRecord, HostWord parameterToken) noexcept {
+  const CallScope scope(false, Code, runRecord, nullptr);
   if constexpr (P1 == Param::None) {
     return runExpression<>(runRecord, parameterToken, Routine);
   } else if constexpr (P2 == Param::None) {

@@ -30,6 +30,7 @@ FileStatus saveToFile(Instance in, const char* path) {
   return saveNativeFile(in.array, path, FileModeTruncate);
 }
 FileStatus loadFromFile(Instance in, const char* path) {
+  rowsReplaced();
   return loadNativeFile(in.array, path, LoadReplace);
 }
 FileStatus appendElementsFromFile(Instance in, const char* path) {
@@ -39,6 +40,7 @@ FileStatus saveToHostArray(Instance in, const char* path) {
   return saveHostArrayFile(in.array, path, FileModeTruncate);
 }
 FileStatus loadFromHostArray(Instance in, const char* path) {
+  rowsReplaced();
   return loadHostArrayFile(in.array, path, LoadReplace);
 }
 FileStatus appendElementsFromHostArray(Instance in, const char* path) {
@@ -49,6 +51,7 @@ FileStatus saveToCsv(Instance in, const char* path) {
   return saveCsvFile(in.array, path, FileModeTruncate);
 }
 FileStatus loadFromCsv(Instance in, const char* path) {
+  rowsReplaced();
   return loadCsvFile(in.array, path, LoadReplace);
 }
 FileStatus appendElementsFromCsv(Instance in, const char* path) {
@@ -58,6 +61,7 @@ FileStatus saveToIni(Instance in, const char* path) {
   return saveIniFile(in.array, path, FileModeTruncate);
 }
 FileStatus loadFromIni(Instance in, const char* path) {
+  rowsReplaced();
   return loadIniFile(in.array, path, LoadReplace);
 }
 FileStatus appendElementsFromIni(Instance in, const char* path) {
@@ -74,9 +78,11 @@ FileStatus appendElementToFile(Instance in, int32_t index, const char* path) {
 
 // File contents become File elements.
 FileStatus setFileAt(Instance in, const char* path, int32_t index) {
+  noteNegativeIndex(in.array, index);
   return withFileContents(path, [&](ByteBlock block) { in.array.setFile(block, index); });
 }
 FileStatus insertFileAt(Instance in, const char* path, int32_t index) {
+  noteNegativeIndex(in.array, index);
   return withFileContents(path, [&](ByteBlock block) { in.array.insertFile(block, index); });
 }
 FileStatus appendFile(Instance in, const char* path) {

@@ -1,6 +1,7 @@
 #include "host/tables.h"
 
 #include <cstddef>
+#include <string_view>
 
 #include "host/routines.h"
 
@@ -30,14 +31,26 @@ struct Row {
 constexpr Row<abi::ActionRoutine> kActionRows[] = {
 #define ACTION(code, name, param1, param2, file, menuText, display, meaning1, meaning2) \
   {code, actionParamType(Param::param1), actionParamType(Param::param2),                \
-   &callAction<&act::name, Param::param1, Param::param2>},
+   &callAction<&act::name, Param::param1, Param::param2, code>},
 #include "host/table.inc"
 };
+
+// Expressions that share a routine share its host routine too: it names itself in
+// notes by the first of them.
+constexpr std::string_view kExpressionRoutineNames[] = {
+#define EXPRESSION(code, name, routine, param1, param2, menuText, meaning1, meaning2) #routine,
+#include "host/table.inc"
+};
+constexpr int32_t firstCodeOf(std::string_view routine) {
+  int32_t code = 0;
+  while (kExpressionRoutineNames[code] != routine) ++code;
+  return code;
+}
 
 constexpr Row<abi::ExpressionRoutine> kExpressionRows[] = {
 #define EXPRESSION(code, name, routine, param1, param2, menuText, meaning1, meaning2) \
   {code, expressionParamType(Param::param1), expressionParamType(Param::param2),      \
-   &callExpression<&expr::routine, Param::param1, Param::param2>},
+   &callExpression<&expr::routine, Param::param1, Param::param2, firstCodeOf(#routine)>},
 #include "host/table.inc"
 };
 

@@ -7,6 +7,7 @@
 #include <span>
 #include <string_view>
 
+#include "array/notes.h"
 #include "io/apply.h"
 #include "io/parsing.h"
 
@@ -136,6 +137,13 @@ void appendCells(ElementArray& target, std::shared_ptr<ByteBuffer> text, CsvShap
       });
 }
 
+// A spreadsheet's UTF-8 file may begin with a byte-order mark; the loader keeps it, so
+// the first cell (a label, often) no longer equals the text the author sees.
+void noteByteOrderMark(std::string_view text) {
+  if (!notesWanted() || !text.starts_with("\xEF\xBB\xBF")) return;
+  note(NoteKind::ByteOrderMark, {noteText(text.substr(0, text.find_first_of(",\r\n")))});
+}
+
 }  // namespace
 
 FileStatus saveCsvFile(const ElementArray& array, const char* path, FileMode mode) {
@@ -166,6 +174,7 @@ FileStatus saveCsvFile(const ElementArray& array, const char* path, FileMode mod
 FileStatus loadCsvFile(ElementArray& array, const char* path, LoadMode mode) {
   return loadWith(array, path, mode, ReadAs::Text,
                   [](ElementArray& target, const std::shared_ptr<ByteBuffer>& text) {
+                    noteByteOrderMark(text->view());
                     const CsvShape shape = shapeOf(text->data(), text->size());
                     target.setDimensions(2);
                     target.setBoundary(1, shape.columns);

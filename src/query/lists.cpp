@@ -3,6 +3,7 @@
 #include <string_view>
 
 #include "array/int32.h"
+#include "array/notes.h"
 #include "array/text.h"
 
 namespace quorrel {
@@ -164,6 +165,11 @@ int32_t minValue(const ElementArray& array) {
 int32_t sumValue(const ElementArray& array) {
   int32_t sum = 0;
   for (const Element& e : array.slots()) sum = addWrap(sum, e.asValue());
+  if (notesWanted()) {
+    int64_t total = 0;
+    for (const Element& e : array.slots()) total += e.asValue();
+    noteTotal(total);
+  }
   return sum;
 }
 

@@ -1,6 +1,7 @@
 #include "recordset/aggregates.h"
 
 #include "array/int32.h"
+#include "array/notes.h"
 #include "recordset/table.h"
 
 namespace quorrel {
@@ -11,8 +12,8 @@ namespace {
 // later one is combined into it. No visible row gives 0. One tight walk over the states
 // with the cell index stepped a row at a time (the same 32-bit wrap as cellIndex); a
 // cell outside the array reads 0.
-template <typename Combine>
-int32_t foldColumn(const ElementArray& array, int32_t column, Combine&& combine) {
+template <typename Result = int32_t, typename Combine>
+Result foldColumn(const ElementArray& array, int32_t column, Combine&& combine) {
   const auto rows = static_cast<int32_t>(array.rowStates.size());
   const uint8_t* states = array.rowStates.data();
   const Element* cells = array.slots().data();
@@ -27,7 +28,7 @@ int32_t foldColumn(const ElementArray& array, int32_t column, Combine&& combine)
     index = addWrap(index, columns);
   }
   if (r == rows) return 0;
-  int32_t result = valueAt(index);
+  Result result = valueAt(index);
   for (++r, index = addWrap(index, columns); r < rows; ++r, index = addWrap(index, columns)) {
     if (states[r] == RowSelected) result = combine(result, valueAt(index));
   }
@@ -45,7 +46,12 @@ int32_t columnMin(const ElementArray& array, int32_t column) {
 }
 
 int32_t columnSum(const ElementArray& array, int32_t column) {
-  return foldColumn(array, column, [](int32_t sum, int32_t v) { return addWrap(sum, v); });
+  const int32_t sum =
+      foldColumn(array, column, [](int32_t sum, int32_t v) { return addWrap(sum, v); });
+  if (notesWanted()) {
+    noteTotal(foldColumn<int64_t>(array, column, [](int64_t sum, int32_t v) { return sum + v; }));
+  }
+  return sum;
 }
 
 int32_t columnAverage(const ElementArray& array, int32_t column) {

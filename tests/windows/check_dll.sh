@@ -7,9 +7,12 @@
 #   ordinal, none by ordinal alone, names in byte order (GetProcAddress bisects them);
 # - imports: system DLLs only (the runtimes are linked in statically);
 # - resources: what windres reads out of the DLL is what it reads out of the script.
+# - the shipped DLL has no note log: it has no notes to write;
+# - with a seventh argument "checked", the checked DLL: the same, plus the listener
+#   QuorrelListenNotes at ordinal 201 and its note log.
 # Exits 77 (skipped) when binutils for mingw-w64 are not installed.
 set -uo pipefail
-dll=$1 entry_points=$2 script=$3 resource_dir=$4 objdump=$5 windres=$6
+dll=$1 entry_points=$2 script=$3 resource_dir=$4 objdump=$5 windres=$6 kind=${7:-shipped}
 for tool in "$objdump" "$windres"; do
   command -v "$tool" >/dev/null || { echo "skipped: $tool is not installed (binutils-mingw-w64-i686)"; exit 77; }
 done
@@ -43,7 +46,10 @@ awk '
   slots && /^$/ { slots = 0 }
   slots && /Export RVA/ { ++used }
   END { print used > "/dev/stderr" }' "$work/headers" >"$work/exports" 2>"$work/slots"
-sed -nE 's/^QUORREL_ENTRY_POINT\(([A-Za-z]+), ([0-9]+),.*/\1 \2/p' "$entry_points" | LC_ALL=C sort >"$work/expected"
+{
+  sed -nE 's/^QUORREL_ENTRY_POINT\(([A-Za-z]+), ([0-9]+),.*/\1 \2/p' "$entry_points"
+  [[ $kind == checked ]] && sed -nE 's/^QUORREL_NOTES_ENTRY_POINT\(([A-Za-z]+), ([0-9]+),.*/\1 \2/p' "$entry_points"
+} | LC_ALL=C sort >"$work/expected"
 LC_ALL=C sort "$work/exports" >"$work/exports.sorted"
 check "exports equal entry_points.inc" diff "$work/expected" "$work/exports.sorted"
 check "nothing exported by ordinal alone" test "$(cat "$work/slots")" -eq "$(wc -l <"$work/expected")"
@@ -56,6 +62,13 @@ check "imports KERNEL32 and USER32" grep -qx -e kernel32.dll "$work/imports"
 check "imports USER32" grep -qx -e user32.dll "$work/imports"
 check "imports system DLLs only" \
   sh -c "! grep -Evx 'kernel32\.dll|user32\.dll|msvcrt\.dll|ucrtbase\.dll|api-ms-win-crt-.*' '$work/imports'"
+
+# The note log is found by its variable; only the checked DLL has one.
+if [[ $kind == checked ]]; then
+  check "the checked DLL writes notes" grep -qa QUORREL_NOTES_LOG "$dll"
+else
+  check "the shipped DLL writes no notes" sh -c "! grep -qa QUORREL_NOTES_LOG '$dll'"
+fi
 
 # Resources. The two readings differ only in spelling: memory flags are not kept in the
 # binary, an id of -1 reads back as 65535, and an empty command item as a separator.

@@ -42,7 +42,7 @@ run_one() {  # label k command...
   local dir=$work/runs/$1/$2 script=$work/scripts/$2.qs
   shift 2
   rm -rf "$dir" && mkdir -p "$dir" && cp -r "$work/seed" "$dir/files"
-  (cd "$dir/files" && timeout 120 "$@" run - <"$script" >"$dir/stdout" 2>"$dir/stderr"
+  (cd "$dir/files" && timeout 120 "$@" run --no-notes - <"$script" >"$dir/stdout" 2>"$dir/stderr"
    echo $? >"$dir/status")
 }
 same() {  # label k [run folder]

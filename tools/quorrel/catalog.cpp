@@ -92,6 +92,40 @@ bool isRowName(std::string_view name) {
   return codeOfName(true, name) || codeOfName(false, name);
 }
 
+constexpr const char* kNoteIds[] = {
+#define NOTE(kind, id, message) id,
+#include "array/notes.inc"
+#undef NOTE
+};
+
+// Splits "[note: a, b]" or "[no note]" off the end of a bad: line into block.notes;
+// what is wrong with it, or nothing.
+std::optional<std::string> takeNotes(Description& block, std::string_view& line) {
+  constexpr std::string_view kNone = " [no note]";
+  constexpr std::string_view kOpen = " [note: ";
+  if (line.ends_with(kNone)) {
+    line.remove_suffix(kNone.size());
+    return std::nullopt;
+  }
+  const size_t open = line.rfind(kOpen);
+  if (open == std::string_view::npos || !line.ends_with(']')) {
+    return "a bad: line ends with the notes it leads to, [note: ID, ...], or [no note]";
+  }
+  std::string_view ids = line.substr(open + kOpen.size());
+  ids.remove_suffix(1);
+  line = line.substr(0, open);
+  for (size_t start = 0; start <= ids.size();) {
+    const size_t comma = std::min(ids.find(", ", start), ids.size());
+    const std::string_view id = ids.substr(start, comma - start);
+    if (std::find(std::begin(kNoteIds), std::end(kNoteIds), id) == std::end(kNoteIds)) {
+      return "no note is called " + std::string(id);
+    }
+    block.notes.emplace_back(id);
+    start = comma + 2;
+  }
+  return std::nullopt;
+}
+
 void addLine(Description& block, std::string_view line) {
   if (line.substr(0, 5) == "bad: ") {
     block.bad = line.substr(5);
@@ -116,6 +150,12 @@ std::optional<int32_t> codeOfName(bool action, std::string_view name) {
 
 std::string_view nameOf(bool action, int32_t code) {
   return action ? kActions[code].name : kExpressionNames[code];
+}
+
+bool answersText(int32_t expressionCode) {
+  const std::string_view name = nameOf(false, expressionCode);
+  if (name == "keyStr(") return true;
+  return name.ends_with("$(") && name != "keyVal$(" && name != "dimIndexOfIndex$(";
 }
 
 std::optional<int32_t> codeOfTypedName(bool action, std::string_view typed) {
@@ -197,8 +237,19 @@ Prose readProse(std::string_view text) {
     } else if (line.starts_with("example: ")) {
       block->example.emplace_back(line.substr(9));
     } else {
-      addLine(*block, line);
+      std::string_view text = line;
+      if (text.substr(0, 5) == "bad: ") {
+        if (const auto problem = takeNotes(*block, text))
+          prose.problems.push_back(where + *problem);
+      }
+      addLine(*block, text);
     }
+  }
+  for (const char* id : kNoteIds) {
+    const bool named = std::any_of(prose.blocks.begin(), prose.blocks.end(), [&](const auto& b) {
+      return std::find(b.second.notes.begin(), b.second.notes.end(), id) != b.second.notes.end();
+    });
+    if (!named) prose.problems.push_back(std::string("no bad: line leads to note ") + id);
   }
   for (bool action : {true, false}) {
     for (int32_t code = 0; validCode(action, code); ++code) {

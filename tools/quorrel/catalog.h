@@ -34,6 +34,10 @@ struct Parameter {
 };
 std::vector<Parameter> parameters(bool action, int32_t code);
 
+// Whether an expression answers a text: those named NAME$(, but for keyVal$( and
+// dimIndexOfIndex$( (numbers), and keyStr( (a text).
+bool answersText(int32_t expressionCode);
+
 // The table's name of an action (appendString) or an expression (size().
 std::string_view nameOf(bool action, int32_t code);
 
@@ -64,11 +68,14 @@ struct Description {
   std::vector<std::string> params;  // what each parameter is, in order
   std::string prose;                // paragraphs joined by line breaks
   std::string bad;                  // what bad input does; may be empty
+  std::vector<std::string> notes;   // the ids of the notes that bad input gives
 };
 std::optional<Description> describe(bool action, int32_t code);
 
-// The prose of a descriptions text: one block per row, under "== NAME". `problems`
-// names, with line numbers, what keeps the text from describing exactly the table.
+// The prose of a descriptions text: one block per row, under "== NAME". A "bad:" line
+// ends with the notes it leads to, "[note: label-unknown, not-2d]", or "[no note]"
+// when what it describes is a plain answer. `problems` names, with line numbers, what
+// keeps the text from describing exactly the table and every kind of note.
 struct Prose {
   std::map<std::string, Description, std::less<>> blocks;
   std::vector<std::string> problems;

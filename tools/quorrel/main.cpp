@@ -55,11 +55,24 @@ or put in place) is named in a warning on standard error, with the step that
 failed; output and exit status stay the same unless --strict. A script that is a
 directory or cannot be read, and output that cannot be written, are errors with
 status 1.
+
+The module never reports a mistake to the host: a call on an index outside the
+array, an unknown label or a row that is not visible does nothing or answers 0
+or -1. The module the command loads says why, in a note on standard error:
+FILE:LINE: note: labSum: no column is labelled "scroe" (labels: name, score);
+column -1 was used [label-unknown]. A note given again (the same call with the
+same values) is printed once, and at the end once more with its count. A text
+expression with no text to give prints (no text), never a number. --notes-fail
+exits with status 3 when the module gave a note (unless an error or --strict sets
+another status). Arguments that do not fit are errors that name the call as
+written: setLabel "TEXT" NUMBER: argument 1 must be a quoted text; got name (add
+quotes).
 )"},
     {"shell", R"(Reads script commands interactively, one per line, with line editing, history
 (~/.quorrel_history) and Tab completion of commands and names on a terminal.
 Errors are reported and the session goes on; when the input is not a terminal, the
-exit status is then 2 (else 1 with --strict after a failed file action).
+exit status is then 2 (else 1 with --strict after a failed file action). The
+module's notes are printed as run prints them; --no-notes turns them off.
 )"},
     {"inspect", R"(Recognises a native array, host array, CSV, INI or JSON file by its content, the
 name's extension as a hint (or reads it as --from says), loads it into a fresh
@@ -169,6 +182,12 @@ void applyOption(cli::OptionId id, const std::string& name, const std::string& v
       return;
     case OptionId::Strict:
       options.run.strict = true;
+      return;
+    case OptionId::NoNotes:
+      options.run.notes = false;
+      return;
+    case OptionId::NotesFail:
+      options.run.notesFail = true;
       return;
     case OptionId::Rows:
     case OptionId::All:

@@ -104,9 +104,10 @@ int shellCommand(const ModuleLoader& module, const RunOptions& options) {
     std::cout.flush();
   }
   if (reader.interactive()) std::cout << '\n';
+  session.printRepeatedNotes();
   // Typed mistakes were answered on the spot; piped ones must reach the caller.
   if (reader.interactive()) return 0;
-  return hadError ? 2 : options.strict && session.fileActionFailed() ? 1 : 0;
+  return hadError ? 2 : session.status();
 }
 
 }  // namespace quorrel::tool

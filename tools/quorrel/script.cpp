@@ -315,15 +315,20 @@ std::string quoteText(std::string_view bytes) {
 
 namespace {
 
-Argument parseArgument(std::string_view token) {
+// Adds one argument; an unquoted word that is not an integer is kept as written.
+void addArgument(Command& command, std::string_view token) {
   Argument arg;
+  std::string unread;
   arg.isText = isQuotedToken(token);
   if (arg.isText) {
     arg.text = parseQuoted(token);
-  } else {
+  } else if (looksLikeInteger(token)) {
     arg.number = parseInteger(token);
+  } else {
+    unread = token;
   }
-  return arg;
+  command.args.push_back(std::move(arg));
+  command.unread.push_back(std::move(unread));
 }
 
 std::string_view trimmed(std::string_view text) {
@@ -343,9 +348,8 @@ size_t closedCallLength(std::string_view text) {
 }
 
 // "1, 2" or "\"x\"": arguments between commas outside strings, each one token.
-std::vector<Argument> parseArgumentList(std::string_view list) {
-  std::vector<Argument> args;
-  if (trimmed(list).empty()) return args;
+void parseArgumentList(Command& command, std::string_view list) {
+  if (trimmed(list).empty()) return;
   for (size_t start = 0, i = 0;; ++i) {
     if (i < list.size() && list[i] == '"') i = skipQuoted(list, i) - 1;
     if (i < list.size() && list[i] != ',') continue;
@@ -353,27 +357,25 @@ std::vector<Argument> parseArgumentList(std::string_view list) {
     const std::vector<std::string> tokens = splitTokens(piece);
     if (tokens.size() != 1) {
       throw ScriptError(
-          "argument " + std::to_string(args.size() + 1) +
+          "argument " + std::to_string(command.args.size() + 1) +
           (tokens.empty() ? " is missing" : " is more than one word: " + quoteText(piece)));
     }
-    args.push_back(parseArgument(tokens[0]));
-    if (i >= list.size()) return args;
+    addArgument(command, tokens[0]);
+    if (i >= list.size()) return;
     start = i + 1;
   }
 }
 
 // After the name: blank-separated arguments, or a list in parentheses, as in
 // labSum("qty") or getFromColumnRow(1, 2).
-std::vector<Argument> parseArguments(std::string_view rest) {
+void parseArguments(Command& command, std::string_view rest) {
   if (!rest.empty() && rest.front() == '(') {
     rest.remove_prefix(1);
     const std::string_view call = trimmed(rest);
     const size_t close = closedCallLength(call);
-    if (close != std::string_view::npos) return parseArgumentList(call.substr(0, close));
+    if (close != std::string_view::npos) return parseArgumentList(command, call.substr(0, close));
   }
-  std::vector<Argument> args;
-  for (const std::string& token : splitTokens(rest)) args.push_back(parseArgument(token));
-  return args;
+  for (const std::string& token : splitTokens(rest)) addArgument(command, token);
 }
 
 void setCodeOrName(Command& command, std::string_view word, bool isAction) {
@@ -412,7 +414,7 @@ Command parseLine(std::string_view line) {
     throw ScriptError(isAction ? "A needs an action code" : "E needs an expression code or name");
   }
   setCodeOrName(command, word, isAction);
-  command.args = parseArguments(rest.substr(word.size()));
+  parseArguments(command, rest.substr(word.size()));
   return command;
 }
 

@@ -32,6 +32,9 @@ struct Command {
   int32_t code = -1;           // Action, Expression; -1 when named
   std::string name;            // Action or Expression given by name
   std::vector<Argument> args;  // typed by their form, checked against the tables when run
+  // Per argument, an unquoted word that is not an integer as written (else empty): a
+  // text without its quotes or a mistyped number, said when the parameter is known.
+  std::vector<std::string> unread;
 };
 
 // Splits a line at blanks; a quoted string is one token even with blanks inside.

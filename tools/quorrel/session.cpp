@@ -18,18 +18,43 @@ std::string argumentCount(int count) {
   return std::to_string(count) + (count == 1 ? " argument" : " arguments");
 }
 
+// How a call is written in a script: setLabel "TEXT" NUMBER, labSum( "TEXT".
+std::string scriptForm(bool action, int32_t code, const Signature& signature, uint16_t textType) {
+  std::string form(nameOf(action, code));
+  for (int i = 0; i < signature.paramCount; ++i) {
+    form += signature.paramTypes[i] == textType ? " \"TEXT\"" : " NUMBER";
+  }
+  return form;
+}
+
+// What was wrong with one argument for a parameter of the other kind, or that was
+// not read at all.
+std::string argumentProblem(const Argument& arg, const std::string& unread, bool wantsText) {
+  const std::string got = !unread.empty() ? unread
+                          : arg.isText    ? quoteText(arg.text)
+                                          : std::to_string(arg.number);
+  if (!wantsText) return "must be an integer; got " + got;
+  const std::string_view hint = unread.empty()           ? ""
+                                : unread.front() == '\'' ? " (quote texts with double quotes)"
+                                                         : " (add quotes)";
+  return "must be a quoted text; got " + got + std::string(hint);
+}
+
 // The arguments must match the declared parameters in number and type.
-void checkArguments(const Signature& signature, const std::vector<Argument>& args,
-                    const std::string& what, uint16_t textType) {
+void checkArguments(bool action, int32_t code, const Signature& signature,
+                    const std::vector<Argument>& args, std::vector<std::string> unread,
+                    uint16_t textType) {
+  const std::string form = scriptForm(action, code, signature, textType);
   if (static_cast<int>(args.size()) != signature.paramCount) {
-    throw ScriptError(what + " takes " + argumentCount(signature.paramCount) + ", " +
+    throw ScriptError(form + ": takes " + argumentCount(signature.paramCount) + ", " +
                       std::to_string(args.size()) + " given");
   }
+  unread.resize(args.size());
   for (size_t i = 0; i < args.size(); ++i) {
     const bool wantsText = signature.paramTypes[i] == textType;
-    if (args[i].isText != wantsText) {
-      throw ScriptError("argument " + std::to_string(i + 1) + " of " + what + " must be " +
-                        (wantsText ? "a quoted string" : "an integer"));
+    if (!unread[i].empty() || args[i].isText != wantsText) {
+      throw ScriptError(form + ": argument " + std::to_string(i + 1) + ' ' +
+                        argumentProblem(args[i], unread[i], wantsText));
     }
   }
 }
@@ -153,14 +178,70 @@ void Session::run(std::string_view line, std::ostream& out, const Where& where) 
   }
 }
 
+Session::~Session() {
+  if (listening_) module_.get().entry<abi::ListenNotesFn>("QuorrelListenNotes")(nullptr, nullptr);
+}
+
 Instance& Session::instance() {
-  if (!instance_) instance_ = std::make_unique<Instance>(module_.get(), SetupFields{});
+  if (!instance_) {
+    listenToNotes();
+    instance_ = std::make_unique<Instance>(module_.get(), SetupFields{});
+  }
   return *instance_;
 }
 
 void Session::replaceInstance(const SetupFields& setup) {
+  listenToNotes();
   instance_.reset();
   instance_ = std::make_unique<Instance>(module_.get(), setup);
+}
+
+// A module built without notes does not export the listener; it then says nothing.
+void Session::listenToNotes() {
+  if (listening_ || !options_.notes) return;
+  void* listen = module_.get().symbol("QuorrelListenNotes");
+  if (listen == nullptr) return;
+  reinterpret_cast<abi::ListenNotesFn>(listen)(&Session::onNote, this);
+  listening_ = true;
+}
+
+void QUORREL_CALL Session::onNote(void* context, const char* id, const char* call,
+                                  const char* message) {
+  auto& session = *static_cast<Session*>(context);
+  session.pending_.emplace_back(id, std::string(call) + ": " + message);
+}
+
+// A note is printed the first time; the same note again (a loop, a repeated line) is
+// only counted, and printRepeatedNotes gives the count at the end.
+void Session::printNotes(const Where& where) {
+  for (auto& [id, text] : pending_) {
+    const std::string full = text + " [" + id + ']';
+    const auto seen =
+        std::find_if(notes_.begin(), notes_.end(), [&](const Note& n) { return n.text == full; });
+    if (seen != notes_.end()) {
+      ++seen->count;
+      continue;
+    }
+    const std::string place = std::string(where.file) + ':' + std::to_string(where.line);
+    notes_.push_back({place, full, 1});
+    // A failed file action is already named in a warning, with the same words.
+    if (id == "file-failed" && options_.warnFiles) continue;
+    if (warnings_) *warnings_ << place << ": note: " << full << '\n';
+  }
+  pending_.clear();
+}
+
+void Session::printRepeatedNotes() {
+  for (const Note& n : notes_) {
+    if (n.count > 1 && warnings_) {
+      *warnings_ << n.where << ": note: " << n.text << " (" << n.count << " times in all)\n";
+    }
+  }
+}
+
+int Session::status() const {
+  if (options_.strict && fileActionFailed_) return 1;
+  return options_.notesFail && notesGiven() ? kNotesGiven : 0;
 }
 
 // The steps of a file action that can fail, as the module numbers them.
@@ -210,9 +291,10 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
       const Signature signature = module_.get().actionSignature(code);
       const std::vector<Argument> args =
           withUnusedFilled(true, code, signature, command.args, abi::kActionParamText);
-      checkArguments(signature, args, "action " + std::to_string(code), abi::kActionParamText);
+      checkArguments(true, code, signature, args, command.unread, abi::kActionParamText);
       instance().callAction(code, args);
       checkFileAction(code, args, where);
+      printNotes(where);
       return;
     }
     case CommandKind::Expression: {
@@ -220,8 +302,7 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
       const Signature signature = module_.get().expressionSignature(code);
       const std::vector<Argument> args =
           withUnusedFilled(false, code, signature, command.args, abi::kExpressionParamText);
-      checkArguments(signature, args, "expression " + std::to_string(code),
-                     abi::kExpressionParamText);
+      checkArguments(false, code, signature, args, command.unread, abi::kExpressionParamText);
       const ExpressionResult result = instance().callExpression(code, args);
       if (options_.echo) {
         std::string_view text = where.text;
@@ -230,7 +311,15 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
         out << where.line << ": " << text
             << (textForm() == TextForm::Utf8 ? "  \xe2\x86\x92  " : "  ->  ");
       }
-      out << (result.isText ? quoteText(result.text) : std::to_string(result.number)) << '\n';
+      // A text expression that has no text answers the number 0; shown as that, it
+      // would pass for the number or the text "0".
+      const bool noText = !result.isText && answersText(code);
+      out << (noText          ? std::string(kNoText)
+              : result.isText ? quoteText(result.text)
+                              : std::to_string(result.number))
+          << '\n';
+      out.flush();
+      printNotes(where);
       return;
     }
   }
@@ -251,7 +340,8 @@ int runScript(const ModuleLoader& module, std::istream& in, const std::string& n
     }
     if (!out) return 1;
   }
-  return options.strict && session.fileActionFailed() ? 1 : 0;
+  session.printRepeatedNotes();
+  return session.status();
 }
 
 }  // namespace quorrel::tool

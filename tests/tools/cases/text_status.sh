@@ -20,5 +20,5 @@ q run --strict --no-warn-files f.qs
 texts=(0042 '  9 apples' - ' -7' 12abc abc +5 '\t\n\x0b\x0c\r8' +-3 '- 3' '3 4' '\xa05'
   2147483647 2147483648 99999999999999999999999 -2147483648 -2147483649
   -99999999999999999999999 000000000000000000000000012)
-printf 'new dims=1\nA appendString "%s"\nE get( 0\n' "${texts[@]}" | "$QUORREL" run - |
+printf 'new dims=1\nA appendString "%s"\nE get( 0\n' "${texts[@]}" | "$QUORREL" run --no-notes - |
   paste -d' ' - <(printf '"%s"\n' "${texts[@]}")
