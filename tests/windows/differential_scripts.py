@@ -48,7 +48,8 @@ def catalog(path):
     """(kind, name, [(type, description)]) for each line of `quorrel list`."""
     entries = []
     for line in open(path, encoding="utf-8"):
-        m = re.match(r"([AE])\d+ (\S+?)\((.*)\)  \[", line)
+        # A long entry's menu path goes on the next line.
+        m = re.match(r"([AE])\d+ (\S+?)\((.*?)\)(?:  \[.*)?$", line.rstrip("\n"))
         if m:
             params = re.findall(r"(?:^|, )(text|number): ([^,]*)", m.group(3))
             entries.append((m.group(1), m.group(2), params))
