@@ -84,6 +84,8 @@ struct Examples {
 struct Generated {
   std::string body;
   std::string toc;
+  // For each note id, links to the entries whose bad input gives it.
+  std::map<std::string, std::vector<std::string>> noteGivers;
 };
 
 using Descriptions = std::map<std::string, Description, std::less<>>;
@@ -211,7 +213,17 @@ Generated render(const Kind& kind, const Examples& examples, const Descriptions&
     }
     for (const std::string& p : paragraphs(d.prose)) out.body += "<p>" + escape(p) + "</p>\n";
     out.body += example(kind, code, d, examples);
-    if (!d.bad.empty()) out.body += "<p class=\"bad\">Bad input: " + escape(d.bad) + "</p>\n";
+    if (!d.bad.empty()) {
+      const std::string anchor = std::string(kind.anchor) + std::to_string(code);
+      out.body += "<p class=\"bad\">Bad input: " + escape(d.bad);
+      for (std::size_t i = 0; i < d.notes.size(); ++i) {
+        out.body += std::string(i ? ", " : " Note: ") + "<a href=\"#note-" + d.notes[i] +
+                    "\"><code>" + d.notes[i] + "</code></a>";
+        out.noteGivers[d.notes[i]].push_back("<a href=\"#" + anchor + "\">" + escape(name) +
+                                             "</a>");
+      }
+      out.body += "</p>\n";
+    }
     out.body += "</div>\n";
   }
   out.toc = contents.finish();
@@ -221,6 +233,40 @@ Generated render(const Kind& kind, const Examples& examples, const Descriptions&
     }
   }
   return out;
+}
+
+// Every kind of note with the words it says ("…" for each value) and the entries that
+// give it, so that a note's id in a log leads here and on to their paragraphs.
+std::string noteKinds(const Generated& actions, const Generated& expressions) {
+  struct Kind {
+    const char* id;
+    const char* message;
+  };
+  static constexpr Kind kKinds[] = {
+#define NOTE(kind, id, message) {id, message},
+#include "array/notes.inc"
+#undef NOTE
+  };
+  std::string html = "<dl class=\"notes\">\n";
+  for (const Kind& kind : kKinds) {
+    std::string words = kind.message;
+    for (std::size_t at = words.find("{}"); at != std::string::npos; at = words.find("{}", at)) {
+      words.replace(at, 2, "\xE2\x80\xA6");
+    }
+    std::vector<std::string> givers = {};
+    for (const Generated* part : {&actions, &expressions}) {
+      const auto found = part->noteGivers.find(kind.id);
+      if (found != part->noteGivers.end()) {
+        givers.insert(givers.end(), found->second.begin(), found->second.end());
+      }
+    }
+    if (givers.empty()) fail(std::string("no entry gives the note ") + kind.id);
+    html += "<dt id=\"note-" + std::string(kind.id) + "\"><code>[" + kind.id + "]</code></dt><dd>" +
+            escape(words) + ". Given by ";
+    for (std::size_t i = 0; i < givers.size(); ++i) html += (i ? ", " : "") + givers[i];
+    html += ".</dd>\n";
+  }
+  return html + "</dl>\n";
 }
 
 void replace(std::string& text, const std::string& placeholder, const std::string& value) {
@@ -301,6 +347,7 @@ int main(int argc, char** argv) {
     replace(page, "@@TOC_EXPRESSIONS@@", expressions.toc);
     replace(page, "@@ACTIONS@@", actions.body);
     replace(page, "@@EXPRESSIONS@@", expressions.body);
+    replace(page, "@@NOTE_KINDS@@", noteKinds(actions, expressions));
     checkLinks(page);
     std::ofstream out(args["--out"], std::ios::binary);
     out << page;
