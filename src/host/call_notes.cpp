@@ -151,16 +151,7 @@ void reportNumber(const Element& element, int32_t value) {
 
 void reportFile(const char* path, FileStatus status) {
   if (!notesWanted() || status.ok()) return;
-  static constexpr const char* kSteps[] = {"done",
-                                           "could not open it",
-                                           "could not read it",
-                                           "could not write it",
-                                           "could not flush it to the disk",
-                                           "could not put the new file in place",
-                                           "ran out of memory",
-                                           "wrote nothing (no such element, or more cells than "
-                                           "the format holds)"};
-  std::string what = kSteps[status.failed];
+  std::string what = failedStepWords(status.failed);
   if (status.error != 0) what += std::string(" (") + std::strerror(status.error) + ')';
   note(NoteKind::FileFailed, {noteText(path ? path : ""), what});
 }

@@ -1,11 +1,25 @@
 #include "platform/files.h"
 
 #include <cerrno>
+#include <iterator>
 #include <utility>
 
 #include "platform/file_system.h"
 
 namespace quorrel {
+
+const char* failedStepWords(int step) {
+  static constexpr const char* kWords[] = {
+      "done",
+      "could not open it",
+      "could not read it",
+      "could not write it",
+      "could not flush it to the disk",
+      "could not put the new file in place",
+      "ran out of memory",
+      "wrote nothing (no such element, or more cells than the format holds)"};
+  return step >= 0 && step < static_cast<int>(std::size(kWords)) ? kWords[step] : "failed";
+}
 
 namespace fsys = file_system;
 

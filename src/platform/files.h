@@ -18,6 +18,10 @@ struct FileStatus {
   bool ok() const { return failed == Done; }
 };
 
+// What failed, in words for a person ("could not open it"); "done" for Done and
+// "failed" for a number that is no step.
+const char* failedStepWords(int step);
+
 class FileHandle {
  public:
   FileHandle() = default;

@@ -42,8 +42,9 @@ void fileAction(const Module& module, Instance& instance, const char* action,
   const auto status = module.fileStatus();
   if (!status || status->first == 0) return;
   const bool load = std::string_view(action).starts_with("load");
-  throw FileError(std::string(load ? "cannot read " : "cannot write ") + shownPath + ": " +
-                  (status->second ? std::strerror(status->second) : failedFileStep(status->first)));
+  throw FileError(
+      std::string(load ? "cannot read " : "cannot write ") + shownPath + ": " +
+      (status->second ? std::strerror(status->second) : failedStepWords(status->first)));
 }
 
 // ---------------------------------------------------------------------------------

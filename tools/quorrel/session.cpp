@@ -9,6 +9,7 @@
 
 #include "command_line.h"
 #include "commands.h"
+#include "platform/files.h"
 
 namespace quorrel::tool {
 namespace {
@@ -244,22 +245,6 @@ int Session::status() const {
   return options_.notesFail && notesGiven() ? kNotesGiven : 0;
 }
 
-// The steps of a file action that can fail, as the module numbers them.
-constexpr const char* kFailedSteps[] = {"",
-                                        "could not open it",
-                                        "could not read it",
-                                        "could not write it",
-                                        "could not flush it to the disk",
-                                        "could not put the new file in place",
-                                        "ran out of memory",
-                                        "wrote nothing (no such element, or more cells "
-                                        "than the format holds)"};
-
-const char* failedFileStep(int32_t step) {
-  const auto index = static_cast<size_t>(step);
-  return step > 0 && index < std::size(kFailedSteps) ? kFailedSteps[index] : "failed";
-}
-
 void Session::checkFileAction(int32_t code, const std::vector<Argument>& args, const Where& where) {
   const ActionEntry& entry = actionEntry(code);
   if (entry.file == FileUse::None) return;
@@ -268,7 +253,7 @@ void Session::checkFileAction(int32_t code, const std::vector<Argument>& args, c
   fileActionFailed_ = true;
   if (!options_.warnFiles || !warnings_) return;
   *warnings_ << where.file << ':' << where.line << ": warning: " << entry.name << ' '
-             << quoteText(args[entry.pathParam].text) << ": " << failedFileStep(status->first);
+             << quoteText(args[entry.pathParam].text) << ": " << failedStepWords(status->first);
   if (status->second != 0) *warnings_ << " (" << std::strerror(status->second) << ')';
   *warnings_ << '\n';
 }

@@ -99,10 +99,6 @@ int runScript(const ModuleLoader& module, std::istream& in, const std::string& n
 // The first word of a script line and the rest, without the blanks around them.
 std::pair<std::string_view, std::string_view> firstWord(std::string_view line);
 
-// What the failed step of a file action (as the module's QuorrelFileStatus numbers
-// it) means: "could not open it", ...
-const char* failedFileStep(int32_t step);
-
 // The reason an action that uses `path` as `use` says cannot open it, or nothing.
 std::optional<std::string> fileProblem(const std::string& path, FileUse use);
 
