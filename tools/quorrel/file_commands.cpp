@@ -200,7 +200,9 @@ Input openInput(const std::string& operand, std::optional<ArrayFormat> from) {
     input.path = input.copy->path();
     copyStreamTo(operand == "-" ? std::cin : stream, head, input.path);
   }
-  input.bytes = std::filesystem::file_size(input.path);
+  std::error_code unsized;
+  input.bytes = std::filesystem::file_size(input.path, unsized);
+  if (unsized) input.bytes = 0;
   if (marked && !formatInfo(input.format).binary) readPastByteOrderMark(input);
   if (!from && input.format == ArrayFormat::Csv && hasQuotedCells(start)) {
     std::cerr << "quorrel: note: " << input.name

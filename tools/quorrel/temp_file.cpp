@@ -54,9 +54,12 @@ std::ifstream openRegular(const std::string& path) {
 }  // namespace
 
 bool isStreamFile(const std::string& path) {
+  // Whatever the system cannot show as a regular file or a folder is read as a stream:
+  // Windows (and Wine) give no status at all for a pipe or a device such as /dev/null.
+  // A missing file fails there with the same words as anywhere.
   std::error_code error;
   const auto status = fs::status(path, error);
-  return fs::exists(status) && !fs::is_directory(status) && !fs::is_regular_file(status);
+  return !fs::is_directory(status) && !fs::is_regular_file(status);
 }
 
 std::string readFileStart(const std::string& path, size_t count) {

@@ -29,8 +29,8 @@ class TempFile {
 // cannot be read (a folder or a device too).
 std::string readFileStart(const std::string& path, size_t count);
 
-// Whether the path is neither a regular file nor a folder: a pipe or a device, which
-// reads once, from its start, and has no size.
+// Whether the path is neither a regular file nor a folder as the system shows it: a
+// pipe or a device (or a missing file), which reads once, from its start.
 bool isStreamFile(const std::string& path);
 
 // At most `count` bytes from the start of a stream (standard input, a pipe, a
