@@ -217,10 +217,9 @@ void QUORREL_CALL Session::onNote(void* context, const char* id, const char* cal
 void Session::printNotes(const Where& where) {
   for (auto& [id, text] : pending_) {
     const std::string full = text + " [" + id + ']';
-    const auto seen =
-        std::find_if(notes_.begin(), notes_.end(), [&](const Note& n) { return n.text == full; });
-    if (seen != notes_.end()) {
-      ++seen->count;
+    const auto [seen, first] = noteIndex_.try_emplace(full, notes_.size());
+    if (!first) {
+      ++notes_[seen->second].count;
       continue;
     }
     const std::string place = std::string(where.file) + ':' + std::to_string(where.line);
@@ -303,7 +302,6 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
               : result.isText ? quoteText(result.text)
                               : std::to_string(result.number))
           << '\n';
-      out.flush();
       printNotes(where);
       return;
     }
@@ -313,13 +311,19 @@ void Session::execute(const Command& command, std::ostream& out, const Where& wh
 int runScript(const ModuleLoader& module, std::istream& in, const std::string& name,
               std::ostream& out, std::ostream& err, const RunOptions& options) {
   Session session(module, options, &err);
+  // A note, warning or error follows the answers of the lines before it when both streams
+  // go to one place, without a flush (a system call) after every line.
+  struct Tie {
+    std::ostream& err;
+    std::ostream* const before;
+    ~Tie() { err.tie(before); }
+  } tie{err, err.tie(&out)};
   std::string line;
   for (int lineNumber = 1; std::getline(in, line); ++lineNumber) {
     try {
       if (lineNumber == 1) skipByteOrderMark(line, name, err);
       session.run(line, out, {name, lineNumber, line});
     } catch (const ScriptError& error) {
-      out.flush();
       err << name << ':' << lineNumber << ": error: " << error.what() << '\n';
       return 2;
     }

@@ -7,6 +7,7 @@
 #include <ostream>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <utility>
 #include <vector>
 
@@ -88,6 +89,7 @@ class Session {
   bool listening_ = false;
   std::vector<std::pair<std::string, std::string>> pending_;  // id, "call: message"
   std::vector<Note> notes_;                                   // in order of first time
+  std::unordered_map<std::string, size_t> noteIndex_;         // text -> place in notes_
 };
 
 // Runs a whole script; reports the first error as "NAME:LINE: error: WHAT" and returns 2.
