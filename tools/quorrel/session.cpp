@@ -41,21 +41,24 @@ std::string argumentProblem(const Argument& arg, const std::string& unread, bool
   return "must be a quoted text; got " + got + std::string(hint);
 }
 
-// The arguments must match the declared parameters in number and type.
+// The arguments must match the declared parameters in number and type. Runs before
+// every call, so it builds nothing unless it has a mistake to name.
 void checkArguments(bool action, int32_t code, const Signature& signature,
-                    const std::vector<Argument>& args, std::vector<std::string> unread,
+                    const std::vector<Argument>& args, const std::vector<std::string>& unread,
                     uint16_t textType) {
-  const std::string form = scriptForm(action, code, signature, textType);
   if (static_cast<int>(args.size()) != signature.paramCount) {
-    throw ScriptError(form + ": takes " + argumentCount(signature.paramCount) + ", " +
-                      std::to_string(args.size()) + " given");
+    throw ScriptError(scriptForm(action, code, signature, textType) + ": takes " +
+                      argumentCount(signature.paramCount) + ", " + std::to_string(args.size()) +
+                      " given");
   }
-  unread.resize(args.size());
+  static const std::string kRead;
   for (size_t i = 0; i < args.size(); ++i) {
     const bool wantsText = signature.paramTypes[i] == textType;
-    if (!unread[i].empty() || args[i].isText != wantsText) {
-      throw ScriptError(form + ": argument " + std::to_string(i + 1) + ' ' +
-                        argumentProblem(args[i], unread[i], wantsText));
+    const std::string& unreadText = i < unread.size() ? unread[i] : kRead;
+    if (!unreadText.empty() || args[i].isText != wantsText) {
+      throw ScriptError(scriptForm(action, code, signature, textType) + ": argument " +
+                        std::to_string(i + 1) + ' ' +
+                        argumentProblem(args[i], unreadText, wantsText));
     }
   }
 }
