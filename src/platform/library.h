@@ -45,8 +45,9 @@ std::string programPath();
 // The module's file name on this system.
 extern const char* const kModuleFileName;
 
-// Standard streams carry bytes unchanged: no CR LF translation.
-void useBinaryStandardStreams();
+// Standard streams carry bytes unchanged (no CR LF translation), and standard output is
+// buffered wherever it is no terminal.
+void prepareStandardStreams();
 
 // Whether standard output failed because its reader went away (a pipe closed by `head`
 // or `more`), which is no fault of the program's; `error` is the errno of the failure.

@@ -51,7 +51,7 @@ std::string programPath() {
   return error ? std::string() : self.string();
 }
 
-void useBinaryStandardStreams() {}
+void prepareStandardStreams() {}
 
 bool standardOutputReaderGone(int error) {
   if (error == EPIPE) return true;

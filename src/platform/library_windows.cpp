@@ -63,8 +63,15 @@ std::string programPath() {
   return length == 0 || length >= sizeof self ? std::string() : std::string(self, length);
 }
 
-void useBinaryStandardStreams() {
+void prepareStandardStreams() {
   for (FILE* stream : {stdin, stdout, stderr}) _setmode(_fileno(stream), _O_BINARY);
+  // The C library writes any character device a byte at a time, the NUL device too, so
+  // `quorrel run x.qs > NUL` cost a system call per byte. A console stays unbuffered.
+  const HANDLE out = GetStdHandle(STD_OUTPUT_HANDLE);
+  DWORD mode = 0;
+  if (GetFileType(out) == FILE_TYPE_CHAR && GetConsoleMode(out, &mode) == 0) {
+    std::setvbuf(stdout, nullptr, _IOFBF, BUFSIZ);
+  }
 }
 
 bool standardOutputReaderGone(int error) {

@@ -208,6 +208,6 @@ std::string defaultModulePath();
 // Standard input, output and error carry bytes as they are (Windows would translate
 // line ends otherwise).
 using platform::standardOutputReaderGone;
-using platform::useBinaryStandardStreams;
+using platform::prepareStandardStreams;
 
 }  // namespace quorrel::hostsim

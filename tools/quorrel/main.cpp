@@ -386,7 +386,7 @@ std::string whereModulesWereSought(const std::string& moduleOption) {
 }  // namespace
 
 int main(int argc, char** argv) {
-  quorrel::tool::useBinaryStandardStreams();
+  quorrel::tool::prepareStandardStreams();
   std::string command;
   std::string moduleOption;
   try {

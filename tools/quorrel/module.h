@@ -16,6 +16,6 @@ using hostsim::ModuleError;
 using hostsim::ModuleLoader;
 using hostsim::Signature;
 using hostsim::standardOutputReaderGone;
-using hostsim::useBinaryStandardStreams;
+using hostsim::prepareStandardStreams;
 
 }  // namespace quorrel::tool
