@@ -206,8 +206,9 @@ std::vector<std::string> defaultModulePlaces();
 std::string defaultModulePath();
 
 // Standard input, output and error carry bytes as they are (Windows would translate
-// line ends otherwise).
-using platform::standardOutputReaderGone;
+// line ends otherwise), and output to a device that is no terminal is buffered; whether
+// standard output's reader went away.
 using platform::prepareStandardStreams;
+using platform::standardOutputReaderGone;
 
 }  // namespace quorrel::hostsim

@@ -14,8 +14,8 @@ using hostsim::MenuItem;
 using hostsim::Module;
 using hostsim::ModuleError;
 using hostsim::ModuleLoader;
+using hostsim::prepareStandardStreams;
 using hostsim::Signature;
 using hostsim::standardOutputReaderGone;
-using hostsim::prepareStandardStreams;
 
 }  // namespace quorrel::tool
