@@ -35,21 +35,17 @@ enum : CommandSet {
 };
 }  // namespace sets
 
-struct Command {
-  CommandId id;
+// A command of the command line or a word of the shell: a row of its table.
+template <class Id>
+struct Verb {
+  Id id;
   const char* name;
   const char* operands;
   const char* completes;
   const char* summary;
 };
-
-struct ShellWord {
-  ShellWordId id;
-  const char* name;
-  const char* operands;
-  const char* completes;
-  const char* summary;
-};
+using Command = Verb<CommandId>;
+using ShellWord = Verb<ShellWordId>;
 
 struct Option {
   OptionId id;
